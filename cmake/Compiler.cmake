@@ -1,0 +1,14 @@
+# How everything of the project is compiled: warnings are errors, in every build.
+add_compile_options(-Wall -Wextra -Wpedantic -Wshadow -Wconversion -Wsign-conversion
+                    -Wnon-virtual-dtor -Woverloaded-virtual -Wold-style-cast -Werror)
+# An aggregate's left-out members have the defaults that its declaration gives.
+add_compile_options(-Wno-missing-field-initializers)
+add_link_options(-Wl,--as-needed)
+include_directories(${PROJECT_SOURCE_DIR})
+
+if(NIMBRA_SANITIZERS)
+  add_compile_options(-fsanitize=${NIMBRA_SANITIZERS} -fno-omit-frame-pointer)
+  add_link_options(-fsanitize=${NIMBRA_SANITIZERS})
+  # GCC 12's sanitizers make the optimiser see doubtful accesses in the standard library.
+  add_compile_options(-Wno-maybe-uninitialized)
+endif()

@@ -1,0 +1,75 @@
+#pragma once
+
+#include "platform/values/Error.h"
+
+#include <chrono>
+#include <cstdint>
+#include <map>
+#include <nlohmann/json.hpp>
+#include <optional>
+#include <set>
+#include <string>
+#include <vector>
+
+namespace nimbra::device {
+
+class JsonReader;
+
+/// What a device is made from: the `device` object of a scenario, or the file given to
+/// `settingsctl init --from`. Every member has the default of a device that nobody described.
+struct DeviceDescription {
+    struct Screen {
+        double width = 390;
+        double height = 844;
+        double scale = 2;
+    };
+    struct AccountDescription {
+        std::string identifier;
+        bool primary = false;
+        bool usesStratafile = false;
+        std::set<std::string> enabled;
+        std::set<std::string> provisioned;
+        std::set<std::string> cellular;
+        std::optional<std::string> tessaryAccount;
+    };
+    struct Container {
+        std::string identifier;
+        bool isPublic = false;
+        bool registrationFails = false;
+    };
+
+    std::string name = "Nimbra Phone";
+    std::string idiom = "phone";
+    std::optional<Screen> screen = Screen();
+    std::string locale = "en-US";
+    std::string timeZone = "UTC";
+    std::chrono::system_clock::time_point now;
+    bool cellularData = true;
+    std::optional<std::string> wirelessVariant;
+    std::map<std::string, nlohmann::json> preferences;
+    std::set<std::string> cloudSyncDenied;
+    bool appCellularDataModificationAllowed = true;
+    std::vector<AccountDescription> accounts;
+    std::optional<std::string> identity;
+    std::vector<Container> containers;
+    /// The table "Localizable" instead of the bundle's own.
+    std::optional<std::map<std::string, std::string>> strings;
+    bool paneBundleRegistered = true;
+
+    DeviceDescription();
+};
+
+/// A description with the keys that were given in it; the other members have their defaults.
+struct GivenDescription {
+    DeviceDescription description;
+    std::set<std::string> keys;
+};
+
+/// Reads the object at `reader`. What is not as it should be, unknown keys included, is noted
+/// there; keys that this version checks but does not use yet are among `keys` all the same.
+[[nodiscard]] GivenDescription readDeviceDescription(const JsonReader& reader);
+
+/// The keys of `given` that this version checks but that have no effect yet.
+[[nodiscard]] std::vector<std::string> keysWithoutEffect(const GivenDescription& given);
+
+} // namespace nimbra::device

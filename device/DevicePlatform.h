@@ -1,0 +1,60 @@
+#pragma once
+
+#include "platform/PlatformServices.h"
+#include "platform/values/Error.h"
+
+#include <expected>
+#include <filesystem>
+#include <memory>
+#include <string>
+
+namespace nimbra {
+class ClassRegistry;
+class SystemLog;
+class WorkQueue;
+} // namespace nimbra
+
+namespace nimbra::device {
+
+class DeviceAccountStore;
+class DeviceBundles;
+class DeviceSettings;
+class DeviceWorkQueues;
+
+/// Every service of the platform on one device directory: made, wired and ended together.
+/// Main queue only; the services say for themselves where they may be used.
+class DevicePlatform {
+public:
+    /// The platform of the device in `root`, whose main queue is `mainQueue` (not owned, outlives
+    /// the platform). A directory that lacks something or holds something unreadable is an error
+    /// that names the file and the place; nothing in it is changed.
+    [[nodiscard]] static std::expected<std::unique_ptr<DevicePlatform>, Error>
+    open(const std::filesystem::path& root, WorkQueue& mainQueue);
+
+    DevicePlatform(const DevicePlatform&) = delete;
+    DevicePlatform& operator=(const DevicePlatform&) = delete;
+    /// Waits for the background work under way, then ends the platform's threads. Every controller
+    /// made over the services has gone before.
+    ~DevicePlatform();
+
+    /// The services for one pane, which talks to its host through `presenter`. The platform and
+    /// the presenter outlive the pane.
+    [[nodiscard]] PlatformServices servicesFor(Presenter& presenter);
+
+    // What a host needs of the device beyond what a pane may ask.
+
+    [[nodiscard]] DeviceAccountStore& accountStore();
+    [[nodiscard]] DeviceBundles& bundles();
+    [[nodiscard]] DeviceSettings& settings();
+    [[nodiscard]] DeviceWorkQueues& workQueues();
+    [[nodiscard]] ClassRegistry& classes();
+    [[nodiscard]] SystemLog& systemLog();
+
+private:
+    struct Parts;
+    explicit DevicePlatform(std::unique_ptr<Parts> parts);
+
+    std::unique_ptr<Parts> _parts;
+};
+
+} // namespace nimbra::device

@@ -1,0 +1,41 @@
+#pragma once
+
+#include "platform/system/Bundles.h"
+#include "platform/values/Error.h"
+
+#include <expected>
+#include <filesystem>
+#include <map>
+#include <memory>
+#include <mutex>
+#include <string>
+
+namespace nimbra {
+class ClassRegistry;
+struct ControllerClass;
+} // namespace nimbra
+
+namespace nimbra::device {
+
+class DeviceBundle;
+class DeviceSettings;
+
+/// The bundles that this process has loaded. Loading is for the main queue, looking up for any.
+class DeviceBundles final : public Bundles {
+public:
+    /// Texts are looked up in the language of `settings`; bundles register their classes with
+    /// `classes`. Neither is owned; both outlive the bundles.
+    DeviceBundles(const DeviceSettings& settings, ClassRegistry& classes);
+    ~DeviceBundles() override;
+
+    [[nodiscard]] std::shared_ptr<Bundle>
+    bundleWithIdentifier(const BundleIdentifier& identifier) const override;
+
+    /// Loads the bundle in the folder `path`: its manifest, its string tables, its shared object
+    /// with dlopen, which stays loaded for the life of the process, and registers its classes. An
+    /// error names the file and what was expected of it.
+    [[nodiscard]] std::expected<std::shared_ptr<DeviceBundle>, Error>
+    load(const std::filesystem::path& path);
+};
+
+} // namespace nimbra::device

@@ -1,0 +1,30 @@
+#pragma once
+
+#include "platform/values/Error.h"
+
+#include <expected>
+#include <filesystem>
+#include <mutex>
+#include <string>
+
+namespace nimbra::device {
+
+/// What `device.json` says of the device: its languages and its time zone. Any thread.
+class DeviceSettings {
+public:
+    [[nodiscard]] static std::expected<DeviceSettings, Error>
+    open(const std::filesystem::path& root);
+
+    /// The BCP 47 tag of the user's locale.
+    [[nodiscard]] std::string localeIdentifier() const;
+    /// The IANA name of the time zone.
+    [[nodiscard]] std::string timeZone() const;
+
+    /// Shows everything in another locale than the file's, for this process only.
+    void overrideLocale(const std::string& identifier);
+
+    /// Reads the file again after it was changed; on an error all stays as it was.
+    [[nodiscard]] std::expected<void, Error> reload();
+};
+
+} // namespace nimbra::device

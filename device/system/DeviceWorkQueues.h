@@ -1,0 +1,38 @@
+#pragma once
+
+#include "platform/system/WorkQueues.h"
+
+#include <functional>
+#include <memory>
+#include <string>
+
+namespace nimbra::device {
+
+/// Serial queues on the platform's threads, beside the main queue that the host's loop runs.
+/// Any thread.
+class DeviceWorkQueues final : public WorkQueues {
+public:
+    /// `mainQueue` is not owned and outlives the queues.
+    explicit DeviceWorkQueues(WorkQueue& mainQueue);
+    /// Runs what is still queued, then ends the threads.
+    ~DeviceWorkQueues() override;
+
+    [[nodiscard]] WorkQueue& mainQueue() override;
+    [[nodiscard]] std::shared_ptr<WorkQueue>
+    serialQueueWithLabel(const std::string& label) override;
+    [[nodiscard]] std::shared_ptr<EventSource>
+    dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
+
+    /// Whether no background queue has work that is queued or under way.
+    [[nodiscard]] bool isIdle() const;
+    /// Calls `observer`, on the thread that ended the last piece of work, each time the queues
+    /// become idle. An empty one ends it.
+    void setIdleObserver(std::function<void()> observer);
+
+private:
+    class Shared;
+    std::shared_ptr<Shared> _shared;
+    WorkQueue& _mainQueue;
+};
+
+} // namespace nimbra::device

@@ -1,0 +1,14 @@
+#include "pane/RSPNimbraDriveViewController.h"
+#include "platform/system/ClassRegistry.h"
+
+#include <memory>
+
+extern "C" nimbra::BundleEntryPoint NimbraBundleRegisterClasses;
+
+bool NimbraBundleRegisterClasses(nimbra::ClassRegistry& classes) {
+    return classes.registerClass(
+        {.name = "RSPNimbraDriveViewController",
+         .create = [](const nimbra::PlatformServices& services) {
+             return std::make_shared<nimbra::RSPNimbraDriveViewController>(services);
+         }});
+}

@@ -1,0 +1,99 @@
+#pragma once
+
+#include "platform/host/AccountSettingsPane.h"
+#include "platform/system/NotificationCenter.h"
+#include "platform/values/RowValue.h"
+#include "upgrade/RSPUpgradeViewControllerDelegate.h"
+
+#include <memory>
+#include <mutex>
+#include <optional>
+
+namespace nimbra {
+
+class Account;
+class EventSource;
+class RefreshControl;
+class WorkQueue;
+
+/// The cloud-documents page of one account.
+///
+/// The row that opens it carries the account in its user info: under `FirstSetupKey` whether this
+/// is the account's first setup, and then under `AccountKey` the account itself, otherwise under
+/// `AccountIdentifierKey` its identifier.
+///
+/// Main queue only, except where an operation says otherwise.
+class RSPNimbraDriveViewController : public AccountSettingsPane,
+                                     public RSPUpgradeViewControllerDelegate {
+public:
+    using AccountSettingsPane::AccountSettingsPane;
+
+    const SpecifierArray& specifiers() override;
+
+    void viewDidLoad() override;
+    void viewDidAppear(bool animated) override;
+    void viewDidDisappear(bool animated) override;
+
+    void upgradeViewControllerDidCancel(
+        const std::shared_ptr<RSPUpgradeViewController>& screen) override;
+    void upgradeViewControllerDidSucceed(
+        const std::shared_ptr<RSPUpgradeViewController>& screen) override;
+
+protected:
+    // Where the rows come from that stand around the master switch.
+
+    /// The row that starts the move to the new document service; null for none.
+    [[nodiscard]] virtual std::shared_ptr<Specifier> _createSpecifierForUpgradeButton();
+    /// One row an application, unsorted; empty for none.
+    [[nodiscard]] virtual SpecifierArray _appSpecifiersForPRVServices();
+    /// The group and the switch of cellular data; nothing on a device without it.
+    [[nodiscard]] virtual std::optional<SpecifierArray> _createSpecifiersForCellularSwitchCell();
+    /// The row of the cloud database; null for none.
+    [[nodiscard]] virtual std::shared_ptr<Specifier> _specifierForTessary();
+    /// The group and the button of diagnostics; nothing while diagnostics are off.
+    [[nodiscard]] virtual std::optional<SpecifierArray> _createSpecifiersForDiagnostics();
+
+    /// Shows the rows that depend on the master switch, or hides them, as one animated batch.
+    void _reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+
+    /// The account that the page shows and edits, read on the first call; null when the store has
+    /// none for the entry row.
+    [[nodiscard]] const std::shared_ptr<Account>& _vantrelAccount();
+    /// Reads the account anew; changes that were not saved are lost.
+    void _reloadVantrelAccount();
+
+    /// Asks for a run of the priority registration; requests that come before it starts share it.
+    /// Any queue, from the first `viewDidAppear` on; before that the main queue.
+    void _registerContainerPriorityHinting();
+
+private:
+    [[nodiscard]] Text _localizedString(const Text& key) const;
+    [[nodiscard]] std::shared_ptr<Specifier> _masterSwitch();
+    [[nodiscard]] SpecifierArray _sortedAppSpecifiers(SpecifierArray rows) const;
+    [[nodiscard]] SpecifierArray _arrangedSpecifiers();
+    [[nodiscard]] bool _isTidewaterEnabled();
+    [[nodiscard]] RowValue _documentsAndDataEnabled(const Specifier* row);
+
+    void _refresh(const std::shared_ptr<RefreshControl>& sender);
+    [[nodiscard]] std::shared_ptr<ObserverToken>
+    _observe(const NotificationName& name, void (RSPNimbraDriveViewController::*handle)());
+    void _unregisterContainerPriorityHinting();
+
+    std::shared_ptr<Specifier> _NimbraDriveSpecifier; // NOLINT(bugprone-reserved-identifier)
+    std::shared_ptr<Specifier> _statusInfoSpecifier;
+    SpecifierArray _appSpecifiers;
+    std::optional<SpecifierArray> _cellularSpecifiers;
+    std::optional<SpecifierArray> _logsSpecifiers;
+    std::shared_ptr<Account> _vantrelAccount_;
+    bool _isFirstSetup = false;
+    std::shared_ptr<ObserverToken> _uiApplicationDidBecomeActiveObserver;
+    /// Kept for the page's layout of tokens; the status footer watches the sync status itself.
+    std::shared_ptr<ObserverToken> _mrDidUpdateLastSyncStatusObserver;
+    std::shared_ptr<ObserverToken> _mrTidewaterIdentityTokenStatusObserver;
+    std::shared_ptr<ObserverToken> _mrContainersListChangedNotification;
+    std::shared_ptr<EventSource> _containerPriorityHintingSource;
+    std::shared_ptr<WorkQueue> _containerPriorityHintingQueue;
+    std::once_flag _containerPriorityHintingCreation;
+};
+
+} // namespace nimbra

@@ -1,0 +1,64 @@
+#include "platform/host/Specifier.h"
+
+#include <utility>
+
+namespace nimbra {
+
+Specifier::Specifier(Text identifier, Text name, Row row)
+    : _identifier(std::move(identifier)), _name(std::move(name)), _row(std::move(row)) {}
+
+std::shared_ptr<Specifier> Specifier::groupSpecifierWithID(Text identifier) {
+    return std::shared_ptr<Specifier>(
+        new Specifier(std::move(identifier), Text(), {.cell = GroupCell}));
+}
+
+std::shared_ptr<Specifier> Specifier::preferenceSpecifierNamed(Text name, Row row) {
+    return std::shared_ptr<Specifier>(new Specifier(Text(), std::move(name), std::move(row)));
+}
+
+void Specifier::setIdentifier(Text identifier) {
+    _identifier = std::move(identifier);
+}
+
+const Text& Specifier::label() const {
+    return _identifier ? _identifier : _name;
+}
+
+RowValue Specifier::propertyForKey(const PropertyKey& key) const {
+    const auto entry = _properties.find(key);
+    return entry != _properties.end() ? entry->second : RowValue();
+}
+
+void Specifier::setPropertyForKey(RowValue value, const PropertyKey& key) {
+    _properties.insert_or_assign(key, std::move(value));
+}
+
+void Specifier::setUserInfo(UserInfo userInfo) {
+    _userInfo = std::move(userInfo);
+}
+
+bool Specifier::isEnabled() const {
+    return propertyForKey(EnabledKey) != RowValue(false);
+}
+
+RowValue Specifier::value() const {
+    return _row.get ? _row.get(*this) : RowValue();
+}
+
+void Specifier::setValue(const RowValue& value) const {
+    if (_row.set) {
+        _row.set(value, *this);
+    }
+}
+
+void Specifier::setButtonAction(Action action) {
+    _buttonAction = std::move(action);
+}
+
+void Specifier::performButtonAction() const {
+    if (_buttonAction) {
+        _buttonAction(*this);
+    }
+}
+
+} // namespace nimbra

@@ -1,0 +1,24 @@
+#pragma once
+
+#include "platform/values/Identifier.h"
+#include "platform/values/Text.h"
+
+namespace nimbra {
+
+/// A folder of code and resources that belong together. Any queue.
+class Bundle {
+public:
+    Bundle() = default;
+    Bundle(const Bundle&) = delete;
+    Bundle& operator=(const Bundle&) = delete;
+    virtual ~Bundle() = default;
+
+    [[nodiscard]] virtual const BundleIdentifier& identifier() const = 0;
+
+    /// The text under `key` in the string table `table`, in the best language that the bundle has
+    /// for the user. Where no table has the key, `value` comes back: the very object passed in.
+    [[nodiscard]] virtual Text localizedStringForKeyValueTable(const Text& key, const Text& value,
+                                                               const Text& table) const = 0;
+};
+
+} // namespace nimbra

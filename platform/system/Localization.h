@@ -1,0 +1,39 @@
+#pragma once
+
+#include "platform/system/Locale.h"
+#include "platform/values/Text.h"
+
+#include <chrono>
+#include <cstdint>
+#include <span>
+#include <variant>
+
+namespace nimbra {
+
+/// A point in time.
+using Date = std::chrono::system_clock::time_point;
+
+/// What a placeholder of a text format is filled with.
+using FormatArgument = std::variant<std::int64_t, Text, Date>;
+
+/// The user's locale, and what depends on it. Any queue.
+class Localization {
+public:
+    virtual ~Localization() = default;
+
+    [[nodiscard]] virtual Locale currentLocale() const = 0;
+
+    /// `format` with its placeholders filled from `arguments` by the rules of `locale`. A format
+    /// without placeholders comes back as it stands, and so does one that is malformed.
+    [[nodiscard]] virtual Text
+    stringWithFormatLocaleArguments(const Text& format, const Locale& locale,
+                                    std::span<const FormatArgument> arguments) const = 0;
+
+    /// Orders two names the way a person expects them in a list: letter case ignored, runs of
+    /// digits by their numeric value, by the rules of the current locale. Negative when `left`
+    /// comes first, zero when neither does. An absent text comes before every other.
+    [[nodiscard]] virtual int localizedStandardCompare(const Text& left,
+                                                       const Text& right) const = 0;
+};
+
+} // namespace nimbra

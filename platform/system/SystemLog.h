@@ -1,0 +1,21 @@
+#pragma once
+
+#include <string>
+
+namespace nimbra {
+
+enum class LogLevel { debug, standard, error };
+
+/// The platform's unified log, through its default handle. Any thread.
+class SystemLog {
+public:
+    virtual ~SystemLog() = default;
+
+    /// Whether a message of this level would be kept.
+    [[nodiscard]] virtual bool isEnabled(LogLevel level) const = 0;
+
+    /// Writes `message` as one line.
+    virtual void write(LogLevel level, const std::string& message) = 0;
+};
+
+} // namespace nimbra

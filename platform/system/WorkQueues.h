@@ -1,0 +1,28 @@
+#pragma once
+
+#include "platform/system/EventSource.h"
+#include "platform/system/WorkQueue.h"
+
+#include <memory>
+#include <string>
+
+namespace nimbra {
+
+/// The main queue, and what makes further queues and event sources. Any thread.
+class WorkQueues {
+public:
+    virtual ~WorkQueues() = default;
+
+    /// The queue of the host's loop: rows, views and alerts are touched there only.
+    [[nodiscard]] virtual WorkQueue& mainQueue() = 0;
+
+    /// A new serial queue on a thread of the platform.
+    [[nodiscard]] virtual std::shared_ptr<WorkQueue>
+    serialQueueWithLabel(const std::string& label) = 0;
+
+    /// A new source of kind data-or, suspended, whose handler runs on `queue`.
+    [[nodiscard]] virtual std::shared_ptr<EventSource>
+    dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) = 0;
+};
+
+} // namespace nimbra

@@ -1,0 +1,23 @@
+#pragma once
+
+#include <memory>
+
+namespace nimbra {
+
+class RSPUpgradeViewController;
+
+/// Is told how the screen that moves an account to the new document service has ended. Exactly one
+/// of the two is called for a screen, on the main queue.
+class RSPUpgradeViewControllerDelegate {
+public:
+    virtual ~RSPUpgradeViewControllerDelegate() = default;
+
+    /// The user left `screen`, or the upgrade failed and the user has seen why.
+    virtual void
+    upgradeViewControllerDidCancel(const std::shared_ptr<RSPUpgradeViewController>& screen) = 0;
+    /// The account has moved.
+    virtual void
+    upgradeViewControllerDidSucceed(const std::shared_ptr<RSPUpgradeViewController>& screen) = 0;
+};
+
+} // namespace nimbra
