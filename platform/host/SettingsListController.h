@@ -81,7 +81,7 @@ protected:
     indexOfSpecifier(const std::shared_ptr<Specifier>& row) const;
 
     /// The kept rows; nothing until they are built.
-    std::optional<SpecifierArray> _specifiers; // NOLINT(*-non-private-member-*): the subclass builds it
+    std::optional<SpecifierArray> _specifiers;
 
 private:
     PlatformServices _services;

@@ -45,9 +45,9 @@ RowValue Specifier::value() const {
     return _row.get ? _row.get(*this) : RowValue();
 }
 
-void Specifier::setValue(const RowValue& value) const {
+void Specifier::setValue(const RowValue& value) {
     if (_row.set) {
-        _row.set(value, *this);
+        _row.set(value, shared_from_this());
     }
 }
 
@@ -55,9 +55,9 @@ void Specifier::setButtonAction(Action action) {
     _buttonAction = std::move(action);
 }
 
-void Specifier::performButtonAction() const {
+void Specifier::performButtonAction() {
     if (_buttonAction) {
-        _buttonAction(*this);
+        _buttonAction(shared_from_this());
     }
 }
 

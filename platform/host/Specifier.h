@@ -36,11 +36,14 @@ inline const UserInfoKey AccountIdentifierKey{"AccountIdentifierKey"};
 inline const UserInfoKey FirstSetupKey{"firstSetup"};
 
 /// The host's record of one group header or one row. Main queue only.
-class Specifier {
+class Specifier : public std::enable_shared_from_this<Specifier> {
 public:
     using Getter = std::function<RowValue(const Specifier& row)>;
-    using Setter = std::function<void(const RowValue& value, const Specifier& row)>;
-    using Action = std::function<void(const Specifier& row)>;
+    /// A setter and an action may start work that outlasts the call: they are given a hold on the
+    /// row.
+    using Setter =
+        std::function<void(const RowValue& value, const std::shared_ptr<Specifier>& row)>;
+    using Action = std::function<void(const std::shared_ptr<Specifier>& row)>;
 
     struct Row {
         /// The controller whose methods `set` and `get` call; not owned, it outlives the row.
@@ -87,13 +90,13 @@ public:
 
     [[nodiscard]] bool hasSetter() const { return static_cast<bool>(_row.set); }
     /// Hands `value` to the setter; nothing happens on a row without one.
-    void setValue(const RowValue& value) const;
+    void setValue(const RowValue& value);
 
     [[nodiscard]] bool hasButtonAction() const { return static_cast<bool>(_buttonAction); }
     /// Sets what a tap on a button row calls.
     void setButtonAction(Action action);
     /// Calls the action; nothing happens on a row without one.
-    void performButtonAction() const;
+    void performButtonAction();
 
 private:
     Specifier(Text identifier, Text name, Row row);

@@ -6,7 +6,7 @@ namespace nimbra {
 
 bool ClassRegistry::registerClass(ControllerClass controllerClass) {
     std::string name = controllerClass.name;
-    return _classes.try_emplace(std::move(name), std::move(controllerClass)).second;
+    return _classes.emplace(std::move(name), std::move(controllerClass)).second;
 }
 
 const ControllerClass* ClassRegistry::classNamed(const std::string& name) const {
