@@ -1,5 +1,4 @@
 #include "pane/RSPNimbraDriveViewController.h"
-
 #include "platform/documents/DocumentContainers.h"
 #include "platform/system/FileManager.h"
 #include "platform/system/WorkQueues.h"
@@ -45,10 +44,9 @@ void RSPNimbraDriveViewController::_registerContainerPriorityHinting() {
 /// nothing to take back.
 void RSPNimbraDriveViewController::_unregisterContainerPriorityHinting() {
     if (_containerPriorityHintingQueue) {
-        _containerPriorityHintingQueue->async(
-            [&containers = services().documentContainers] {
-                containers.unregisterCurrentProcessAsPriorityHint();
-            });
+        _containerPriorityHintingQueue->async([&containers = services().documentContainers] {
+            containers.unregisterCurrentProcessAsPriorityHint();
+        });
     }
 }
 

@@ -6,9 +6,8 @@
 extern "C" nimbra::BundleEntryPoint NimbraBundleRegisterClasses;
 
 bool NimbraBundleRegisterClasses(nimbra::ClassRegistry& classes) {
-    return classes.registerClass(
-        {.name = "RSPNimbraDriveViewController",
-         .create = [](const nimbra::PlatformServices& services) {
-             return std::make_shared<nimbra::RSPNimbraDriveViewController>(services);
-         }});
+    const auto create = [](const nimbra::PlatformServices& services) {
+        return std::make_shared<nimbra::RSPNimbraDriveViewController>(services);
+    };
+    return classes.registerClass({.name = "RSPNimbraDriveViewController", .create = create});
 }

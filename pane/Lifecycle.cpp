@@ -1,5 +1,4 @@
 #include "pane/RSPNimbraDriveViewController.h"
-
 #include "platform/accounts/AccountStore.h"
 #include "platform/documents/DocumentContainers.h"
 #include "platform/system/Bundles.h"
@@ -72,8 +71,8 @@ RSPNimbraDriveViewController::_observe(const NotificationName& name,
                                        void (RSPNimbraDriveViewController::*handle)()) {
     return services().notificationCenter.addObserverForName(
         name, {.usingBlock = [weakPane = weak_from_this(), handle](const Notification&) {
-            if (const auto pane = std::static_pointer_cast<RSPNimbraDriveViewController>(
-                    weakPane.lock())) {
+            if (const auto pane =
+                    std::static_pointer_cast<RSPNimbraDriveViewController>(weakPane.lock())) {
                 ((*pane).*handle)();
             }
         }});

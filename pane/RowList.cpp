@@ -1,5 +1,4 @@
 #include "pane/RSPNimbraDriveViewController.h"
-
 #include "platform/accounts/Account.h"
 #include "platform/system/Localization.h"
 
@@ -74,10 +73,10 @@ SpecifierArray RSPNimbraDriveViewController::_sortedAppSpecifiers(SpecifierArray
     }
     // The group has no name, and an absent name comes before every other: it stays at the head.
     rows.insert(rows.begin(), Specifier::groupSpecifierWithID("RSPUIApps"));
-    std::ranges::stable_sort(rows, [&localization = services().localization](const auto& left,
-                                                                             const auto& right) {
-        return localization.localizedStandardCompare(left->name(), right->name()) < 0;
-    });
+    std::ranges::stable_sort(
+        rows, [&localization = services().localization](const auto& left, const auto& right) {
+            return localization.localizedStandardCompare(left->name(), right->name()) < 0;
+        });
     return rows;
 }
 

@@ -27,8 +27,8 @@ inline constexpr LogMessage updatedCellularFlag{
     LogLevel::debug, "Successfully updated use-cellular flag on Nimbra account."};
 inline constexpr LogMessage failedToUpdateCellularFlag{
     LogLevel::error, "Error updating use-cellular flag on Nimbra account: %@"};
-inline constexpr LogMessage loadingTessaryBundle{
-    LogLevel::standard, "Tessary settings bundle not loaded. Loading..."};
+inline constexpr LogMessage loadingTessaryBundle{LogLevel::standard,
+                                                 "Tessary settings bundle not loaded. Loading..."};
 inline constexpr LogMessage noBundleForIdentifier{LogLevel::error,
                                                   "Error! No bundle for bundle ID: %@"};
 inline constexpr LogMessage noCachedAccess{LogLevel::error, "Error! No cached PRV access info"};
@@ -42,10 +42,10 @@ inline constexpr LogMessage noLastSyncDate{LogLevel::error, "Can't retrieve last
 inline constexpr LogMessage noLastSyncSentence{LogLevel::error, "can't fetch last sync; %@"};
 
 inline constexpr std::array all{
-    markingAccount,      enablingDataclasses,
-    updatedCellularFlag, failedToUpdateCellularFlag,
-    loadingTessaryBundle, noBundleForIdentifier,
-    noCachedAccess,      failedToCreateDiagnoseDirectory,
+    markingAccount,         enablingDataclasses,
+    updatedCellularFlag,    failedToUpdateCellularFlag,
+    loadingTessaryBundle,   noBundleForIdentifier,
+    noCachedAccess,         failedToCreateDiagnoseDirectory,
     settingShareSourceView, noLastSyncDate,
     noLastSyncSentence,
 };
