@@ -1,7 +1,5 @@
 #pragma once
 
-#include "platform/values/Error.h"
-
 #include <chrono>
 #include <cstdint>
 #include <map>
@@ -23,6 +21,7 @@ struct DeviceDescription {
         double height = 844;
         double scale = 2;
     };
+    /// An account of a given list; what is left out of it is false, empty or null.
     struct AccountDescription {
         std::string identifier;
         bool primary = false;
@@ -52,6 +51,9 @@ struct DeviceDescription {
     std::vector<AccountDescription> accounts;
     std::optional<std::string> identity;
     std::vector<Container> containers;
+    /// The last sync as it was given: an instant or a sentence, null, or an object with an error.
+    nlohmann::json lastSyncDate;
+    nlohmann::json lastSyncText;
     /// The table "Localizable" instead of the bundle's own.
     std::optional<std::map<std::string, std::string>> strings;
     bool paneBundleRegistered = true;

@@ -1,8 +1,11 @@
 #pragma once
 
+#include "device/bundles/StringTables.h"
 #include "platform/system/Bundle.h"
 
 #include <map>
+#include <memory>
+#include <mutex>
 #include <string>
 
 namespace nimbra {
@@ -11,9 +14,23 @@ struct ControllerClass;
 
 namespace nimbra::device {
 
+class DeviceSettings;
+
 /// A bundle that is loaded from a folder. Any thread, but where an operation says otherwise.
 class DeviceBundle final : public Bundle {
 public:
+    /// What a bundle is made of. The settings and the class are not owned and outlive it.
+    struct Parts {
+        BundleIdentifier identifier;
+        /// The language whose tables have every key.
+        std::string developmentLanguage;
+        LanguageTables tables;
+        const ControllerClass* principalClass;
+        const DeviceSettings* settings;
+    };
+
+    explicit DeviceBundle(Parts parts);
+
     [[nodiscard]] const BundleIdentifier& identifier() const override;
     [[nodiscard]] Text localizedStringForKeyValueTable(const Text& key, const Text& value,
                                                        const Text& table) const override;
@@ -24,6 +41,17 @@ public:
     /// Uses `texts` as the table `table` in every language from now on, instead of the bundle's
     /// own.
     void replaceTable(const std::string& table, std::map<std::string, std::string> texts);
+
+private:
+    [[nodiscard]] std::shared_ptr<const StringTables> tablesOfUser() const;
+
+    const Parts _parts;
+    mutable std::mutex _mutex;
+    StringTables _replacements;
+    /// The tables as the user of `_locale` sees them: made once for a locale, so that a lookup
+    /// needs no search along the languages.
+    mutable std::shared_ptr<const StringTables> _tables;
+    mutable std::string _locale;
 };
 
 } // namespace nimbra::device

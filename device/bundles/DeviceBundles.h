@@ -8,6 +8,7 @@
 #include <map>
 #include <memory>
 #include <mutex>
+#include <set>
 #include <string>
 
 namespace nimbra {
@@ -34,8 +35,24 @@ public:
     /// Loads the bundle in the folder `path`: its manifest, its string tables, its shared object
     /// with dlopen, which stays loaded for the life of the process, and registers its classes. An
     /// error names the file and what was expected of it.
+    /// A folder that is loaded already gives the bundle that was made of it.
     [[nodiscard]] std::expected<std::shared_ptr<DeviceBundle>, Error>
     load(const std::filesystem::path& path);
+
+    /// Whether `bundleWithIdentifier` finds the bundle called `identifier` once it is loaded, as
+    /// it does until this says otherwise.
+    void setFindable(const BundleIdentifier& identifier, bool findable);
+
+private:
+    [[nodiscard]] std::expected<const ControllerClass*, Error>
+    registerClasses(const std::filesystem::path& executable, const std::string& principalClass);
+
+    const DeviceSettings& _settings;
+    ClassRegistry& _classes;
+    mutable std::mutex _mutex;
+    /// By the folder's path without links.
+    std::map<std::filesystem::path, std::shared_ptr<DeviceBundle>> _bundles;
+    std::set<BundleIdentifier> _unfindable;
 };
 
 } // namespace nimbra::device

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <expected>
 #include <filesystem>
+#include <initializer_list>
 #include <memory>
 #include <nlohmann/json_fwd.hpp>
 #include <optional>
@@ -67,6 +68,8 @@ public:
 
     /// Notes that `expected` was expected at this place, for rules of the caller's own.
     void expected(const std::string& expected) const;
+    /// Notes `what` of this place, for rules that say more than what was expected.
+    void note(const std::string& what) const;
 
     /// This place as a JSON pointer; empty for the root.
     [[nodiscard]] const std::string& pointer() const { return _pointer; }

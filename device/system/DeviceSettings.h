@@ -4,12 +4,13 @@
 
 #include <expected>
 #include <filesystem>
-#include <mutex>
+#include <memory>
 #include <string>
 
 namespace nimbra::device {
 
-/// What `device.json` says of the device: its languages and its time zone. Any thread.
+/// What `device.json` says of the device: its language and its time zone. Copies are the same
+/// settings. Any thread.
 class DeviceSettings {
 public:
     [[nodiscard]] static std::expected<DeviceSettings, Error>
@@ -25,6 +26,12 @@ public:
 
     /// Reads the file again after it was changed; on an error all stays as it was.
     [[nodiscard]] std::expected<void, Error> reload();
+
+private:
+    struct State;
+    explicit DeviceSettings(std::shared_ptr<State> state);
+
+    std::shared_ptr<State> _state;
 };
 
 } // namespace nimbra::device

@@ -9,12 +9,12 @@
 namespace nimbra::device {
 
 /// Serial queues on the platform's threads, beside the main queue that the host's loop runs.
-/// Any thread.
+/// Any thread. A queue may outlive its maker, but then drops what is queued to it.
 class DeviceWorkQueues final : public WorkQueues {
 public:
     /// `mainQueue` is not owned and outlives the queues.
     explicit DeviceWorkQueues(WorkQueue& mainQueue);
-    /// Runs what is still queued, then ends the threads.
+    /// Runs what is still queued, and what that queues, then ends the threads. Not on one of them.
     ~DeviceWorkQueues() override;
 
     [[nodiscard]] WorkQueue& mainQueue() override;
@@ -26,11 +26,13 @@ public:
     /// Whether no background queue has work that is queued or under way.
     [[nodiscard]] bool isIdle() const;
     /// Calls `observer`, on the thread that ended the last piece of work, each time the queues
-    /// become idle. An empty one ends it.
+    /// become idle. An empty one ends it; a call that has begun runs to its end.
     void setIdleObserver(std::function<void()> observer);
 
 private:
     class Shared;
+    class Queue;
+
     std::shared_ptr<Shared> _shared;
     WorkQueue& _mainQueue;
 };

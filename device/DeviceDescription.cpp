@@ -1,0 +1,101 @@
+#include "device/DeviceDescription.h"
+
+#include "device/description/DescriptionParts.h"
+#include "device/description/DescriptionValues.h"
+#include "device/description/LaterParts.h"
+#include "device/json/JsonReader.h"
+
+#include <algorithm>
+#include <array>
+#include <iterator>
+
+namespace nimbra::device {
+
+namespace {
+
+/// A part that is only checked, under its key.
+struct LaterPart {
+    const char* key;
+    void (*check)(const JsonReader& reader);
+};
+
+constexpr std::array laterParts{
+    LaterPart{"apps", checkApplications},
+    LaterPart{"consent", checkConsent},
+    LaterPart{"deviceList", checkDeviceList},
+    LaterPart{"databaseSettings", checkDatabaseSettings},
+    LaterPart{"tool", checkTool},
+    LaterPart{"faults", checkFaults},
+};
+
+struct Part {
+    const char* key;
+    void (*read)(const JsonReader& reader, DeviceDescription& description);
+};
+
+constexpr std::array parts{
+    Part{"preferences", readPreferences}, Part{"restrictions", readRestrictions},
+    Part{"accounts", readAccounts},       Part{"documents", readDocuments},
+    Part{"strings", readStrings},
+};
+
+} // namespace
+
+DeviceDescription::DeviceDescription()
+    : now(std::chrono::sys_days(std::chrono::March / 5 / 2024) + std::chrono::hours(14) +
+          std::chrono::minutes(7) + std::chrono::seconds(9)),
+      accounts{{.identifier = "primary", .primary = true, .usesStratafile = true}} {}
+
+GivenDescription readDeviceDescription(const JsonReader& reader) {
+    reader.allowOnly({"name",
+                      "idiom",
+                      "screen",
+                      "locale",
+                      "timeZone",
+                      "now",
+                      "cellularData",
+                      "wirelessVariant",
+                      "preferences",
+                      "restrictions",
+                      "accounts",
+                      "apps",
+                      "consent",
+                      "documents",
+                      "deviceList",
+                      "databaseSettings",
+                      "tool",
+                      "strings",
+                      "paneBundleRegistered",
+                      "faults"});
+    GivenDescription given;
+    std::ranges::copy(reader.keys(), std::inserter(given.keys, given.keys.end()));
+
+    DeviceDescription& description = given.description;
+    readDeviceFacts(reader, description);
+    description.now = readInstant(reader.member("now"), description.now);
+    readAbilities(reader, description);
+    for (const Part& part : parts) {
+        if (const JsonReader value = reader.member(part.key); !value.isAbsent()) {
+            part.read(value, description);
+        }
+    }
+    description.paneBundleRegistered = reader.member("paneBundleRegistered").boolean(true);
+    for (const LaterPart& part : laterParts) {
+        if (const JsonReader value = reader.member(part.key); !value.isAbsent()) {
+            part.check(value);
+        }
+    }
+    return given;
+}
+
+std::vector<std::string> keysWithoutEffect(const GivenDescription& given) {
+    std::vector<std::string> keys;
+    for (const LaterPart& part : laterParts) {
+        if (given.keys.contains(part.key)) {
+            keys.emplace_back(part.key);
+        }
+    }
+    return keys;
+}
+
+} // namespace nimbra::device

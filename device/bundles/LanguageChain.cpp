@@ -1,0 +1,36 @@
+#include "device/bundles/LanguageChain.h"
+
+#include <algorithm>
+#include <unicode/locid.h>
+
+namespace nimbra::device {
+
+std::vector<std::string> languageChain(const std::string& locale) {
+    UErrorCode status = U_ZERO_ERROR;
+    icu::Locale full = icu::Locale::forLanguageTag(locale, status);
+    full.addLikelySubtags(status);
+    const std::string language = full.getLanguage();
+    const std::string script = full.getScript();
+    const std::string region = full.getCountry();
+    icu::Locale usual(language.c_str());
+    usual.addLikelySubtags(status);
+
+    std::vector<std::string> chain{locale};
+    const auto add = [&chain](const std::string& tag) {
+        if (std::ranges::find(chain, tag) == chain.end()) {
+            chain.push_back(tag);
+        }
+    };
+    if (U_FAILURE(status) != 0 || language.empty()) {
+        return chain;
+    }
+    add(language + '-' + script + '-' + region);
+    add(language + '-' + region);
+    add(language + '-' + script);
+    if (script == usual.getScript()) {
+        add(language);
+    }
+    return chain;
+}
+
+} // namespace nimbra::device

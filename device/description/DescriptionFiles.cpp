@@ -1,0 +1,102 @@
+#include "device/description/DescriptionFiles.h"
+
+#include "device/description/DescriptionParts.h"
+#include "device/files/Files.h"
+#include "device/json/JsonReader.h"
+
+namespace nimbra::device {
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+void readDevice(const JsonReader& reader, DeviceDescription& description) {
+    reader.allowOnly({"name", "idiom", "screen", "locale", "timeZone", "abilities"});
+    readDeviceFacts(reader, description);
+    const JsonReader abilities = reader.member("abilities");
+    abilities.allowOnly({"cellularData", "wirelessVariant"});
+    readAbilities(abilities, description);
+}
+
+Json orNull(const std::optional<std::string>& text) {
+    return text ? Json(*text) : Json(nullptr);
+}
+
+Json deviceContent(const DeviceDescription& description) {
+    Json screen;
+    if (description.screen) {
+        screen = Json{{"width", description.screen->width},
+                      {"height", description.screen->height},
+                      {"scale", description.screen->scale}};
+    }
+    return Json{{"name", description.name},
+                {"idiom", description.idiom},
+                {"screen", screen},
+                {"locale", description.locale},
+                {"timeZone", description.timeZone},
+                {"abilities", Json{{"cellularData", description.cellularData},
+                                   {"wirelessVariant", orNull(description.wirelessVariant)}}}};
+}
+
+Json restrictionsContent(const DeviceDescription& description) {
+    return Json{
+        {"cloudSyncDenied", description.cloudSyncDenied},
+        {"appCellularDataModificationAllowed", description.appCellularDataModificationAllowed}};
+}
+
+Json documentsContent(const DeviceDescription& description) {
+    Json containers = Json::array();
+    for (const DeviceDescription::Container& container : description.containers) {
+        containers.push_back(Json{{"identifier", container.identifier},
+                                  {"public", container.isPublic},
+                                  {"registrationFails", container.registrationFails}});
+    }
+    return Json{{"identity", orNull(description.identity)},
+                {"containers", containers},
+                {"lastSyncDate", description.lastSyncDate},
+                {"lastSyncText", description.lastSyncText}};
+}
+
+} // namespace
+
+const DescriptionFile deviceFile{kDeviceFile, readDevice, deviceContent};
+const DescriptionFile restrictionsFile{kRestrictionsFile, readRestrictions, restrictionsContent};
+const DescriptionFile documentsFile{kDocumentsFile, readDocuments, documentsContent};
+
+std::expected<DeviceDescription, Error> readDescriptionFile(const DevicePaths& paths,
+                                                            const DescriptionFile& file) {
+    const auto path = paths.resolve(file.path);
+    if (!path) {
+        return std::unexpected(path.error());
+    }
+    const auto reader = JsonReader::readFile(*path);
+    if (!reader) {
+        return std::unexpected(reader.error());
+    }
+    DeviceDescription description;
+    if (reader->isObject()) {
+        file.read(*reader, description);
+    } else {
+        reader->expected("an object");
+    }
+    if (const auto problem = reader->problem()) {
+        return std::unexpected(*problem);
+    }
+    return description;
+}
+
+std::expected<void, Error> writeDescriptionFile(const DevicePaths& paths,
+                                                const DescriptionFile& file,
+                                                const DeviceDescription& description) {
+    const auto path = paths.resolve(file.path);
+    if (!path) {
+        return std::unexpected(path.error());
+    }
+    return writeFileAtomically(*path, fileText(file.content(description)));
+}
+
+std::string fileText(const Json& content) {
+    return content.dump(2, ' ', false, Json::error_handler_t::replace) + '\n';
+}
+
+} // namespace nimbra::device

@@ -1,0 +1,135 @@
+#include "device/description/DescriptionValues.h"
+
+#include "device/description/Instant.h"
+
+#include <algorithm>
+#include <unicode/timezone.h>
+#include <unicode/uloc.h>
+#include <unicode/unistr.h>
+
+namespace nimbra::device {
+
+namespace {
+
+bool isLanguageTag(const std::string& tag) {
+    UErrorCode status = U_ZERO_ERROR;
+    char locale[ULOC_FULLNAME_CAPACITY]; // NOLINT(*-avoid-c-arrays): the library's interface
+    int parsed = 0;
+    uloc_forLanguageTag(tag.c_str(), locale, ULOC_FULLNAME_CAPACITY, &parsed, &status);
+    return U_SUCCESS(status) && !tag.empty() && static_cast<std::size_t>(parsed) == tag.size();
+}
+
+bool isTimeZone(const std::string& name) {
+    UErrorCode status = U_ZERO_ERROR;
+    UBool isKnown = 0;
+    icu::UnicodeString canonical;
+    icu::TimeZone::getCanonicalID(icu::UnicodeString::fromUTF8(name), canonical, isKnown, status);
+    return U_SUCCESS(status) && isKnown != 0;
+}
+
+} // namespace
+
+std::string readName(const JsonReader& reader) {
+    if (!reader.isString() || reader.string().empty()) {
+        reader.expected("a string that is not empty");
+        return {};
+    }
+    return reader.string();
+}
+
+std::string readName(const JsonReader& reader, const std::string& fallback) {
+    return reader.isAbsent() ? fallback : readName(reader);
+}
+
+std::optional<std::string> readNameOrNull(const JsonReader& reader) {
+    if (reader.isNull()) {
+        return std::nullopt;
+    }
+    if (!reader.isString() || reader.string().empty()) {
+        reader.expected("a string that is not empty, or null");
+    }
+    return reader.stringOrNull();
+}
+
+std::string readOneOf(const JsonReader& reader, std::initializer_list<std::string_view> names) {
+    if (reader.isString() && std::ranges::find(names, reader.string()) != names.end()) {
+        return reader.string();
+    }
+    std::string list;
+    for (const std::string_view name : names) {
+        list.append(list.empty() ? "" : ", ").append("\"").append(name).append("\"");
+    }
+    reader.expected("one of " + list);
+    return {};
+}
+
+std::string readLocale(const JsonReader& reader, const std::string& fallback) {
+    if (reader.isAbsent()) {
+        return fallback;
+    }
+    if (!reader.isString() || !isLanguageTag(reader.string())) {
+        reader.expected("a BCP 47 language tag such as \"de-DE\"");
+        return fallback;
+    }
+    return reader.string();
+}
+
+std::string readTimeZone(const JsonReader& reader, const std::string& fallback) {
+    if (reader.isAbsent()) {
+        return fallback;
+    }
+    if (!reader.isString() || !isTimeZone(reader.string())) {
+        reader.expected("the IANA name of a time zone such as \"Europe/Berlin\"");
+        return fallback;
+    }
+    return reader.string();
+}
+
+std::set<std::string> readDataclasses(const JsonReader& reader) {
+    std::set<std::string> names;
+    for (const JsonReader& element : reader.elements()) {
+        names.insert(readOneOf(
+            element, {"kAccountDataclassTidewater", "kAccountDataclassLarder",
+                      "kAccountDataclassTSYDatabaseService", "kAccountDataclassTSYDeviceService",
+                      "kAccountDataclassTSYShareService", "kAccountDataclassKeyValue"}));
+    }
+    return names;
+}
+
+std::set<std::string> readNames(const JsonReader& reader) {
+    std::set<std::string> names;
+    for (const JsonReader& element : reader.elements()) {
+        names.insert(readName(element));
+    }
+    return names;
+}
+
+std::chrono::system_clock::time_point readInstant(const JsonReader& reader,
+                                                  std::chrono::system_clock::time_point fallback) {
+    if (reader.isAbsent()) {
+        return fallback;
+    }
+    const auto instant = reader.isString() ? parseInstant(reader.string()) : std::nullopt;
+    if (!instant) {
+        reader.expected("an RFC 3339 instant such as \"2024-03-05T14:07:09Z\"");
+    }
+    return instant.value_or(fallback);
+}
+
+void checkError(const JsonReader& reader) {
+    if (!reader.isObject()) {
+        reader.expected("an error: an object with domain, code and description");
+        return;
+    }
+    reader.allowOnly({"domain", "code", "description"});
+    static_cast<void>(readName(reader.member("domain")));
+    if (reader.member("code").isAbsent()) {
+        reader.member("code").expected("an integer");
+    }
+    static_cast<void>(reader.member("code").integer());
+    if (!reader.member("description").isString()) {
+        reader.member("description").expected("a string");
+    }
+}
+
+} // namespace nimbra::device

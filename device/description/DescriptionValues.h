@@ -1,0 +1,40 @@
+#pragma once
+
+#include "device/json/JsonReader.h"
+
+#include <chrono>
+#include <initializer_list>
+#include <optional>
+#include <set>
+#include <string>
+#include <string_view>
+
+namespace nimbra::device {
+
+// Reading single values of a device's description. What is not as it should be is noted at the
+// reader; where nothing stands, a `fallback` is given, and without one that is noted as well.
+
+/// A string that is not empty.
+[[nodiscard]] std::string readName(const JsonReader& reader);
+[[nodiscard]] std::string readName(const JsonReader& reader, const std::string& fallback);
+/// A string that is not empty; nothing for null or nothing.
+[[nodiscard]] std::optional<std::string> readNameOrNull(const JsonReader& reader);
+/// One of `names`.
+[[nodiscard]] std::string readOneOf(const JsonReader& reader,
+                                    std::initializer_list<std::string_view> names);
+/// A BCP 47 tag.
+[[nodiscard]] std::string readLocale(const JsonReader& reader, const std::string& fallback);
+/// The IANA name of a time zone.
+[[nodiscard]] std::string readTimeZone(const JsonReader& reader, const std::string& fallback);
+/// An array of names of data classes.
+[[nodiscard]] std::set<std::string> readDataclasses(const JsonReader& reader);
+/// An array of strings that are not empty.
+[[nodiscard]] std::set<std::string> readNames(const JsonReader& reader);
+/// An instant as RFC 3339 writes it.
+[[nodiscard]] std::chrono::system_clock::time_point
+readInstant(const JsonReader& reader, std::chrono::system_clock::time_point fallback);
+
+/// Checks an error: an object with domain, code and description.
+void checkError(const JsonReader& reader);
+
+} // namespace nimbra::device

@@ -1,0 +1,128 @@
+#include "device/description/LaterParts.h"
+
+#include "device/description/DescriptionValues.h"
+#include "device/json/JsonReader.h"
+
+#include <cstdint>
+#include <string>
+
+namespace nimbra::device {
+
+namespace {
+
+void checkString(const JsonReader& reader) {
+    static_cast<void>(reader.string());
+}
+
+void checkBoolean(const JsonReader& reader) {
+    static_cast<void>(reader.boolean());
+}
+
+void checkIntegerBetween(const JsonReader& reader, std::int64_t least, std::int64_t most) {
+    const std::int64_t value = reader.integer(least);
+    if (value < least || value > most) {
+        reader.expected("an integer from " + std::to_string(least) + " to " + std::to_string(most));
+    }
+}
+
+/// Checks a list of outcomes in which null stands for success and `checkFailure` knows the others.
+template <class CheckFailure>
+void checkOutcomes(const JsonReader& reader, CheckFailure checkFailure) {
+    for (const JsonReader& outcome : reader.elements()) {
+        if (!outcome.isNull()) {
+            checkFailure(outcome);
+        }
+    }
+}
+
+constexpr std::int64_t highestNumber = INT32_MAX;
+constexpr int highestExit = 255;
+constexpr int highestSignal = 64;
+constexpr int highestErrno = 4095;
+
+} // namespace
+
+void checkApplications(const JsonReader& reader) {
+    for (const JsonReader& application : reader.elements()) {
+        application.allowOnly(
+            {"identifier", "name", "removedSystemApp", "entitlements", "running"});
+        static_cast<void>(readName(application.member("identifier")));
+        checkString(application.member("name"));
+        checkBoolean(application.member("removedSystemApp"));
+        static_cast<void>(application.member("entitlements").keys());
+        checkBoolean(application.member("running"));
+    }
+}
+
+void checkConsent(const JsonReader& reader) {
+    for (const JsonReader& record : reader.elements()) {
+        record.allowOnly({"service", "bundle", "granted"});
+        static_cast<void>(
+            readOneOf(record.member("service"), {"kPRVServiceTidewater", "kPRVServiceBrackwater"}));
+        static_cast<void>(readNameOrNull(record.member("bundle")));
+        const JsonReader granted = record.member("granted");
+        if (!granted.isNull() && !granted.isBoolean()) {
+            granted.expected("true, false or null");
+        }
+    }
+}
+
+void checkDeviceList(const JsonReader& reader) {
+    if (reader.isNull() || (reader.isString() && reader.string() == "never")) {
+        return;
+    }
+    if (!reader.isObject()) {
+        reader.expected("an object, null or \"never\"");
+        return;
+    }
+    reader.allowOnly({"incompatible", "needUpgrade"});
+    for (const char* const key : {"incompatible", "needUpgrade"}) {
+        for (const JsonReader& name : reader.member(key).elements()) {
+            checkString(name);
+        }
+    }
+}
+
+void checkDatabaseSettings(const JsonReader& reader) {
+    if (reader.isNull()) {
+        return;
+    }
+    if (!reader.isObject()) {
+        reader.expected("an object or null");
+        return;
+    }
+    reader.allowOnly({"numAppGroups"});
+    checkIntegerBetween(reader.member("numAppGroups"), 0, highestNumber);
+}
+
+void checkTool(const JsonReader& reader) {
+    if (reader.isNull() || (reader.isString() && reader.string() == "real")) {
+        return;
+    }
+    if (!reader.isObject()) {
+        reader.expected("an object, null or \"real\"");
+        return;
+    }
+    reader.allowOnly({"exit", "signal", "writesArchive"});
+    checkIntegerBetween(reader.member("exit"), 0, highestExit);
+    if (const JsonReader signal = reader.member("signal"); !signal.isNull()) {
+        checkIntegerBetween(signal, 1, highestSignal);
+    }
+    checkBoolean(reader.member("writesArchive"));
+}
+
+void checkFaults(const JsonReader& reader) {
+    reader.allowOnly({"save", "consentSet", "removeItem", "createDirectory", "spawn"});
+    for (const char* const key : {"save", "removeItem", "createDirectory"}) {
+        checkOutcomes(reader.member(key), checkError);
+    }
+    checkOutcomes(reader.member("consentSet"), [](const JsonReader& outcome) {
+        if (!outcome.isBoolean() || outcome.boolean()) {
+            outcome.expected("false or null");
+        }
+    });
+    checkOutcomes(reader.member("spawn"),
+                  [](const JsonReader& outcome) { checkIntegerBetween(outcome, 1, highestErrno); });
+}
+
+} // namespace nimbra::device

@@ -1,0 +1,17 @@
+#pragma once
+
+namespace nimbra::device {
+
+class JsonReader;
+
+// Parts of a device's description that nothing on the device uses yet: they are checked, so that a
+// description is right or wrong whatever the version that reads it.
+
+void checkApplications(const JsonReader& reader);
+void checkConsent(const JsonReader& reader);
+void checkDeviceList(const JsonReader& reader);
+void checkDatabaseSettings(const JsonReader& reader);
+void checkTool(const JsonReader& reader);
+void checkFaults(const JsonReader& reader);
+
+} // namespace nimbra::device

@@ -1,0 +1,40 @@
+#pragma once
+
+#include "platform/values/Error.h"
+
+#include <expected>
+#include <filesystem>
+#include <string_view>
+
+namespace nimbra::device {
+
+// Where things stand on a device, as it names them itself.
+
+inline constexpr std::string_view kStateDirectory = "/var/lib/nimbra";
+inline constexpr std::string_view kAccountsDatabase = "/var/lib/nimbra/accounts.db";
+inline constexpr std::string_view kDeviceFile = "/var/lib/nimbra/device.json";
+inline constexpr std::string_view kRestrictionsFile = "/var/lib/nimbra/restrictions.json";
+inline constexpr std::string_view kDocumentsFile = "/var/lib/nimbra/documents.json";
+inline constexpr std::string_view kPreferencesDirectory = "/var/lib/nimbra/preferences";
+inline constexpr std::string_view kPriorityHintsDirectory = "/run/nimbra/priority-hints";
+inline constexpr std::string_view kLogFile = "/var/log/nimbra/settings.log";
+
+/// Turns a path on the device into one of this machine: the last step before the file system.
+class DevicePaths {
+public:
+    /// The device whose root directory is `root`.
+    explicit DevicePaths(std::filesystem::path root);
+
+    [[nodiscard]] const std::filesystem::path& root() const { return _root; }
+
+    /// `devicePath` below the root, its links followed as the device itself would: ".." stops at
+    /// the root, and a link's target starts there. What does not exist (yet) is taken as written.
+    /// Links that lead round in a circle are an error.
+    [[nodiscard]] std::expected<std::filesystem::path, Error>
+    resolve(std::string_view devicePath) const;
+
+private:
+    std::filesystem::path _root;
+};
+
+} // namespace nimbra::device

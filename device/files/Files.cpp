@@ -1,0 +1,119 @@
+#include "device/files/Files.h"
+
+#include "device/DeviceError.h"
+
+#include <array>
+#include <cerrno>
+#include <cstdio>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace nimbra::device {
+
+namespace {
+
+/// An open file, closed with it.
+class Descriptor {
+public:
+    explicit Descriptor(int number) : _number(number) {}
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+    ~Descriptor() {
+        if (_number >= 0) {
+            ::close(_number);
+        }
+    }
+
+    [[nodiscard]] bool isOpen() const { return _number >= 0; }
+    [[nodiscard]] int number() const { return _number; }
+
+private:
+    int _number;
+};
+
+/// A file that is removed again, unless `keep` is called.
+class TemporaryFile {
+public:
+    explicit TemporaryFile(const std::filesystem::path& target)
+        : _name((target.parent_path() / ("." + target.filename().string() + ".XXXXXX")).string()),
+          _descriptor(::mkostemp(_name.data(), O_CLOEXEC)) {}
+    TemporaryFile(const TemporaryFile&) = delete;
+    TemporaryFile& operator=(const TemporaryFile&) = delete;
+    ~TemporaryFile() {
+        if (_descriptor.isOpen() && !_kept) {
+            ::unlink(_name.c_str());
+        }
+    }
+
+    [[nodiscard]] const std::string& name() const { return _name; }
+    [[nodiscard]] const Descriptor& descriptor() const { return _descriptor; }
+    void keep() { _kept = true; }
+
+private:
+    std::string _name;
+    Descriptor _descriptor;
+    bool _kept = false;
+};
+
+bool writeAll(int descriptor, std::string_view content) {
+    while (!content.empty()) {
+        const ssize_t written = ::write(descriptor, content.data(), content.size());
+        if (written < 0 && errno != EINTR) {
+            return false;
+        }
+        content.remove_prefix(static_cast<std::size_t>(written < 0 ? 0 : written));
+    }
+    return true;
+}
+
+/// The permissions of the file at `path`, or those of a new file that everybody may read.
+mode_t permissionsFor(const std::filesystem::path& path) {
+    struct stat status{};
+    return ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777U : 0644U;
+}
+
+} // namespace
+
+std::expected<std::string, Error> readFile(const std::filesystem::path& path) {
+    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    std::string content;
+    std::array<char, 65536> buffer{};
+    while (file.isOpen()) {
+        const ssize_t count = ::read(file.number(), buffer.data(), buffer.size());
+        if (count > 0) {
+            content.append(buffer.data(), static_cast<std::size_t>(count));
+        } else if (count == 0) {
+            return content;
+        } else if (errno != EINTR) {
+            break;
+        }
+    }
+    return std::unexpected(fileError(path, "cannot be read", errno));
+}
+
+std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,
+                                               std::string_view content) {
+    const auto failure = [&path] {
+        return std::unexpected(fileError(path, "cannot be written", errno));
+    };
+    TemporaryFile file(path);
+    if (!file.descriptor().isOpen() || !writeAll(file.descriptor().number(), content) ||
+        ::fchmod(file.descriptor().number(), permissionsFor(path)) != 0 ||
+        ::fsync(file.descriptor().number()) != 0 ||
+        ::rename(file.name().c_str(), path.c_str()) != 0) {
+        return failure();
+    }
+    file.keep();
+    return synchronizeDirectory(path.parent_path());
+}
+
+std::expected<void, Error> synchronizeDirectory(const std::filesystem::path& directory) {
+    const Descriptor descriptor(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (!descriptor.isOpen() || ::fsync(descriptor.number()) != 0) {
+        return std::unexpected(fileError(directory, "cannot be flushed", errno));
+    }
+    return {};
+}
+
+} // namespace nimbra::device

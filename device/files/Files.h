@@ -1,0 +1,26 @@
+#pragma once
+
+#include "platform/values/Error.h"
+
+#include <expected>
+#include <filesystem>
+#include <string>
+#include <string_view>
+
+namespace nimbra::device {
+
+/// Everything in the file at `path`, which may also be a pipe.
+[[nodiscard]] std::expected<std::string, Error> readFile(const std::filesystem::path& path);
+
+/// Makes `content` the whole content of the file at `path`, whose directory exists: it is written
+/// under a temporary name, flushed and renamed, so that a reader, and a machine that stops, see
+/// the earlier content or the new one. On an error the earlier content stays and nothing is left
+/// beside it.
+[[nodiscard]] std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,
+                                                             std::string_view content);
+
+/// Flushes the entries of `directory` to the disk.
+[[nodiscard]] std::expected<void, Error>
+synchronizeDirectory(const std::filesystem::path& directory);
+
+} // namespace nimbra::device

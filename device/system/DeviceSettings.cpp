@@ -1,0 +1,56 @@
+#include "device/system/DeviceSettings.h"
+
+#include "device/description/DescriptionFiles.h"
+#include "device/files/DevicePaths.h"
+
+#include <mutex>
+#include <optional>
+#include <utility>
+
+namespace nimbra::device {
+
+struct DeviceSettings::State {
+    DevicePaths paths;
+    mutable std::mutex mutex;
+    std::string locale;
+    std::string timeZone;
+    std::optional<std::string> overridingLocale;
+};
+
+DeviceSettings::DeviceSettings(std::shared_ptr<State> state) : _state(std::move(state)) {}
+
+std::expected<DeviceSettings, Error> DeviceSettings::open(const std::filesystem::path& root) {
+    DeviceSettings settings(std::make_shared<State>(DevicePaths(root)));
+    if (const auto read = settings.reload(); !read) {
+        return std::unexpected(read.error());
+    }
+    return settings;
+}
+
+std::string DeviceSettings::localeIdentifier() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->overridingLocale.value_or(_state->locale);
+}
+
+std::string DeviceSettings::timeZone() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->timeZone;
+}
+
+void DeviceSettings::overrideLocale(const std::string& identifier) {
+    const std::scoped_lock lock(_state->mutex);
+    _state->overridingLocale = identifier;
+}
+
+std::expected<void, Error> DeviceSettings::reload() {
+    auto description = readDescriptionFile(_state->paths, deviceFile);
+    if (!description) {
+        return std::unexpected(description.error());
+    }
+    const std::scoped_lock lock(_state->mutex);
+    _state->locale = std::move(description->locale);
+    _state->timeZone = std::move(description->timeZone);
+    return {};
+}
+
+} // namespace nimbra::device

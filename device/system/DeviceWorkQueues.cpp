@@ -1,0 +1,181 @@
+#include "device/system/DeviceWorkQueues.h"
+
+#include "device/system/DataOrSource.h"
+#include "device/system/SerialQueue.h"
+
+#include <algorithm>
+#include <condition_variable>
+#include <cstddef>
+#include <cstdlib>
+#include <future>
+#include <iostream>
+#include <list>
+#include <mutex>
+#include <pthread.h>
+#include <thread>
+#include <utility>
+
+namespace nimbra::device {
+
+/// What the queues and their maker share: the threads, and how much work there is.
+class DeviceWorkQueues::Shared {
+public:
+    /// A new queue with a thread of its own: a queue that waits for another never keeps a third
+    /// one from running.
+    std::shared_ptr<SerialQueue> addQueue(const std::string& label) {
+        auto queue = std::make_shared<SerialQueue>(label, [this] { workEnded(); });
+        const std::scoped_lock lock(_mutex);
+        joinEnded();
+        Thread& thread = _threads.emplace_back();
+        thread.queue = queue;
+        thread.thread = std::thread([this, queue, &thread] {
+            nameThread(queue->label());
+            queue->run();
+            const std::scoped_lock threadLock(_mutex);
+            thread.ended = true;
+        });
+        return queue;
+    }
+
+    /// Puts `work` behind what `queue` has; once the threads have ended it is dropped.
+    void add(SerialQueue& queue, WorkQueue::Work work) {
+        {
+            const std::scoped_lock lock(_mutex);
+            ++_unfinished;
+        }
+        if (!queue.add(work)) {
+            workEnded();
+        }
+    }
+
+    [[nodiscard]] bool isIdle() const {
+        const std::scoped_lock lock(_mutex);
+        return _unfinished == 0;
+    }
+
+    void setIdleObserver(std::function<void()> observer) {
+        const std::scoped_lock lock(_mutex);
+        _idleObserver = std::make_shared<std::function<void()>>(std::move(observer));
+    }
+
+    /// Waits until nothing is queued anywhere, as work may queue more work on another queue, then
+    /// ends the threads.
+    void finish() {
+        {
+            std::unique_lock lock(_mutex);
+            _idle.wait(lock, [this] { return _unfinished == 0; });
+        }
+        for (Thread& thread : _threads) {
+            thread.queue->close();
+            thread.thread.join();
+        }
+        _threads.clear();
+    }
+
+private:
+    struct Thread {
+        std::shared_ptr<SerialQueue> queue;
+        std::thread thread;
+        bool ended = false;
+    };
+
+    static void nameThread(const std::string& label) {
+        constexpr std::size_t longest = 15;
+        ::pthread_setname_np(::pthread_self(), label.substr(0, longest).c_str());
+    }
+
+    void workEnded() {
+        std::shared_ptr<std::function<void()>> observer;
+        {
+            const std::scoped_lock lock(_mutex);
+            if (--_unfinished > 0) {
+                return;
+            }
+            observer = _idleObserver;
+            _idle.notify_all();
+        }
+        if (observer && *observer) {
+            (*observer)();
+        }
+    }
+
+    /// Joins the threads whose queue was let go and has run dry.
+    void joinEnded() {
+        std::erase_if(_threads, [](Thread& thread) {
+            if (thread.ended) {
+                thread.thread.join();
+            }
+            return thread.ended;
+        });
+    }
+
+    mutable std::mutex _mutex;
+    std::condition_variable _idle;
+    std::list<Thread> _threads;
+    std::size_t _unfinished = 0;
+    std::shared_ptr<std::function<void()>> _idleObserver;
+};
+
+/// One serial queue as its owners hold it.
+class DeviceWorkQueues::Queue final : public WorkQueue {
+public:
+    Queue(std::shared_ptr<Shared> shared, const std::string& label)
+        : _shared(std::move(shared)), _queue(_shared->addQueue(label)) {}
+    Queue(const Queue&) = delete;
+    Queue& operator=(const Queue&) = delete;
+    ~Queue() override { _queue->close(); }
+
+    [[nodiscard]] const std::string& label() const override { return _queue->label(); }
+
+    void async(Work work) override { _shared->add(*_queue, std::move(work)); }
+
+    void sync(Work work) override {
+        if (_queue->isCurrent()) {
+            std::cerr << "nimbra: the queue \"" << label() << "\" waits for itself\n";
+            std::abort();
+        }
+        std::promise<void> ran;
+        const std::future<void> end = ran.get_future();
+        async([work = std::move(work), ran = std::move(ran)]() mutable {
+            work();
+            // Who waits may rely on it that nothing of the work is left.
+            work = nullptr;
+            ran.set_value();
+        });
+        end.wait();
+    }
+
+private:
+    std::shared_ptr<Shared> _shared;
+    std::shared_ptr<SerialQueue> _queue;
+};
+
+DeviceWorkQueues::DeviceWorkQueues(WorkQueue& mainQueue)
+    : _shared(std::make_shared<Shared>()), _mainQueue(mainQueue) {}
+
+DeviceWorkQueues::~DeviceWorkQueues() {
+    _shared->finish();
+}
+
+WorkQueue& DeviceWorkQueues::mainQueue() {
+    return _mainQueue;
+}
+
+std::shared_ptr<WorkQueue> DeviceWorkQueues::serialQueueWithLabel(const std::string& label) {
+    return std::make_shared<Queue>(_shared, label);
+}
+
+std::shared_ptr<EventSource>
+DeviceWorkQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
+    return std::make_shared<DataOrSource>(std::move(queue));
+}
+
+bool DeviceWorkQueues::isIdle() const {
+    return _shared->isIdle();
+}
+
+void DeviceWorkQueues::setIdleObserver(std::function<void()> observer) {
+    _shared->setIdleObserver(std::move(observer));
+}
+
+} // namespace nimbra::device
