@@ -18,6 +18,7 @@ namespace nimbra::device {
 
 class DeviceAccountStore;
 class DeviceBundles;
+class DevicePreferences;
 class DeviceSettings;
 class DeviceWorkQueues;
 
@@ -45,6 +46,7 @@ public:
 
     [[nodiscard]] DeviceAccountStore& accountStore();
     [[nodiscard]] DeviceBundles& bundles();
+    [[nodiscard]] const DevicePreferences& preferences() const;
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();
     [[nodiscard]] ClassRegistry& classes();

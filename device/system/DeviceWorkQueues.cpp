@@ -154,6 +154,10 @@ DeviceWorkQueues::DeviceWorkQueues(WorkQueue& mainQueue)
     : _shared(std::make_shared<Shared>()), _mainQueue(mainQueue) {}
 
 DeviceWorkQueues::~DeviceWorkQueues() {
+    finish();
+}
+
+void DeviceWorkQueues::finish() {
     _shared->finish();
 }
 

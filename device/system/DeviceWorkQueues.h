@@ -9,13 +9,16 @@
 namespace nimbra::device {
 
 /// Serial queues on the platform's threads, beside the main queue that the host's loop runs.
-/// Any thread. A queue may outlive its maker, but then drops what is queued to it.
+/// Any thread. A queue may outlive the threads, but then drops what is queued to it.
 class DeviceWorkQueues final : public WorkQueues {
 public:
     /// `mainQueue` is not owned and outlives the queues.
     explicit DeviceWorkQueues(WorkQueue& mainQueue);
-    /// Runs what is still queued, and what that queues, then ends the threads. Not on one of them.
+    /// Ends the threads as `finish` does.
     ~DeviceWorkQueues() override;
+
+    /// Runs what is still queued, and what that queues, then ends the threads. Not on one of them.
+    void finish();
 
     [[nodiscard]] WorkQueue& mainQueue() override;
     [[nodiscard]] std::shared_ptr<WorkQueue>

@@ -1,0 +1,173 @@
+#include "device/DeviceDirectory.h"
+
+#include "device/DeviceError.h"
+#include "device/description/DescriptionFiles.h"
+#include "device/files/DevicePaths.h"
+#include "device/files/Files.h"
+#include "device/files/StagedDirectory.h"
+#include "device/store/AccountDatabase.h"
+
+#include <algorithm>
+#include <array>
+#include <optional>
+#include <system_error>
+#include <utility>
+
+namespace nimbra::device {
+
+namespace {
+
+std::filesystem::path preferenceFileName(const std::string& domain) {
+    return domain + ".json";
+}
+
+std::expected<void, Error> writePreferences(const std::filesystem::path& directory,
+                                            const DeviceDescription& description) {
+    for (const auto& [domain, values] : description.preferences) {
+        if (auto written =
+                writeFileAtomically(directory / preferenceFileName(domain), fileText(values));
+            !written) {
+            return written;
+        }
+    }
+    return {};
+}
+
+/// Removes the files of the domains that `description` does not have.
+std::expected<void, Error> removeOtherPreferences(const std::filesystem::path& directory,
+                                                  const DeviceDescription& description) {
+    std::error_code failure;
+    for (std::filesystem::directory_iterator entry(directory, failure), end;
+         !failure && entry != end; entry.increment(failure)) {
+        const std::filesystem::path& file = entry->path();
+        if (file.extension() == ".json" && !description.preferences.contains(file.stem())) {
+            std::filesystem::remove(file, failure);
+        }
+    }
+    if (failure) {
+        return std::unexpected(fileError(directory, "cannot be changed", failure.value()));
+    }
+    return {};
+}
+
+std::expected<void, Error> replacePreferences(const DevicePaths& paths,
+                                              const DeviceDescription& description) {
+    const auto directory = paths.resolve(kPreferencesDirectory);
+    if (!directory) {
+        return std::unexpected(directory.error());
+    }
+    std::error_code failure;
+    std::filesystem::create_directory(*directory, failure);
+    if (failure) {
+        return std::unexpected(fileError(*directory, "cannot be made", failure.value()));
+    }
+    auto written = writePreferences(*directory, description);
+    return written ? removeOtherPreferences(*directory, description) : written;
+}
+
+/// Takes over what `device.json` holds, key by key.
+void applyFacts(const GivenDescription& change, DeviceDescription& description) {
+    const auto apply = [&](const char* key, auto member) {
+        if (change.keys.contains(key)) {
+            description.*member = change.description.*member;
+        }
+    };
+    apply("name", &DeviceDescription::name);
+    apply("idiom", &DeviceDescription::idiom);
+    apply("screen", &DeviceDescription::screen);
+    apply("locale", &DeviceDescription::locale);
+    apply("timeZone", &DeviceDescription::timeZone);
+    apply("cellularData", &DeviceDescription::cellularData);
+    apply("wirelessVariant", &DeviceDescription::wirelessVariant);
+}
+
+bool changesFacts(const GivenDescription& change) {
+    constexpr std::array facts{"name",     "idiom",        "screen",         "locale",
+                               "timeZone", "cellularData", "wirelessVariant"};
+    return std::ranges::any_of(facts,
+                               [&change](const char* key) { return change.keys.contains(key); });
+}
+
+std::expected<AccountDatabase, Error> openAccounts(const DevicePaths& paths) {
+    const auto path = paths.resolve(kAccountsDatabase);
+    if (!path) {
+        return std::unexpected(path.error());
+    }
+    return AccountDatabase::open(*path);
+}
+
+} // namespace
+
+std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
+                                                 const DeviceDescription& description) {
+    auto staged = StagedDirectory::start(root);
+    if (!staged) {
+        return std::unexpected(staged.error());
+    }
+    const DevicePaths paths(staged->path());
+    const auto below = [&staged](std::string_view devicePath) {
+        return staged->path() / std::filesystem::path(devicePath).relative_path();
+    };
+    std::error_code failure;
+    std::filesystem::create_directories(below(kPreferencesDirectory), failure);
+    if (failure) {
+        return std::unexpected(fileError(root, "cannot be made", failure.value()));
+    }
+    for (const DescriptionFile* file : {&deviceFile, &restrictionsFile, &documentsFile}) {
+        if (auto written = writeDescriptionFile(paths, *file, description); !written) {
+            return written;
+        }
+    }
+    if (auto written = writePreferences(below(kPreferencesDirectory), description); !written) {
+        return written;
+    }
+    {
+        // Closed before the directory moves.
+        auto accounts = AccountDatabase::create(below(kAccountsDatabase));
+        if (!accounts) {
+            return std::unexpected(accounts.error());
+        }
+        if (auto written = accounts->replaceAccounts(description.accounts); !written) {
+            return written;
+        }
+    }
+    return staged->putInPlace();
+}
+
+std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& root,
+                                                 const GivenDescription& change) {
+    const DevicePaths paths(root);
+    const DeviceDescription& description = change.description;
+    const auto isGiven = [&change](const char* key) { return change.keys.contains(key); };
+
+    // Everything is read before anything is written.
+    auto facts = readDescriptionFile(paths, deviceFile);
+    if (!facts) {
+        return std::unexpected(facts.error());
+    }
+    auto accounts = openAccounts(paths);
+    if (!accounts) {
+        return std::unexpected(accounts.error());
+    }
+
+    std::expected<void, Error> changed;
+    if (changesFacts(change)) {
+        applyFacts(change, *facts);
+        changed = writeDescriptionFile(paths, deviceFile, *facts);
+    }
+    if (changed && isGiven("restrictions")) {
+        changed = writeDescriptionFile(paths, restrictionsFile, description);
+    }
+    if (changed && isGiven("documents")) {
+        changed = writeDescriptionFile(paths, documentsFile, description);
+    }
+    if (changed && isGiven("preferences")) {
+        changed = replacePreferences(paths, description);
+    }
+    if (changed && isGiven("accounts")) {
+        changed = accounts->replaceAccounts(description.accounts);
+    }
+    return changed;
+}
+
+} // namespace nimbra::device

@@ -1,0 +1,53 @@
+#include "device/documents/PriorityHints.h"
+
+#include "device/DeviceError.h"
+#include "device/files/PercentEncoding.h"
+
+#include <cerrno>
+#include <fcntl.h>
+#include <system_error>
+#include <unistd.h>
+#include <utility>
+
+namespace nimbra::device {
+
+PriorityHints::PriorityHints(DevicePaths paths) : _paths(std::move(paths)) {}
+
+std::expected<std::filesystem::path, Error> PriorityHints::directory() const {
+    return _paths.resolve(std::string(kPriorityHintsDirectory) + '/' + std::to_string(::getpid()));
+}
+
+std::expected<void, Error> PriorityHints::add(const std::string& container) const {
+    const auto folder = directory();
+    if (!folder) {
+        return std::unexpected(folder.error());
+    }
+    std::error_code failure;
+    std::filesystem::create_directories(*folder, failure);
+    if (failure) {
+        return std::unexpected(fileError(*folder, "cannot be made", failure.value()));
+    }
+    const std::filesystem::path hint = *folder / percentEncoded(container);
+    constexpr mode_t readableByEverybody = 0644;
+    const int file = ::open(hint.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, readableByEverybody);
+    if (file < 0) {
+        return std::unexpected(fileError(hint, "cannot be made", errno));
+    }
+    ::close(file);
+    return {};
+}
+
+std::expected<void, Error> PriorityHints::removeAll() const {
+    const auto folder = directory();
+    if (!folder) {
+        return std::unexpected(folder.error());
+    }
+    std::error_code failure;
+    std::filesystem::remove_all(*folder, failure);
+    if (failure) {
+        return std::unexpected(fileError(*folder, "cannot be removed", failure.value()));
+    }
+    return {};
+}
+
+} // namespace nimbra::device

@@ -1,0 +1,130 @@
+#include "device/files/StagedDirectory.h"
+
+#include "device/DeviceError.h"
+#include "device/files/Files.h"
+
+#include <cerrno>
+#include <cstdlib>
+#include <string>
+#include <sys/stat.h>
+#include <system_error>
+#include <utility>
+
+namespace nimbra::device {
+
+namespace {
+
+constexpr mode_t readableByEverybody = 0755;
+
+/// `path` as an absolute one, without a slash at its end.
+std::filesystem::path absoluteName(const std::filesystem::path& path) {
+    std::error_code failure;
+    auto name = std::filesystem::absolute(path, failure).lexically_normal();
+    return name.has_filename() ? name : name.parent_path();
+}
+
+std::expected<void, Error> synchronizeTree(const std::filesystem::path& directory) {
+    std::error_code failure;
+    for (std::filesystem::recursive_directory_iterator entry(directory, failure), end;
+         !failure && entry != end; entry.increment(failure)) {
+        if (entry->is_directory(failure)) {
+            if (auto synchronized = synchronizeDirectory(entry->path()); !synchronized) {
+                return synchronized;
+            }
+        }
+    }
+    return synchronizeDirectory(directory);
+}
+
+} // namespace
+
+std::expected<StagedDirectory, Error> StagedDirectory::start(const std::filesystem::path& target) {
+    StagedDirectory staged;
+    staged._target = absoluteName(target);
+    std::error_code failure;
+    staged._targetExists = std::filesystem::exists(staged._target, failure);
+    if (staged._targetExists) {
+        const bool isEmpty = std::filesystem::is_directory(staged._target, failure) &&
+                             std::filesystem::is_empty(staged._target, failure);
+        if (!failure && !isEmpty) {
+            return std::unexpected(
+                deviceError(target.string() + ": exists and is not an empty directory"));
+        }
+    }
+    if (failure) {
+        return std::unexpected(fileError(target, "cannot be made", failure.value()));
+    }
+    if (auto made = staged.makeParents(); !made) {
+        return std::unexpected(made.error());
+    }
+    // An empty directory keeps its identity, as somebody may stand in it or have mounted it: what
+    // is built inside moves up in the end.
+    const auto place = staged._targetExists ? staged._target : staged._target.parent_path();
+    std::string name = (place / ".nimbra-device.XXXXXX").string();
+    if (::mkdtemp(name.data()) == nullptr) {
+        return std::unexpected(fileError(target, "cannot be made", errno));
+    }
+    staged._path = name;
+    if (::chmod(name.c_str(), readableByEverybody) != 0) {
+        return std::unexpected(fileError(target, "cannot be made", errno));
+    }
+    return staged;
+}
+
+StagedDirectory::StagedDirectory(StagedDirectory&& other) noexcept
+    : _target(std::move(other._target)), _path(std::exchange(other._path, {})),
+      _targetExists(other._targetExists), _made(std::exchange(other._made, {})) {}
+
+StagedDirectory::~StagedDirectory() {
+    std::error_code ignored; // nobody is left to be told
+    if (!_path.empty()) {
+        std::filesystem::remove_all(_path, ignored);
+    }
+    for (auto directory = _made.rbegin(); directory != _made.rend(); ++directory) {
+        std::filesystem::remove(*directory, ignored);
+    }
+}
+
+std::expected<void, Error> StagedDirectory::makeParents() {
+    std::vector<std::filesystem::path> missing;
+    std::error_code failure;
+    for (auto parent = _target.parent_path(); !std::filesystem::exists(parent, failure);
+         parent = parent.parent_path()) {
+        missing.push_back(parent);
+    }
+    for (auto parent = missing.rbegin(); parent != missing.rend() && !failure; ++parent) {
+        if (std::filesystem::create_directory(*parent, failure)) {
+            _made.push_back(*parent);
+        }
+    }
+    if (failure) {
+        return std::unexpected(fileError(_target, "cannot be made", failure.value()));
+    }
+    return {};
+}
+
+std::expected<void, Error> StagedDirectory::putInPlace() {
+    if (auto synchronized = synchronizeTree(_path); !synchronized) {
+        return synchronized;
+    }
+    std::error_code failure;
+    if (_targetExists) {
+        for (std::filesystem::directory_iterator entry(_path, failure), end;
+             !failure && entry != end; entry.increment(failure)) {
+            std::filesystem::rename(entry->path(), _target / entry->path().filename(), failure);
+        }
+    } else {
+        std::filesystem::rename(_path, _target, failure);
+    }
+    if (failure) {
+        return std::unexpected(fileError(_target, "cannot be made", failure.value()));
+    }
+    if (_targetExists) {
+        std::filesystem::remove(_path, failure);
+    }
+    _path.clear();
+    _made.clear();
+    return synchronizeDirectory(_targetExists ? _target : _target.parent_path());
+}
+
+} // namespace nimbra::device

@@ -1,0 +1,231 @@
+#include "device/store/AccountDatabase.h"
+
+#include "device/DeviceError.h"
+
+#include <algorithm>
+#include <array>
+#include <set>
+#include <string>
+#include <utility>
+
+namespace nimbra::device {
+
+namespace {
+
+/// The scripts that bring a database from one version to the next; the first makes a new one.
+constexpr std::array migrations{
+    R"(CREATE TABLE accounts (
+           identifier TEXT NOT NULL PRIMARY KEY,
+           position INTEGER NOT NULL,
+           is_primary INTEGER NOT NULL,
+           uses_stratafile INTEGER NOT NULL,
+           tessary_account TEXT
+       ) STRICT;
+       CREATE TABLE account_dataclasses (
+           account TEXT NOT NULL REFERENCES accounts (identifier) ON DELETE CASCADE,
+           dataclass TEXT NOT NULL,
+           enabled INTEGER NOT NULL,
+           provisioned INTEGER NOT NULL,
+           cellular INTEGER NOT NULL,
+           PRIMARY KEY (account, dataclass)
+       ) STRICT, WITHOUT ROWID;)",
+};
+constexpr auto currentVersion = static_cast<std::int64_t>(migrations.size());
+
+constexpr auto selectIdentifiers = "SELECT identifier FROM accounts ORDER BY position";
+// One statement sees one state, whatever another process writes meanwhile.
+constexpr auto selectAccount =
+    "SELECT uses_stratafile, dataclass, enabled FROM accounts "
+    "LEFT JOIN account_dataclasses ON account = identifier WHERE identifier = ?";
+constexpr auto insertAccountRow =
+    "INSERT INTO accounts (identifier, position, is_primary, uses_stratafile, tessary_account) "
+    "VALUES (?, ?, ?, ?, ?)";
+constexpr auto insertDataclassRow =
+    "INSERT INTO account_dataclasses (account, dataclass, enabled, provisioned, cellular) "
+    "VALUES (?, ?, ?, ?, ?)";
+
+Database::Value orNull(const std::optional<std::string>& text) {
+    return text ? Database::Value(*text) : Database::Value(nullptr);
+}
+
+Error notADatabase(const std::filesystem::path& path, const std::string& reason) {
+    return deviceError(path.string() + ": not an account database: " + reason);
+}
+
+/// `error` of the database at `path`, told as the reason why it is none.
+Error notADatabase(const std::filesystem::path& path, const Error& error) {
+    const std::string start = path.string() + ": ";
+    return notADatabase(path, error.description.starts_with(start)
+                                  ? error.description.substr(start.size())
+                                  : error.description);
+}
+
+} // namespace
+
+AccountDatabase::AccountDatabase(std::unique_ptr<Database> database)
+    : _database(std::move(database)) {}
+
+std::expected<AccountDatabase, Error> AccountDatabase::create(const std::filesystem::path& path) {
+    auto opened = Database::open(path, Database::Access::create);
+    if (!opened) {
+        return std::unexpected(opened.error());
+    }
+    AccountDatabase database(std::move(*opened));
+    if (auto set = database._database->executeScript("PRAGMA journal_mode = WAL"); !set) {
+        return std::unexpected(set.error());
+    }
+    if (auto migrated = database.migrate(); !migrated) {
+        return std::unexpected(migrated.error());
+    }
+    return database;
+}
+
+std::expected<AccountDatabase, Error> AccountDatabase::open(const std::filesystem::path& path) {
+    auto opened = Database::open(path, Database::Access::existing);
+    if (!opened) {
+        return std::unexpected(notADatabase(path, opened.error()));
+    }
+    AccountDatabase database(std::move(*opened));
+    if (const auto checked = database.check(); !checked) {
+        database._database->leaveAsFound();
+        return std::unexpected(notADatabase(path, checked.error()));
+    }
+    if (auto migrated = database.migrate(); !migrated) {
+        return std::unexpected(migrated.error());
+    }
+    return database;
+}
+
+std::expected<std::int64_t, Error> AccountDatabase::version() {
+    std::int64_t version = 0;
+    const auto read =
+        _database->query("PRAGMA user_version", {},
+                         [&version](const Database::Row& row) { version = row.integer(0); });
+    if (!read) {
+        return std::unexpected(read.error());
+    }
+    return version;
+}
+
+std::expected<void, Error> AccountDatabase::check() {
+    const auto found = version();
+    if (!found) {
+        return std::unexpected(found.error());
+    }
+    if (*found < 1) {
+        return std::unexpected(deviceError("it has no version"));
+    }
+    if (*found > currentVersion) {
+        return std::unexpected(deviceError("it has version " + std::to_string(*found) +
+                                           ", this program knows up to " +
+                                           std::to_string(currentVersion)));
+    }
+    std::string verdict;
+    const auto checked =
+        _database->query("PRAGMA quick_check(1)", {},
+                         [&verdict](const Database::Row& row) { verdict = row.text(0); });
+    if (!checked) {
+        return std::unexpected(checked.error());
+    }
+    if (verdict != "ok") {
+        return std::unexpected(deviceError("it is damaged: " + verdict));
+    }
+    // Preparing the statements shows whether the tables are there.
+    if (const auto read = accountIdentifiers(); !read) {
+        return std::unexpected(read.error());
+    }
+    if (const auto read = account(AccountIdentifier("")); !read) {
+        return std::unexpected(read.error());
+    }
+    return {};
+}
+
+std::expected<void, Error> AccountDatabase::migrate() {
+    const auto found = version();
+    if (!found) {
+        return std::unexpected(found.error());
+    }
+    if (*found == currentVersion) {
+        return {};
+    }
+    return _database->transaction([this, version = *found]() -> std::expected<void, Error> {
+        for (auto step = version; step < currentVersion; ++step) {
+            if (auto migrated =
+                    _database->executeScript(migrations.at(static_cast<std::size_t>(step)));
+                !migrated) {
+                return migrated;
+            }
+        }
+        return _database->executeScript("PRAGMA user_version = " + std::to_string(currentVersion));
+    });
+}
+
+std::expected<std::vector<AccountIdentifier>, Error> AccountDatabase::accountIdentifiers() {
+    std::vector<AccountIdentifier> identifiers;
+    const auto read =
+        _database->query(selectIdentifiers, {}, [&identifiers](const Database::Row& row) {
+            identifiers.emplace_back(row.text(0));
+        });
+    if (!read) {
+        return std::unexpected(read.error());
+    }
+    return identifiers;
+}
+
+std::expected<std::optional<DeviceAccount::Record>, Error>
+AccountDatabase::account(const AccountIdentifier& identifier) {
+    std::optional<DeviceAccount::Record> record;
+    const auto read = _database->query(
+        selectAccount, {identifier.string()}, [&record, &identifier](const Database::Row& row) {
+            if (!record) {
+                record.emplace(DeviceAccount::Record{.identifier = identifier,
+                                                     .usesStratafile = row.integer(0) != 0});
+            }
+            if (!row.isNull(1) && row.integer(2) != 0) {
+                record->enabled.emplace(row.text(1));
+            }
+        });
+    if (!read) {
+        return std::unexpected(read.error());
+    }
+    return record;
+}
+
+std::expected<void, Error> AccountDatabase::replaceAccounts(
+    const std::vector<DeviceDescription::AccountDescription>& accounts) {
+    return _database->transaction([this, &accounts]() -> std::expected<void, Error> {
+        if (auto emptied = _database->execute("DELETE FROM accounts", {}); !emptied) {
+            return emptied;
+        }
+        std::int64_t position = 0;
+        for (const DeviceDescription::AccountDescription& account : accounts) {
+            if (auto inserted = insertAccount(account, position++); !inserted) {
+                return inserted;
+            }
+        }
+        return {};
+    });
+}
+
+std::expected<void, Error>
+AccountDatabase::insertAccount(const DeviceDescription::AccountDescription& account,
+                               std::int64_t position) {
+    auto inserted = _database->execute(
+        insertAccountRow, {account.identifier, position, std::int64_t{account.primary},
+                           std::int64_t{account.usesStratafile}, orNull(account.tessaryAccount)});
+    std::set<std::string> dataclasses = account.enabled;
+    dataclasses.insert(account.provisioned.begin(), account.provisioned.end());
+    dataclasses.insert(account.cellular.begin(), account.cellular.end());
+    for (const std::string& dataclass : dataclasses) {
+        if (inserted) {
+            inserted = _database->execute(insertDataclassRow,
+                                          {account.identifier, dataclass,
+                                           std::int64_t{account.enabled.contains(dataclass)},
+                                           std::int64_t{account.provisioned.contains(dataclass)},
+                                           std::int64_t{account.cellular.contains(dataclass)}});
+        }
+    }
+    return inserted;
+}
+
+} // namespace nimbra::device

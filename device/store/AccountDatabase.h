@@ -1,0 +1,52 @@
+#pragma once
+
+#include "device/DeviceDescription.h"
+#include "device/store/Database.h"
+#include "device/store/DeviceAccount.h"
+#include "platform/values/Error.h"
+#include "platform/values/Identifier.h"
+
+#include <expected>
+#include <filesystem>
+#include <memory>
+#include <optional>
+#include <vector>
+
+namespace nimbra::device {
+
+/// The database of a device's accounts: its form, and what is read and written. Not thread-safe.
+class AccountDatabase {
+public:
+    /// Makes a new database without accounts at `path`, where nothing stands.
+    [[nodiscard]] static std::expected<AccountDatabase, Error>
+    create(const std::filesystem::path& path);
+
+    /// Opens the database at `path`, which an earlier version may have made. A file that is no
+    /// such database, is damaged or was made by a later version is an error, and stays untouched.
+    [[nodiscard]] static std::expected<AccountDatabase, Error>
+    open(const std::filesystem::path& path);
+
+    /// The accounts in their order.
+    [[nodiscard]] std::expected<std::vector<AccountIdentifier>, Error> accountIdentifiers();
+
+    /// What is kept of one account; nothing when there is no such account.
+    [[nodiscard]] std::expected<std::optional<DeviceAccount::Record>, Error>
+    account(const AccountIdentifier& identifier);
+
+    /// Makes `accounts` the only ones, in their order; one transaction.
+    [[nodiscard]] std::expected<void, Error>
+    replaceAccounts(const std::vector<DeviceDescription::AccountDescription>& accounts);
+
+private:
+    explicit AccountDatabase(std::unique_ptr<Database> database);
+
+    [[nodiscard]] std::expected<void, Error> check();
+    [[nodiscard]] std::expected<void, Error> migrate();
+    [[nodiscard]] std::expected<std::int64_t, Error> version();
+    [[nodiscard]] std::expected<void, Error>
+    insertAccount(const DeviceDescription::AccountDescription& account, std::int64_t position);
+
+    std::unique_ptr<Database> _database;
+};
+
+} // namespace nimbra::device

@@ -1,0 +1,191 @@
+#include "device/store/Database.h"
+
+#include "device/DeviceError.h"
+#include "device/files/PercentEncoding.h"
+
+#include <SQLiteCpp/SQLiteCpp.h>
+#include <map>
+#include <sqlite3.h>
+#include <system_error>
+#include <utility>
+
+namespace nimbra::device {
+
+namespace {
+
+constexpr int busyTimeoutMilliseconds = 5000;
+
+Error databaseError(const std::filesystem::path& path, const SQLite::Exception& exception) {
+    return {.domain = "SQLite",
+            .code = exception.getErrorCode(),
+            .description = oneLine(path.string() + ": " + exception.what())};
+}
+
+std::filesystem::path withSuffix(std::filesystem::path path, const char* suffix) {
+    path += suffix;
+    return path;
+}
+
+/// Whether changes stand beside the database that have not been moved into it.
+bool hasPendingChanges(const std::filesystem::path& path) {
+    std::error_code absent;
+    const auto size = std::filesystem::file_size(withSuffix(path, "-wal"), absent);
+    return !absent && size > 0;
+}
+
+/// Opens a database in a directory in which nothing can be written, as it stands. Locks and
+/// pending changes need files beside it.
+SQLite::Database openAsItStands(const std::filesystem::path& path) {
+    return {"file:" + percentEncoded(path.string(), "/") + "?immutable=1",
+            SQLite::OPEN_READONLY | SQLite::OPEN_URI};
+}
+
+SQLite::Database openExisting(const std::filesystem::path& path) {
+    try {
+        SQLite::Database database(path.string(), SQLite::OPEN_READWRITE, busyTimeoutMilliseconds);
+        // Opening reads nothing yet; this does.
+        static_cast<void>(database.execAndGet("PRAGMA schema_version"));
+        return database;
+    } catch (const SQLite::Exception& exception) {
+        const int code = exception.getErrorCode();
+        std::error_code absent;
+        if ((code != SQLITE_CANTOPEN && code != SQLITE_READONLY) ||
+            !std::filesystem::is_regular_file(path, absent) || hasPendingChanges(path)) {
+            throw;
+        }
+        return openAsItStands(path);
+    }
+}
+
+/// Brings a kept statement back to its beginning for whoever uses it next.
+class StatementUse {
+public:
+    explicit StatementUse(SQLite::Statement& statement) : _statement(statement) {}
+    StatementUse(const StatementUse&) = delete;
+    StatementUse& operator=(const StatementUse&) = delete;
+    ~StatementUse() {
+        // It repeats the error of the run, which has been reported.
+        static_cast<void>(_statement.tryReset());
+    }
+
+private:
+    SQLite::Statement& _statement;
+};
+
+} // namespace
+
+struct Database::Connection {
+    std::filesystem::path path;
+    bool foundPendingChanges;
+    SQLite::Database database;
+    std::map<std::string, SQLite::Statement> statements;
+
+    SQLite::Statement& statement(const std::string& sql) {
+        const auto kept = statements.find(sql);
+        return kept != statements.end()
+                   ? kept->second
+                   : statements.emplace(sql, SQLite::Statement(database, sql)).first->second;
+    }
+
+    /// Runs `work`, which may throw what the library throws.
+    template <class Work>
+    std::expected<void, Error> guarded(Work work) const {
+        try {
+            work();
+            return {};
+        } catch (const SQLite::Exception& exception) {
+            return std::unexpected(databaseError(path, exception));
+        }
+    }
+};
+
+bool Database::Row::isNull(int column) const {
+    return _statement.isColumnNull(column);
+}
+
+std::int64_t Database::Row::integer(int column) const {
+    return _statement.getColumn(column).getInt64();
+}
+
+std::string Database::Row::text(int column) const {
+    return _statement.getColumn(column).getString();
+}
+
+Database::Database(std::unique_ptr<Connection> connection) : _connection(std::move(connection)) {}
+
+Database::~Database() = default;
+
+std::expected<std::unique_ptr<Database>, Error> Database::open(const std::filesystem::path& path,
+                                                               Access access) {
+    const bool foundPendingChanges = hasPendingChanges(path);
+    try {
+        SQLite::Database database =
+            access == Access::existing
+                ? openExisting(path)
+                : SQLite::Database(path.string(), SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE,
+                                   busyTimeoutMilliseconds);
+        database.exec("PRAGMA foreign_keys = ON");
+        return std::unique_ptr<Database>(new Database(
+            std::make_unique<Connection>(path, foundPendingChanges, std::move(database),
+                                         std::map<std::string, SQLite::Statement>())));
+    } catch (const SQLite::Exception& exception) {
+        return std::unexpected(databaseError(path, exception));
+    }
+}
+
+std::expected<void, Error> Database::query(const std::string& sql, const Values& values,
+                                           const std::function<void(const Row& row)>& useRow) {
+    return _connection->guarded([&] {
+        SQLite::Statement& statement = _connection->statement(sql);
+        const StatementUse use(statement);
+        for (std::size_t index = 0; index < values.size(); ++index) {
+            const int place = static_cast<int>(index) + 1;
+            if (const auto* number = std::get_if<std::int64_t>(&values[index])) {
+                statement.bind(place, *number);
+            } else if (const auto* text = std::get_if<std::string>(&values[index])) {
+                statement.bind(place, *text);
+            } else {
+                statement.bind(place);
+            }
+        }
+        const Row row(statement);
+        while (statement.executeStep()) {
+            useRow(row);
+        }
+    });
+}
+
+std::expected<void, Error> Database::execute(const std::string& sql, const Values& values) {
+    return query(sql, values, [](const Row&) {});
+}
+
+std::expected<void, Error> Database::executeScript(const std::string& sql) {
+    return _connection->guarded([&] { _connection->database.exec(sql); });
+}
+
+std::expected<void, Error>
+Database::transaction(const std::function<std::expected<void, Error>()>& write) {
+    std::expected<void, Error> written;
+    const auto ended = _connection->guarded([&] {
+        SQLite::Transaction transaction(_connection->database,
+                                        SQLite::TransactionBehavior::IMMEDIATE);
+        written = write();
+        if (written) {
+            transaction.commit();
+        }
+    });
+    return written ? ended : written;
+}
+
+void Database::leaveAsFound() {
+    if (_connection->foundPendingChanges) {
+        static_cast<void>(::sqlite3_db_config(_connection->database.getHandle(),
+                                              SQLITE_DBCONFIG_NO_CKPT_ON_CLOSE, 1, nullptr));
+    }
+}
+
+const std::filesystem::path& Database::path() const {
+    return _connection->path;
+}
+
+} // namespace nimbra::device

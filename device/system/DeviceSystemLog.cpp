@@ -1,0 +1,148 @@
+#include "device/system/DeviceSystemLog.h"
+
+#include "device/DeviceError.h"
+
+#include <array>
+#include <cstdlib>
+#include <iostream>
+#include <mutex>
+#include <spdlog/logger.h>
+#include <spdlog/sinks/rotating_file_sink.h>
+#include <string>
+#include <string_view>
+#include <sys/uio.h>
+#include <syslog.h>
+#include <systemd/sd-journal.h>
+#include <utility>
+
+namespace nimbra::device {
+
+namespace {
+
+constexpr auto programName = "nimbra-settings";
+
+/// The level as the lines name it.
+const char* nameOf(LogLevel level) {
+    switch (level) {
+    case LogLevel::debug:
+        return "debug";
+    case LogLevel::standard:
+        return "default";
+    case LogLevel::error:
+        return "error";
+    }
+    return "";
+}
+
+int priorityOf(LogLevel level) {
+    switch (level) {
+    case LogLevel::debug:
+        return LOG_DEBUG;
+    case LogLevel::standard:
+        return LOG_NOTICE;
+    case LogLevel::error:
+        return LOG_ERR;
+    }
+    return LOG_ERR;
+}
+
+void writeToStandardError(const std::string& line) {
+    // One insertion, so that the lines of two threads do not mix.
+    std::cerr << std::string(programName) + ": " + line + '\n';
+}
+
+} // namespace
+
+/// The log file, made when something is to be written.
+class DeviceSystemLog::File {
+public:
+    void write(const DevicePaths& paths, LogLevel level, const std::string& line) {
+        const std::scoped_lock lock(_mutex);
+        if (!_opened) {
+            _opened = true;
+            open(paths);
+        }
+        if (_logger) {
+            _logger->log(level == LogLevel::error ? spdlog::level::err : spdlog::level::info, line);
+        }
+    }
+
+private:
+    void open(const DevicePaths& paths) {
+        constexpr std::size_t largest = 1024UL * 1024UL;
+        constexpr std::size_t earlierFiles = 2;
+        const auto path = paths.resolve(kLogFile);
+        if (!path) {
+            writeToStandardError(path.error().description);
+            return;
+        }
+        try {
+            _logger = std::make_unique<spdlog::logger>(
+                programName, std::make_shared<spdlog::sinks::rotating_file_sink_mt>(
+                                 path->string(), largest, earlierFiles));
+        } catch (const spdlog::spdlog_ex& exception) {
+            writeToStandardError(oneLine(path->string() + ": " + exception.what()));
+            return;
+        }
+        _logger->set_pattern("%Y-%m-%dT%H:%M:%S.%e%z %v");
+        _logger->flush_on(spdlog::level::trace);
+        _logger->set_error_handler([name = path->string()](const std::string& reason) {
+            writeToStandardError(oneLine(name + ": " + reason));
+        });
+    }
+
+    std::mutex _mutex;
+    std::unique_ptr<spdlog::logger> _logger;
+    bool _opened = false;
+};
+
+DeviceSystemLog::Destination DeviceSystemLog::usualDestination() {
+    std::error_code absent;
+    return std::filesystem::exists("/run/systemd/journal/socket", absent) ? Destination::journal
+                                                                          : Destination::file;
+}
+
+DeviceSystemLog::DeviceSystemLog(DevicePaths paths, Destination destination)
+    : _paths(std::move(paths)), _destination(destination), _file(std::make_unique<File>()) {
+    const char* const wish = std::getenv("NIMBRA_LOG");
+    _debugEnabled = wish != nullptr && std::string_view(wish) == "debug";
+}
+
+DeviceSystemLog::~DeviceSystemLog() = default;
+
+bool DeviceSystemLog::isEnabled(LogLevel level) const {
+    return level != LogLevel::debug || _debugEnabled;
+}
+
+void DeviceSystemLog::write(LogLevel level, const std::string& message) {
+    if (!isEnabled(level)) {
+        return;
+    }
+    if (_destination == Destination::journal) {
+        writeToJournal(level, message);
+        return;
+    }
+    const std::string line = std::string(nameOf(level)) + ": " + oneLine(message);
+    if (level == LogLevel::error) {
+        writeToStandardError(line);
+    }
+    _file->write(_paths, level, line);
+}
+
+void DeviceSystemLog::writeToJournal(LogLevel level, const std::string& message) const {
+    std::array fields{
+        "MESSAGE=" + oneLine(message), "PRIORITY=" + std::to_string(priorityOf(level)),
+        std::string("SYSLOG_IDENTIFIER=") + programName,
+        std::string("NIMBRA_LEVEL=") + nameOf(level), "NIMBRA_DEVICE=" + _paths.root().string()};
+    std::array<iovec, fields.size()> parts{};
+    for (std::size_t index = 0; index < fields.size(); ++index) {
+        parts.at(index) = {.iov_base = fields.at(index).data(), .iov_len = fields.at(index).size()};
+    }
+    if (const int result = ::sd_journal_sendv(parts.data(), static_cast<int>(parts.size()));
+        result < 0) {
+        writeToStandardError(fileError("journal", "cannot be written", -result).description + ": " +
+                             oneLine(message));
+    }
+}
+
+} // namespace nimbra::device

@@ -1,0 +1,42 @@
+#pragma once
+
+#include "device/files/DevicePaths.h"
+#include "platform/system/SystemLog.h"
+
+#include <memory>
+
+namespace nimbra::device {
+
+/// The system log of a device. Any thread.
+///
+/// The lines go to the journal of the machine where it runs one, with the level's name in the
+/// field NIMBRA_LEVEL and its priority: debug, notice or error. Elsewhere they go to the device's
+/// log file, which is opened for the first line, and those of level error to standard error as
+/// well; each line names its level. Debug is enabled only while the environment variable NIMBRA_LOG
+/// is "debug".
+class DeviceSystemLog final : public SystemLog {
+public:
+    enum class Destination { journal, file };
+
+    /// The journal where there is one, else the file.
+    [[nodiscard]] static Destination usualDestination();
+
+    DeviceSystemLog(DevicePaths paths, Destination destination);
+    ~DeviceSystemLog() override;
+
+    [[nodiscard]] bool isEnabled(LogLevel level) const override;
+    /// What is not enabled is dropped. A line that cannot be written is told to standard error.
+    void write(LogLevel level, const std::string& message) override;
+
+private:
+    class File;
+
+    void writeToJournal(LogLevel level, const std::string& message) const;
+
+    DevicePaths _paths;
+    Destination _destination;
+    bool _debugEnabled;
+    std::unique_ptr<File> _file;
+};
+
+} // namespace nimbra::device
