@@ -1,0 +1,109 @@
+#include "tests/pane/PaneFixture.h"
+
+namespace nimbra::test {
+namespace {
+
+struct DependentRowsTest : PaneFixture {
+    void flip(bool on) {
+        pane->turn(on);
+        pane->_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+    }
+};
+
+TEST_F(DependentRowsTest, TurningOnShowsTheRowsInOneAnimatedBatch) {
+    storeTidewater(false);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+
+    flip(true);
+
+    EXPECT_EQ(platform.calls,
+              Calls({"begin", "insert RSPStatusInfo after Nimbra Drive, animated",
+                     "append RSPUIApps Alpha Zeta, animated", "append RSPCellular C, animated",
+                     "append RSPDiagnostics D, animated", "end"}));
+}
+
+TEST_F(DependentRowsTest, TurningOnGivesTheOrderOfAFreshBuild) {
+    storeTidewater(false);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+
+    flip(true);
+    const std::string afterFlip = rows();
+    pane->reloadSpecifiers();
+
+    EXPECT_EQ(afterFlip, rows());
+}
+
+TEST_F(DependentRowsTest, ASecondCallWithTheSwitchOnChangesNothing) {
+    storeTidewater(false);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+    flip(true);
+    platform.calls.clear();
+
+    pane->_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+
+    EXPECT_EQ(platform.calls, Calls());
+}
+
+TEST_F(DependentRowsTest, TurningOffRemovesTheRowsInOneAnimatedBatch) {
+    storeTidewater(true);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+
+    flip(false);
+
+    EXPECT_EQ(
+        platform.calls,
+        Calls({"begin", "remove RSPDiagnostics D, animated", "remove RSPCellular C, animated",
+               "remove RSPUIApps Alpha Zeta, animated", "remove RSPStatusInfo, animated", "end"}));
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPLookMeUpByEmail T");
+}
+
+TEST_F(DependentRowsTest, TurningOffTwiceFindsNothingToRemove) {
+    storeTidewater(true);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+    flip(false);
+    platform.calls.clear();
+
+    pane->_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+
+    EXPECT_EQ(platform.calls, Calls({"begin", "end"}));
+}
+
+TEST_F(DependentRowsTest, AFlipMovesTheRowsThatAreThereAndAsksForNoApps) {
+    storeTidewater(true);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+    const SpecifierArray before = pane->specifiers();
+
+    flip(false);
+    flip(true);
+
+    EXPECT_EQ(pane->specifiers(), before);
+    EXPECT_EQ(pane->appQueries, 1);
+}
+
+TEST_F(DependentRowsTest, WithoutRowsAroundItOnlyTheStatusGroupComesAndGoes) {
+    storeTidewater(false);
+    static_cast<void>(pane->specifiers());
+
+    flip(true);
+    flip(false);
+
+    EXPECT_EQ(platform.calls, Calls({"begin", "insert RSPStatusInfo after Nimbra Drive, animated",
+                                     "end", "begin", "remove RSPStatusInfo, animated", "end"}));
+}
+
+TEST_F(DependentRowsTest, BeforeTheListIsBuiltThereIsNothingToHide) {
+    storeTidewater(false);
+
+    pane->_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+
+    EXPECT_EQ(platform.calls, Calls());
+}
+
+} // namespace
+} // namespace nimbra::test

@@ -1,0 +1,116 @@
+#include "device/system/DeviceWorkQueues.h"
+#include "tests/pane/PaneFixture.h"
+
+#include <algorithm>
+#include <atomic>
+#include <latch>
+#include <memory>
+#include <thread>
+#include <utility>
+#include <vector>
+
+namespace nimbra::test {
+namespace {
+
+constexpr int kPostingThreads = 4;
+constexpr int kVisits = 200;
+
+/// Real queues, which a test can wait for.
+class WatchedQueues final : public WorkQueues {
+public:
+    explicit WatchedQueues(WorkQueue& mainQueue) : _queues(mainQueue) {}
+
+    [[nodiscard]] WorkQueue& mainQueue() override { return _queues.mainQueue(); }
+    [[nodiscard]] std::shared_ptr<WorkQueue>
+    serialQueueWithLabel(const std::string& label) override {
+        _made.push_back(_queues.serialQueueWithLabel(label));
+        return _made.back();
+    }
+    [[nodiscard]] std::shared_ptr<EventSource>
+    dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override {
+        return _queues.dataOrSourceOnQueue(std::move(queue));
+    }
+
+    /// Waits until what is queued by now has run.
+    void finishWork() {
+        for (const auto& queue : _made) {
+            queue->sync([] {});
+        }
+    }
+
+private:
+    device::DeviceWorkQueues _queues;
+    std::vector<std::shared_ptr<WorkQueue>> _made;
+};
+
+/// The pane over real queues and threads, with notifications coming from everywhere at once.
+struct HintingRaceTest : PaneFixture {
+    PumpedQueue mainQueue{"main"};
+
+    [[nodiscard]] PlatformServices servicesOver(WorkQueues& queues) {
+        const PlatformServices fakes = platform.services();
+        return {.presenter = fakes.presenter,
+                .accountStore = fakes.accountStore,
+                .documentContainers = fakes.documentContainers,
+                .notificationCenter = fakes.notificationCenter,
+                .workQueues = queues,
+                .fileManager = fakes.fileManager,
+                .bundles = fakes.bundles,
+                .localization = fakes.localization};
+    }
+
+    void postChange() {
+        platform.notificationCenter.postNotification(
+            {.name = MRContainerListDidChangeNotification});
+    }
+};
+
+TEST_F(HintingRaceTest, PostingFromManyThreadsWhileThePaneComesAndGoesIsSafe) {
+    platform.documentContainers.listed = {{.identifier = "container"}};
+    std::atomic<bool> isOver = false;
+    std::latch started(kPostingThreads);
+    std::vector<std::jthread> posters;
+    for (int i = 0; i < kPostingThreads; ++i) {
+        posters.emplace_back([this, &isOver, &started] {
+            started.count_down();
+            while (!isOver) {
+                postChange();
+            }
+        });
+    }
+    started.wait();
+
+    for (int visit = 0; visit < kVisits; ++visit) {
+        device::DeviceWorkQueues queues(mainQueue);
+        const auto visited = std::make_shared<PaneWithRows>(servicesOver(queues));
+        visited->setSpecifier(entry);
+        visited->viewDidAppear(true);
+        visited->viewDidDisappear(true);
+    }
+    isOver = true;
+    posters.clear();
+
+    // Each visit's queue was drained before its queues ended: its unregistration has run.
+    EXPECT_EQ(std::ranges::count(platform.documentContainers.calls, "unregister"), kVisits);
+}
+
+TEST_F(HintingRaceTest, ThreeQuickChangesLeadToOneToThreeRuns) {
+    WatchedQueues queues(mainQueue);
+    const auto visited = std::make_shared<PaneWithRows>(servicesOver(queues));
+    visited->viewDidAppear(true);
+    queues.finishWork();
+    const int runsOfTheAppearance = platform.documentContainers.enumerations;
+    EXPECT_EQ(runsOfTheAppearance, 1);
+
+    postChange();
+    postChange();
+    postChange();
+    queues.finishWork();
+
+    const int runs = platform.documentContainers.enumerations - runsOfTheAppearance;
+    EXPECT_GE(runs, 1);
+    EXPECT_LE(runs, 3);
+}
+
+} // namespace
+} // namespace nimbra::test

@@ -1,0 +1,89 @@
+#pragma once
+
+#include "pane/RSPNimbraDriveViewController.h"
+#include "platform/accounts/Account.h"
+#include "tests/support/RecordingListObserver.h"
+#include "tests/support/SyslogCapture.h"
+#include "tests/support/TestPlatform.h"
+
+#include <gtest/gtest.h>
+#include <memory>
+#include <optional>
+#include <string>
+#include <utility>
+
+namespace nimbra::test {
+
+/// The pane with rows around the master switch, which a test lists.
+class PaneWithRows final : public RSPNimbraDriveViewController {
+public:
+    using RSPNimbraDriveViewController::_registerContainerPriorityHinting;
+    using RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState;
+    using RSPNimbraDriveViewController::_reloadVantrelAccount;
+    using RSPNimbraDriveViewController::_vantrelAccount;
+    using RSPNimbraDriveViewController::RSPNimbraDriveViewController;
+
+    /// Flips the account object that the pane holds, as the master switch does.
+    void turn(bool on) {
+        _vantrelAccount()->setEnabledForDataclass(on, kAccountDataclassTidewater);
+    }
+
+    std::shared_ptr<Specifier> upgrade;
+    SpecifierArray apps;
+    std::optional<SpecifierArray> cellular;
+    std::shared_ptr<Specifier> tessary;
+    std::optional<SpecifierArray> diagnostics;
+    int appQueries = 0;
+
+protected:
+    std::shared_ptr<Specifier> _createSpecifierForUpgradeButton() override { return upgrade; }
+    SpecifierArray _appSpecifiersForPRVServices() override {
+        ++appQueries;
+        return apps;
+    }
+    std::optional<SpecifierArray> _createSpecifiersForCellularSwitchCell() override {
+        return cellular;
+    }
+    std::shared_ptr<Specifier> _specifierForTessary() override { return tessary; }
+    std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override { return diagnostics; }
+};
+
+/// A pane on the account "primary", whose row travels with the account's identifier.
+struct PaneFixture : testing::Test {
+    TestPlatform platform;
+    SyslogCapture syslog;
+    std::shared_ptr<Specifier> entry =
+        Specifier::preferenceSpecifierNamed("Nimbra Drive", {.cell = LinkListCell});
+    std::shared_ptr<PaneWithRows> pane = std::make_shared<PaneWithRows>(platform.services());
+    RecordingListObserver observer{platform.calls};
+
+    PaneFixture() {
+        entry->setUserInfo({{AccountIdentifierKey, Text("primary")}});
+        pane->setSpecifier(entry);
+        pane->setObserver(&observer);
+    }
+
+    void storeTidewater(bool enabled) {
+        platform.accountStore.stored.setEnabledForDataclass(enabled, kAccountDataclassTidewater);
+    }
+
+    /// Every row source answers with rows: U, T, two apps, C and D with their groups.
+    void fillAllRows() {
+        pane->upgrade = row("U");
+        pane->tessary = row("T");
+        pane->apps = {row("Zeta"), row("Alpha")};
+        pane->cellular = SpecifierArray{Specifier::groupSpecifierWithID("RSPCellular"), row("C")};
+        pane->diagnostics =
+            SpecifierArray{Specifier::groupSpecifierWithID("RSPDiagnostics"), row("D")};
+    }
+
+    [[nodiscard]] std::string rows() const { return labels(pane->specifiers()); }
+
+    [[nodiscard]] static std::shared_ptr<Specifier> row(const char* name) {
+        return Specifier::preferenceSpecifierNamed(name, {.cell = ButtonCell});
+    }
+};
+
+using Calls = std::vector<std::string>;
+
+} // namespace nimbra::test

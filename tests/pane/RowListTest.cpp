@@ -1,0 +1,165 @@
+#include "tests/pane/PaneFixture.h"
+
+namespace nimbra::test {
+namespace {
+
+struct RowListTest : PaneFixture {};
+
+TEST_F(RowListTest, WithTheSwitchOffTheListIsTheGroupAndTheSwitch) {
+    storeTidewater(false);
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive");
+}
+
+TEST_F(RowListTest, WithEveryConditionTrueTheListHasAllRowsInTheirOrder) {
+    storeTidewater(true);
+    platform.accountStore.stored.usesStratafile = false;
+    fillAllRows();
+
+    EXPECT_EQ(rows(), "U RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPLookMeUpByEmail T "
+                      "RSPUIApps Alpha Zeta RSPCellular C RSPDiagnostics D");
+}
+
+TEST_F(RowListTest, AnAccountOnTheOldServiceHasTheUpgradeRowFirstWhateverTheSwitch) {
+    platform.accountStore.stored.usesStratafile = false;
+    pane->upgrade = row("U");
+
+    storeTidewater(false);
+    EXPECT_EQ(rows(), "U RSPNimbraDrive Nimbra Drive");
+
+    storeTidewater(true);
+    pane->_reloadVantrelAccount();
+    pane->reloadSpecifiers();
+    EXPECT_EQ(rows(), "U RSPNimbraDrive Nimbra Drive RSPStatusInfo");
+}
+
+TEST_F(RowListTest, AnAccountOnTheNewServiceHasNoUpgradeRow) {
+    pane->upgrade = row("U");
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive");
+}
+
+TEST_F(RowListTest, WithTheSwitchOffTheDatabaseRowFollowsTheSwitchDirectly) {
+    storeTidewater(false);
+    pane->tessary = row("T");
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPLookMeUpByEmail T");
+}
+
+TEST_F(RowListTest, AppsStandBehindTheirGroupByNameWithoutCaseAndWithNumbersByValue) {
+    storeTidewater(true);
+    pane->apps = {row("Zeta"), row("App 10"), row("app 2")};
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPUIApps app 2 App 10 Zeta");
+}
+
+TEST_F(RowListTest, AppsWithEqualNamesKeepTheOrderInWhichTheyCame) {
+    storeTidewater(true);
+    const auto first = row("Notes");
+    const auto second = row("notes");
+    first->setIdentifier("first");
+    second->setIdentifier("second");
+    pane->apps = {first, second};
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPUIApps first second");
+}
+
+TEST_F(RowListTest, WithoutAppsThereIsNoGroupOfApps) {
+    storeTidewater(true);
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo");
+}
+
+TEST_F(RowListTest, EmptyAndAbsentRowSourcesContributeNothing) {
+    storeTidewater(true);
+    pane->cellular = SpecifierArray();
+    pane->diagnostics = std::nullopt;
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo");
+}
+
+TEST_F(RowListTest, TheListIsBuiltOnceAndKept) {
+    storeTidewater(true);
+    static_cast<void>(pane->specifiers());
+    const auto master = pane->specifiers().at(1);
+
+    EXPECT_EQ(pane->specifiers().at(1), master);
+    EXPECT_EQ(pane->appQueries, 1);
+}
+
+TEST_F(RowListTest, AReloadBuildsEveryRowAnew) {
+    static_cast<void>(pane->specifiers());
+    const auto master = pane->specifiers().at(1);
+
+    pane->reloadSpecifiers();
+
+    EXPECT_NE(pane->specifiers().at(1), master);
+    EXPECT_EQ(pane->appQueries, 2);
+    EXPECT_EQ(platform.calls, Calls({"reload RSPNimbraDrive Nimbra Drive"}));
+}
+
+TEST_F(RowListTest, AppsAreAskedForWhateverTheSwitch) {
+    storeTidewater(false);
+
+    static_cast<void>(pane->specifiers());
+
+    EXPECT_EQ(pane->appQueries, 1);
+}
+
+TEST_F(RowListTest, TheGroupsCarryTheirFooters) {
+    storeTidewater(true);
+    const SpecifierArray& list = pane->specifiers();
+
+    EXPECT_EQ(list.at(0)->propertyForKey(FooterTextGroupKey), RowValue("Keeps your documents."));
+    EXPECT_EQ(list.at(2)->propertyForKey(FooterCellClassGroupKey),
+              RowValue("RSPNimbraDriveProgressFooterView"));
+}
+
+TEST_F(RowListTest, TheMasterSwitchShowsTheAccountsState) {
+    storeTidewater(true);
+    const auto master = pane->specifiers().at(1);
+    EXPECT_EQ(master->cellType(), SwitchCell);
+    EXPECT_EQ(master->target(), pane.get());
+    EXPECT_EQ(master->identifier(), Text());
+    EXPECT_EQ(master->detailControllerClass(), nullptr);
+    EXPECT_EQ(master->value(), RowValue(true));
+
+    pane->turn(false);
+
+    EXPECT_EQ(master->value(), RowValue(false));
+}
+
+TEST_F(RowListTest, AMissingTextShowsTheStandInAndTheListIsBuiltAllTheSame) {
+    platform.bundles.paneBundle = std::make_shared<FakeBundle>(std::map<std::string, Text>());
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive RSP_LOCALIZED_STRING_UNAVAILABLE");
+    EXPECT_EQ(syslog.lines.size(), 2U);
+}
+
+TEST_F(RowListTest, WithoutABundleTheTextsAreAbsentAndNothingIsReported) {
+    platform.bundles.paneBundle = nullptr;
+
+    const SpecifierArray& list = pane->specifiers();
+
+    ASSERT_EQ(list.size(), 2U);
+    EXPECT_EQ(list.at(1)->name(), Text());
+    EXPECT_EQ(list.at(0)->propertyForKey(FooterTextGroupKey), RowValue(Text()));
+    EXPECT_TRUE(syslog.lines.empty());
+}
+
+TEST_F(RowListTest, TheBundleIsLookedUpForEachText) {
+    static_cast<void>(pane->specifiers());
+
+    EXPECT_EQ(platform.bundles.lookups, 2);
+}
+
+TEST_F(RowListTest, AnAccountThatCannotBeReadShowsAsOffAndNotUpgraded) {
+    platform.accountStore.isReadable = false;
+    pane->upgrade = row("U");
+
+    EXPECT_EQ(rows(), "U RSPNimbraDrive Nimbra Drive");
+    EXPECT_EQ(pane->specifiers().at(2)->value(), RowValue(false));
+}
+
+} // namespace
+} // namespace nimbra::test

@@ -1,0 +1,27 @@
+#pragma once
+
+#include "platform/system/Bundles.h"
+#include "tests/support/FakeBundle.h"
+
+#include <memory>
+#include <vector>
+
+namespace nimbra::test {
+
+/// Knows the pane's bundle, or none.
+class FakeBundles final : public Bundles {
+public:
+    [[nodiscard]] std::shared_ptr<Bundle>
+    bundleWithIdentifier(const BundleIdentifier& identifier) const override {
+        ++lookups;
+        return paneBundle && paneBundle->identifier() == identifier ? paneBundle : nullptr;
+    }
+
+    std::shared_ptr<FakeBundle> paneBundle =
+        std::make_shared<FakeBundle>(std::map<std::string, Text>{
+            {"CLOUD_DRIVE", "Nimbra Drive"}, {"CLOUD_DRIVE_EXPLANATION", "Keeps your documents."}});
+    /// How often a bundle was looked up.
+    mutable int lookups = 0;
+};
+
+} // namespace nimbra::test

@@ -1,0 +1,43 @@
+#pragma once
+
+#include "device/system/DeviceNotificationCenter.h"
+#include "platform/PlatformServices.h"
+#include "tests/support/FakeAccountStore.h"
+#include "tests/support/FakeBundles.h"
+#include "tests/support/FakeDocumentContainers.h"
+#include "tests/support/FakeFileManager.h"
+#include "tests/support/FakeLocalization.h"
+#include "tests/support/PumpedQueues.h"
+#include "tests/support/RecordingPresenter.h"
+
+#include <string>
+#include <vector>
+
+namespace nimbra::test {
+
+/// A platform for a pane under test: pumped queues, fakes that a test fills, and a record of what
+/// the pane asks of its host.
+struct TestPlatform {
+    std::vector<std::string> calls;
+    RecordingPresenter presenter{calls};
+    FakeAccountStore accountStore;
+    FakeDocumentContainers documentContainers;
+    device::DeviceNotificationCenter notificationCenter;
+    PumpedQueues workQueues;
+    FakeFileManager fileManager;
+    FakeBundles bundles;
+    FakeLocalization localization;
+
+    [[nodiscard]] PlatformServices services() {
+        return {.presenter = presenter,
+                .accountStore = accountStore,
+                .documentContainers = documentContainers,
+                .notificationCenter = notificationCenter,
+                .workQueues = workQueues,
+                .fileManager = fileManager,
+                .bundles = bundles,
+                .localization = localization};
+    }
+};
+
+} // namespace nimbra::test

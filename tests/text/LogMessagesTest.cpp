@@ -1,0 +1,79 @@
+#include "support/LogMessages.h"
+
+#include <gtest/gtest.h>
+#include <set>
+#include <string>
+#include <utility>
+#include <vector>
+
+namespace nimbra {
+namespace {
+
+struct FakeSystemLog final : SystemLog {
+    [[nodiscard]] bool isEnabled(LogLevel level) const override { return enabled.contains(level); }
+    void write(LogLevel level, const std::string& message) override {
+        lines.emplace_back(level, message);
+    }
+
+    std::set<LogLevel> enabled{LogLevel::debug, LogLevel::standard, LogLevel::error};
+    std::vector<std::pair<LogLevel, std::string>> lines;
+};
+
+using Lines = std::vector<std::pair<LogLevel, std::string>>;
+
+TEST(LogMessages, TheArgumentStandsInThePlaceOfThePlaceholder) {
+    FakeSystemLog log;
+
+    writeLogMessage(log, log_messages::noBundleForIdentifier, "com.example.notes");
+
+    EXPECT_EQ(log.lines,
+              Lines({{LogLevel::error, "Error! No bundle for bundle ID: com.example.notes"}}));
+}
+
+TEST(LogMessages, AnArgumentThatHoldsAPlaceholderIsTakenAsItStands) {
+    FakeSystemLog log;
+
+    writeLogMessage(log, log_messages::settingShareSourceView, "a %@ b");
+
+    EXPECT_EQ(log.lines,
+              Lines({{LogLevel::standard, "VTUIDocumentsDataViewController: Setting source view "
+                                          "of activity VC as a %@ b."}}));
+}
+
+TEST(LogMessages, ALevelThatIsNotEnabledIsNotWritten) {
+    FakeSystemLog log;
+    log.enabled = {LogLevel::error};
+
+    writeLogMessage(log, log_messages::updatedCellularFlag);
+    writeLogMessage(log, log_messages::markingAccount);
+    writeLogMessage(log, log_messages::noCachedAccess);
+
+    EXPECT_EQ(log.lines, Lines({{LogLevel::error, "Error! No cached PRV access info"}}));
+}
+
+TEST(LogMessages, TheTextsAndLevelsAreTheSystemsOwn) {
+    Lines expected{
+        {LogLevel::standard, "Marking account as using Nimbra Drive"},
+        {LogLevel::standard, "Enabling Tidewater and all TSY dataclasses..."},
+        {LogLevel::debug, "Successfully updated use-cellular flag on Nimbra account."},
+        {LogLevel::error, "Error updating use-cellular flag on Nimbra account: %@"},
+        {LogLevel::standard, "Tessary settings bundle not loaded. Loading..."},
+        {LogLevel::error, "Error! No bundle for bundle ID: %@"},
+        {LogLevel::error, "Error! No cached PRV access info"},
+        {LogLevel::error, "error creating diagnose dir: %@"},
+        {LogLevel::standard,
+         "VTUIDocumentsDataViewController: Setting source view of activity VC as %@."},
+        {LogLevel::error, "Can't retrieve last sync date; %@"},
+        {LogLevel::error, "can't fetch last sync; %@"},
+    };
+
+    Lines listed;
+    for (const LogMessage& message : log_messages::all) {
+        listed.emplace_back(message.level, message.text);
+    }
+
+    EXPECT_EQ(listed, expected);
+}
+
+} // namespace
+} // namespace nimbra
