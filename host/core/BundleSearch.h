@@ -1,0 +1,16 @@
+#pragma once
+
+#include <filesystem>
+#include <optional>
+
+namespace nimbra::host {
+
+/// The directory of the running program's executable.
+[[nodiscard]] std::filesystem::path executableDirectory();
+
+/// The folder of the pane's bundle: the device's own, in the device directory `root`, where it has
+/// one; else the one that came with this program. A folder that is not there is given back when
+/// none is found, so that loading it says what is missing.
+[[nodiscard]] std::filesystem::path findPaneBundle(const std::filesystem::path& root);
+
+} // namespace nimbra::host

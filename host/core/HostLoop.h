@@ -1,0 +1,54 @@
+#pragma once
+
+#include "platform/system/WorkQueue.h"
+
+#include <deque>
+#include <memory>
+#include <mutex>
+#include <string>
+#include <thread>
+
+namespace nimbra::device {
+class DeviceWorkQueues;
+}
+
+namespace nimbra::host {
+
+/// The main queue of a host without a window: the thread that makes the loop runs its work, when
+/// it calls one of the `run` operations. `async` is for any thread, `sync` for any other thread.
+class HostLoop final : public WorkQueue {
+public:
+    HostLoop();
+    /// Runs what is still queued.
+    ~HostLoop() override;
+
+    /// "main".
+    [[nodiscard]] const std::string& label() const override;
+    void async(Work work) override;
+    void sync(Work work) override;
+
+    /// A file descriptor that is readable while work is queued, for the caller's own `poll`; the
+    /// `run` operations take its signal back. Owned by the loop.
+    [[nodiscard]] int wakeUpDescriptor() const;
+
+    /// Runs the work that is queued now, but not what that work queues in turn. Says whether there
+    /// was any.
+    bool runPending();
+
+    /// Runs work, waiting for more, until none is queued here and `queues` are idle: what the
+    /// background hands over at its end is run, too.
+    void runUntilIdle(device::DeviceWorkQueues& queues);
+
+private:
+    class WakeUp;
+
+    [[nodiscard]] bool isEmpty() const;
+
+    const std::thread::id _thread;
+    /// Shared with whoever may signal it late, when the loop has gone.
+    std::shared_ptr<WakeUp> _wakeUp;
+    mutable std::mutex _mutex;
+    std::deque<Work> _pending;
+};
+
+} // namespace nimbra::host

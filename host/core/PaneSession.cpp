@@ -1,0 +1,217 @@
+#include "host/core/PaneSession.h"
+
+#include "device/DevicePlatform.h"
+#include "device/bundles/DeviceBundle.h"
+#include "device/bundles/DeviceBundles.h"
+#include "device/store/DeviceAccountStore.h"
+#include "device/system/DeviceSettings.h"
+#include "device/system/DeviceWorkQueues.h"
+#include "host/core/BundleSearch.h"
+#include "host/core/trace/SessionTracer.h"
+#include "platform/system/ClassRegistry.h"
+#include "platform/system/NotificationCenter.h"
+
+#include <utility>
+
+namespace nimbra::host {
+
+std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configuration configuration) {
+    std::unique_ptr<PaneSession> session(new PaneSession(std::move(configuration)));
+    auto device = device::DevicePlatform::open(session->_configuration.root, session->_loop);
+    if (!device) {
+        return std::unexpected(device.error());
+    }
+    session->_device = std::move(*device);
+    session->_services.emplace(session->_device->servicesFor(*session));
+    if (const auto& locale = session->_configuration.locale) {
+        session->_device->settings().overrideLocale(*locale);
+    }
+    if (Trace* trace = session->_configuration.trace) {
+        session->_tracer = std::make_unique<SessionTracer>(*session->_services, *trace);
+    }
+    return session;
+}
+
+PaneSession::PaneSession(Configuration configuration)
+    : _configuration(std::move(configuration)), _scope(_loop.label()) {}
+
+PaneSession::~PaneSession() {
+    if (_device) {
+        closePane();
+        settle();
+    }
+}
+
+void PaneSession::settle() {
+    _loop.runUntilIdle(_device->workQueues());
+}
+
+void PaneSession::replaceTexts(std::map<std::string, std::string> texts) {
+    _texts = std::move(texts);
+    if (_bundle) {
+        _bundle->replaceTable("Localizable", *_texts);
+    }
+}
+
+std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
+    if (const auto loaded = loadBundle(); !loaded) {
+        return loaded;
+    }
+    auto userInfo = userInfoFor(entry);
+    if (!userInfo) {
+        return std::unexpected(std::move(userInfo.error()));
+    }
+    const ControllerClass& paneClass = _bundle->principalClass();
+    const PlatformServices services = servicesForPane();
+    // The row that leads to the page is the host's, but it is called what the page calls itself.
+    const Text title =
+        _bundle->localizedStringForKeyValueTable("CLOUD_DRIVE", "Nimbra Drive", "Localizable");
+    _accountPage = std::make_shared<AccountPage>(services, title, paneClass, std::move(*userInfo));
+    _pane = paneClass.create(services);
+    _pane->setSpecifier(_accountPage->entryRow());
+    _pane->setParentController(_accountPage);
+    if (_tracer) {
+        _tracer->observeParent(*_accountPage);
+        _tracer->observeList(*_pane);
+    }
+    _pane->viewDidLoad();
+    if (_tracer) {
+        _tracer->observeRefreshControl(*_pane);
+    }
+    static_cast<void>(_pane->specifiers());
+    return {};
+}
+
+void PaneSession::closePane() {
+    if (!_pane) {
+        return;
+    }
+    if (_isShown) {
+        disappear();
+    }
+    _pane->setObserver(nullptr);
+    _pane.reset();
+    _accountPage.reset();
+}
+
+void PaneSession::appear() {
+    _isShown = true;
+    _pane->viewDidAppear(true);
+}
+
+void PaneSession::disappear() {
+    _isShown = false;
+    _pane->viewDidDisappear(true);
+}
+
+void PaneSession::pullToRefresh() {
+    if (const auto& control = _pane->table().refreshControl()) {
+        control->pull();
+    }
+}
+
+bool PaneSession::isRefreshing() {
+    const auto& control = _pane->table().refreshControl();
+    return control && control->isRefreshing();
+}
+
+std::string PaneSession::paneTitle() const {
+    return _accountPage->entryRow()->name().string();
+}
+
+const SpecifierArray& PaneSession::rows() {
+    return _pane->specifiers();
+}
+
+std::expected<std::shared_ptr<Specifier>, RowRefusal> PaneSession::row(std::string_view name) {
+    return findRow(rows(), name);
+}
+
+std::expected<void, RowRefusal> PaneSession::setRow(std::string_view name, bool isOn) {
+    const auto found = row(name);
+    if (!found) {
+        return std::unexpected(found.error());
+    }
+    if (auto refusal = refusalToSet(**found)) {
+        return std::unexpected(std::move(*refusal));
+    }
+    (*found)->setValue(isOn);
+    return {};
+}
+
+std::expected<void, RowRefusal> PaneSession::tapRow(std::string_view name) {
+    const auto found = row(name);
+    if (!found) {
+        return std::unexpected(found.error());
+    }
+    if (auto refusal = refusalToTap(**found)) {
+        return std::unexpected(std::move(*refusal));
+    }
+    (*found)->performButtonAction();
+    return {};
+}
+
+void PaneSession::becomeActive() {
+    post({.name = ApplicationDidBecomeActiveNotification});
+}
+
+void PaneSession::post(const Notification& notification) {
+    _services->notificationCenter.postNotification(notification);
+}
+
+void PaneSession::dismissPresentedController(bool /*animated*/) {
+    // Nothing can be presented over the pane yet.
+}
+
+void PaneSession::dismissPane(bool /*animated*/) {
+    // Later, as the pane itself asks for it and is still at work.
+    _loop.async([this] { closePane(); });
+}
+
+std::expected<void, Error> PaneSession::loadBundle() {
+    if (_bundle) {
+        return {};
+    }
+    auto loaded = _device->bundles().load(
+        _configuration.bundle.value_or(findPaneBundle(_configuration.root)));
+    if (!loaded) {
+        return std::unexpected(loaded.error());
+    }
+    _bundle = std::move(*loaded);
+    if (_texts) {
+        _bundle->replaceTable("Localizable", *_texts);
+    }
+    return {};
+}
+
+PlatformServices PaneSession::servicesForPane() {
+    return _tracer ? _tracer->services() : *_services;
+}
+
+std::expected<UserInfo, Error> PaneSession::userInfoFor(const PaneEntry& entry) {
+    UserInfo userInfo;
+    if (entry.firstSetup) {
+        userInfo.emplace(FirstSetupKey, *entry.firstSetup);
+    }
+    std::optional<std::string> identifier = entry.account;
+    if (!identifier) {
+        const auto known = _device->accountStore().accountIdentifiers();
+        if (!known) {
+            return std::unexpected(known.error());
+        }
+        if (known->empty()) {
+            return userInfo;
+        }
+        identifier = known->front().string();
+    }
+    if (entry.firstSetup.value_or(false)) {
+        std::shared_ptr<Account> account =
+            _services->accountStore.accountWithIdentifier(AccountIdentifier(*identifier));
+        userInfo.emplace(AccountKey, _tracer ? _tracer->traced(account) : account);
+    } else {
+        userInfo.emplace(AccountIdentifierKey, Text(*identifier));
+    }
+    return userInfo;
+}
+
+} // namespace nimbra::host

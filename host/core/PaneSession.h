@@ -1,0 +1,119 @@
+#pragma once
+
+#include "device/system/CurrentQueue.h"
+#include "host/core/AccountPage.h"
+#include "host/core/HostLoop.h"
+#include "host/core/RowLookup.h"
+#include "platform/host/Presenter.h"
+#include "platform/host/SettingsListController.h"
+#include "platform/values/Error.h"
+
+#include <expected>
+#include <filesystem>
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace nimbra {
+struct Notification;
+}
+namespace nimbra::device {
+class DeviceBundle;
+class DevicePlatform;
+} // namespace nimbra::device
+
+namespace nimbra::host {
+
+class SessionTracer;
+class Trace;
+
+/// A device in use, and the pane that is open on it: what the user of a host does, without the
+/// host's looks. It runs on the thread that makes it, which is the main queue's while it lives.
+class PaneSession final : private Presenter {
+public:
+    struct Configuration {
+        /// The device directory.
+        std::filesystem::path root;
+        /// The folder of the pane's bundle; nothing for the one that `findPaneBundle` finds.
+        std::optional<std::filesystem::path> bundle;
+        /// Shows everything in this locale instead of the device's.
+        std::optional<std::string> locale;
+        /// Gets all that the pane does; null for no trace. Not owned, outlives the session.
+        Trace* trace = nullptr;
+    };
+
+    /// Starts using the device. An error names the file that cannot be used.
+    [[nodiscard]] static std::expected<std::unique_ptr<PaneSession>, Error>
+    start(Configuration configuration);
+
+    PaneSession(const PaneSession&) = delete;
+    PaneSession& operator=(const PaneSession&) = delete;
+    /// Closes the pane and waits for what it has set going.
+    ~PaneSession() override;
+
+    [[nodiscard]] HostLoop& loop() { return _loop; }
+    [[nodiscard]] device::DevicePlatform& device() { return *_device; }
+    /// The device directory.
+    [[nodiscard]] const std::filesystem::path& root() const { return _configuration.root; }
+
+    /// Runs the main queue until nothing is left to do anywhere.
+    void settle();
+
+    /// Uses `texts` as the pane's own string table in every language, from now on.
+    void replaceTexts(std::map<std::string, std::string> texts);
+
+    /// Opens the pane from the row of the account's page: it has its view and its rows then. No
+    /// pane is open before. An error names what is missing.
+    [[nodiscard]] std::expected<void, Error> openPane(const PaneEntry& entry);
+    [[nodiscard]] bool isPaneOpen() const { return _pane != nullptr; }
+    /// Dismisses the open pane, which disappears first if it is shown, and lets it go.
+    void closePane();
+
+    // What happens to an open pane.
+
+    void appear();
+    void disappear();
+    void pullToRefresh();
+    /// Whether a pull is still being answered.
+    [[nodiscard]] bool isRefreshing();
+    [[nodiscard]] std::string paneTitle() const;
+    [[nodiscard]] const SpecifierArray& rows();
+    /// The row that `name` stands for.
+    [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal> row(std::string_view name);
+    [[nodiscard]] std::expected<void, RowRefusal> setRow(std::string_view name, bool isOn);
+    [[nodiscard]] std::expected<void, RowRefusal> tapRow(std::string_view name);
+
+    // What happens on the device, pane or no pane.
+
+    /// Tells the pane, and whoever else listens, that the host application came to the front.
+    void becomeActive();
+    /// Posts within this process, on the calling thread; any thread.
+    void post(const Notification& notification);
+
+private:
+    explicit PaneSession(Configuration configuration);
+
+    void dismissPresentedController(bool animated) override;
+    void dismissPane(bool animated) override;
+
+    [[nodiscard]] std::expected<void, Error> loadBundle();
+    [[nodiscard]] PlatformServices servicesForPane();
+    [[nodiscard]] std::expected<UserInfo, Error> userInfoFor(const PaneEntry& entry);
+
+    Configuration _configuration;
+    HostLoop _loop;
+    device::CurrentQueueScope _scope;
+    std::unique_ptr<device::DevicePlatform> _device;
+    /// The device's own services, not traced.
+    std::optional<PlatformServices> _services;
+    std::unique_ptr<SessionTracer> _tracer;
+    std::shared_ptr<device::DeviceBundle> _bundle;
+    std::optional<std::map<std::string, std::string>> _texts;
+    std::shared_ptr<AccountPage> _accountPage;
+    std::shared_ptr<SettingsListController> _pane;
+    bool _isShown = false;
+};
+
+} // namespace nimbra::host

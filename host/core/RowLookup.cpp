@@ -1,0 +1,139 @@
+#include "host/core/RowLookup.h"
+
+#include "host/core/RowDescription.h"
+
+#include <algorithm>
+#include <vector>
+
+namespace nimbra::host {
+
+namespace {
+
+using Reason = RowRefusal::Reason;
+
+std::string quoted(std::string_view text) {
+    return '"' + std::string(text) + '"';
+}
+
+std::string quoted(const Specifier& row) {
+    return row.label() ? quoted(row.label().string()) : "the row without a name";
+}
+
+std::string joined(const std::vector<std::string>& pieces) {
+    std::string list;
+    for (const std::string& piece : pieces) {
+        list += (list.empty() ? "" : ", ") + piece;
+    }
+    return list;
+}
+
+std::string withArticle(const Specifier& row) {
+    switch (row.cellType()) {
+    case GroupCell:
+        return "a heading";
+    case LinkListCell:
+        return "a link";
+    case SwitchCell:
+        return "a switch";
+    case ButtonCell:
+        return "a button";
+    }
+    return "a row";
+}
+
+RowRefusal noSuchRow(const SpecifierArray& rows, std::string_view name) {
+    std::vector<std::string> known;
+    for (const auto& row : rows) {
+        if (row->cellType() != GroupCell && row->label()) {
+            known.push_back(quoted(*row));
+        }
+    }
+    return {Reason::noSuchRow,
+            "no row " + quoted(name) +
+                (known.empty() ? " (the list has no rows)" : " (rows: " + joined(known) + ')')};
+}
+
+RowRefusal ambiguous(const SpecifierArray& matches, std::string_view name) {
+    std::vector<std::string> identifiers;
+    for (const auto& row : matches) {
+        if (row->identifier()) {
+            identifiers.push_back(quoted(*row));
+        }
+    }
+    return {Reason::ambiguous,
+            quoted(name) + " stands for " + std::to_string(matches.size()) + " rows" +
+                (identifiers.empty()
+                     ? ", and none has an identifier"
+                     : " (name one by its identifier: " + joined(identifiers) + ')')};
+}
+
+RowRefusal locked(const Specifier& row) {
+    return {Reason::locked, quoted(row) + " is locked"};
+}
+
+} // namespace
+
+std::expected<std::shared_ptr<Specifier>, RowRefusal> findRow(const SpecifierArray& rows,
+                                                              std::string_view name) {
+    const auto rowsWhose = [&](const Text& (Specifier::*text)() const) {
+        SpecifierArray matches;
+        std::ranges::copy_if(rows, std::back_inserter(matches), [&](const auto& row) {
+            const Text& candidate = ((*row).*text)();
+            return candidate && candidate.string() == name;
+        });
+        return matches;
+    };
+    SpecifierArray matches = rowsWhose(&Specifier::identifier);
+    if (matches.empty()) {
+        matches = rowsWhose(&Specifier::name);
+    }
+    if (matches.empty()) {
+        return std::unexpected(noSuchRow(rows, name));
+    }
+    if (matches.size() > 1) {
+        return std::unexpected(ambiguous(matches, name));
+    }
+    return matches.front();
+}
+
+std::optional<RowRefusal> refusalToRead(const Specifier& row) {
+    if (row.value() != RowValue()) {
+        return std::nullopt;
+    }
+    return RowRefusal{Reason::noValue,
+                      quoted(row) + " is " + withArticle(row) + " and has no value"};
+}
+
+std::optional<RowRefusal> refusalToSet(const Specifier& row) {
+    if (row.cellType() != SwitchCell) {
+        return RowRefusal{Reason::notASwitch,
+                          quoted(row) + " is " + withArticle(row) + ", not a switch"};
+    }
+    if (!row.isEnabled()) {
+        return locked(row);
+    }
+    if (!row.hasSetter()) {
+        return RowRefusal{Reason::noSetter, quoted(row) + " cannot be changed in this version"};
+    }
+    return std::nullopt;
+}
+
+std::optional<RowRefusal> refusalToTap(const Specifier& row) {
+    if (row.cellType() == LinkListCell) {
+        return RowRefusal{Reason::notAButton,
+                          quoted(row) + " opens another page, which this version cannot show"};
+    }
+    if (row.cellType() != ButtonCell) {
+        return RowRefusal{Reason::notAButton,
+                          quoted(row) + " is " + withArticle(row) + ", not a button"};
+    }
+    if (!row.isEnabled()) {
+        return locked(row);
+    }
+    if (!row.hasButtonAction()) {
+        return RowRefusal{Reason::noAction, quoted(row) + " does nothing in this version"};
+    }
+    return std::nullopt;
+}
+
+} // namespace nimbra::host

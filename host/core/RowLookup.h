@@ -1,0 +1,51 @@
+#pragma once
+
+#include "platform/host/Specifier.h"
+
+#include <expected>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace nimbra::host {
+
+/// Why a row cannot be used the way that somebody asked for.
+struct RowRefusal {
+    enum class Reason {
+        /// No row of the list has this identifier or name.
+        noSuchRow,
+        /// Several rows have this name.
+        ambiguous,
+        /// The row has nothing to read, such as a heading.
+        noValue,
+        /// Only a switch can be set.
+        notASwitch,
+        /// Only a button can be tapped.
+        notAButton,
+        /// The row is shown, but cannot be used now.
+        locked,
+        /// The switch cannot be changed at all.
+        noSetter,
+        /// Nothing stands behind the button.
+        noAction,
+    };
+
+    Reason reason;
+    /// The same in words, to be read behind a program's name: "no row "Foo" (rows: ...)".
+    std::string explanation;
+};
+
+/// The row of `rows` that `name` stands for: the one with that identifier, or else the one with
+/// that name as shown.
+[[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
+findRow(const SpecifierArray& rows, std::string_view name);
+
+/// Why `row` has no value to read; nothing when it has one. Asks the getter.
+[[nodiscard]] std::optional<RowRefusal> refusalToRead(const Specifier& row);
+/// Why `row` cannot be switched on or off; nothing when it can.
+[[nodiscard]] std::optional<RowRefusal> refusalToSet(const Specifier& row);
+/// Why `row` cannot be tapped; nothing when it can.
+[[nodiscard]] std::optional<RowRefusal> refusalToTap(const Specifier& row);
+
+} // namespace nimbra::host

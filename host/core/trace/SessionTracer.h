@@ -1,0 +1,58 @@
+#pragma once
+
+#include "host/core/trace/ParentTracer.h"
+#include "host/core/trace/TableTracer.h"
+#include "host/core/trace/TracingAccountStore.h"
+#include "host/core/trace/TracingDocumentContainers.h"
+#include "host/core/trace/TracingNotificationCenter.h"
+#include "host/core/trace/TracingPresenter.h"
+#include "platform/PlatformServices.h"
+#include "platform/system/Syslog.h"
+
+#include <memory>
+
+namespace nimbra {
+class SettingsListController;
+}
+
+namespace nimbra::host {
+
+class Trace;
+
+/// Stands between a pane and everything that it talks to, and traces it; while it lives, lines for
+/// `syslog` go to the trace as well, instead of to the system's. Main queue only.
+class SessionTracer {
+public:
+    /// Traces what is asked of `services`. They and `trace` outlive the tracer; the tracer
+    /// outlives every controller made over its own services.
+    SessionTracer(const PlatformServices& services, Trace& trace);
+    SessionTracer(const SessionTracer&) = delete;
+    SessionTracer& operator=(const SessionTracer&) = delete;
+    ~SessionTracer();
+
+    /// The services to be handed to a pane.
+    [[nodiscard]] PlatformServices services();
+
+    /// `account`, traced, for a pane that gets it from its host; null for null.
+    [[nodiscard]] std::shared_ptr<Account> traced(std::shared_ptr<Account> account) const;
+
+    /// Traces the changes of the list of `pane`.
+    void observeList(SettingsListController& pane);
+    /// Traces the end of a refresh of `pane`, whose view is loaded.
+    void observeRefreshControl(SettingsListController& pane);
+    /// Traces that `parent` is built anew.
+    void observeParent(SettingsListController& parent);
+
+private:
+    PlatformServices _services;
+    Trace& _trace;
+    TracingPresenter _presenter;
+    TracingAccountStore _accountStore;
+    TracingDocumentContainers _documentContainers;
+    TracingNotificationCenter _notificationCenter;
+    TableTracer _table;
+    ParentTracer _parent;
+    SyslogSink _earlierSyslogSink;
+};
+
+} // namespace nimbra::host

@@ -1,0 +1,20 @@
+#include "host/core/trace/Trace.h"
+
+#include "device/system/CurrentQueue.h"
+
+namespace nimbra::host {
+
+void Trace::write(std::string_view event, Keys keys) {
+    nlohmann::ordered_json object;
+    object["event"] = event;
+    object["queue"] = device::currentQueueLabel();
+    for (const auto& [key, value] : keys) {
+        object[std::string(key)] = value;
+    }
+    const std::string line =
+        object.dump(-1, ' ', false, nlohmann::ordered_json::error_handler_t::replace);
+    const std::scoped_lock lock(_mutex);
+    _sink(line);
+}
+
+} // namespace nimbra::host

@@ -1,0 +1,32 @@
+#pragma once
+
+#include <functional>
+#include <initializer_list>
+#include <mutex>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <string_view>
+#include <utility>
+
+namespace nimbra::host {
+
+/// What a pane does to its host and to the platform, as one JSON object a line, in the order in
+/// which it happens. Any thread.
+class Trace {
+public:
+    /// Takes one line, without its end; called by one thread at a time.
+    using Sink = std::function<void(const std::string& line)>;
+    using Keys = std::initializer_list<std::pair<std::string_view, nlohmann::ordered_json>>;
+
+    explicit Trace(Sink sink) : _sink(std::move(sink)) {}
+
+    /// Writes that `event` happens now on the calling thread's queue; `keys` follow in this order.
+    /// Text that is not UTF-8 is written with replacement characters.
+    void write(std::string_view event, Keys keys);
+
+private:
+    std::mutex _mutex;
+    Sink _sink;
+};
+
+} // namespace nimbra::host

@@ -1,0 +1,28 @@
+#pragma once
+
+#include "platform/accounts/AccountStore.h"
+
+#include <memory>
+
+namespace nimbra::host {
+
+class Trace;
+
+/// Traces what is asked of another account store, and what is changed on its accounts.
+class TracingAccountStore final : public AccountStore {
+public:
+    /// Neither is owned; both outlive the store, and `trace` its accounts as well.
+    TracingAccountStore(AccountStore& store, Trace& trace) : _store(store), _trace(trace) {}
+
+    [[nodiscard]] std::shared_ptr<Account>
+    accountWithIdentifier(const AccountIdentifier& identifier) override;
+
+    /// An account that stands for `account` and traces its changes; null for null.
+    [[nodiscard]] std::shared_ptr<Account> traced(std::shared_ptr<Account> account) const;
+
+private:
+    AccountStore& _store;
+    Trace& _trace;
+};
+
+} // namespace nimbra::host
