@@ -1,0 +1,52 @@
+#pragma once
+
+#include "device/DeviceDescription.h"
+#include "host/core/AccountPage.h"
+#include "platform/system/NotificationCenter.h"
+
+#include <string>
+#include <variant>
+#include <vector>
+
+namespace nimbra::host {
+
+/// A row by the name that the scenario gives it.
+struct RowArgument {
+    std::string row;
+};
+
+struct SetArguments {
+    std::string row;
+    bool value = false;
+};
+
+struct PostArguments {
+    Notification notification;
+    /// Posted to every process of the device instead of to this one.
+    bool distributed = false;
+    /// Posted on a thread of its own instead of the main one.
+    bool fromOtherThread = false;
+};
+
+struct ChangeArguments {
+    device::GivenDescription device;
+};
+
+/// One step: what it does, and what of its arguments this version uses.
+struct ScenarioStep {
+    /// The word under `do`.
+    std::string name;
+    std::variant<std::monostate, RowArgument, SetArguments, PostArguments, ChangeArguments>
+        arguments;
+};
+
+/// A device, how the pane is opened on it, and what is done with it, step by step.
+struct Scenario {
+    device::GivenDescription device;
+    PaneEntry entry;
+    std::vector<ScenarioStep> steps;
+    /// One line for each key that the file gives and that has no effect in this version.
+    std::vector<std::string> notes;
+};
+
+} // namespace nimbra::host

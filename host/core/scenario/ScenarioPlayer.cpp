@@ -1,0 +1,195 @@
+#include "host/core/scenario/ScenarioPlayer.h"
+
+#include "device/DeviceDirectory.h"
+#include "device/DevicePlatform.h"
+#include "device/bundles/DeviceBundles.h"
+#include "device/system/DeviceSettings.h"
+#include "host/core/PaneSession.h"
+#include "host/core/RowDescription.h"
+#include "host/core/trace/Trace.h"
+
+#include <algorithm>
+#include <array>
+#include <string_view>
+#include <thread>
+#include <utility>
+#include <variant>
+
+namespace nimbra::host {
+
+/// How a step is done, or why this version cannot do it.
+struct ScenarioPlayer::Handler {
+    std::string_view name;
+    Outcome (ScenarioPlayer::*perform)(const ScenarioStep& step) = nullptr;
+    bool needsPane = false;
+    std::string_view missing = {};
+};
+
+const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& name) {
+    static constexpr std::array handlers{
+        Handler{.name = "open", .perform = &ScenarioPlayer::open},
+        Handler{.name = "appear", .perform = &ScenarioPlayer::appear, .needsPane = true},
+        Handler{.name = "disappear", .perform = &ScenarioPlayer::disappear, .needsPane = true},
+        Handler{.name = "becomeActive", .perform = &ScenarioPlayer::becomeActive},
+        Handler{.name = "list", .perform = &ScenarioPlayer::list, .needsPane = true},
+        Handler{.name = "get", .perform = &ScenarioPlayer::get, .needsPane = true},
+        Handler{.name = "set", .perform = &ScenarioPlayer::set, .needsPane = true},
+        Handler{.name = "tap", .perform = &ScenarioPlayer::tap, .needsPane = true},
+        Handler{
+            .name = "pullToRefresh", .perform = &ScenarioPlayer::pullToRefresh, .needsPane = true},
+        Handler{.name = "post", .perform = &ScenarioPlayer::post},
+        Handler{.name = "change", .perform = &ScenarioPlayer::change},
+        Handler{.name = "close", .perform = &ScenarioPlayer::close, .needsPane = true},
+        Handler{.name = "publishProgress", .missing = "no sync progress"},
+        Handler{.name = "updateProgress", .missing = "no sync progress"},
+        Handler{.name = "unpublishProgress", .missing = "no sync progress"},
+        Handler{.name = "footer", .missing = "no status footer"},
+        Handler{.name = "moveFooter", .missing = "no status footer"},
+        Handler{.name = "layout", .missing = "no screen to lay out"},
+        Handler{.name = "views", .missing = "no screen with views"},
+        Handler{.name = "tapButton", .missing = "no screen with buttons"},
+        Handler{.name = "alert", .missing = "no alerts"},
+        Handler{.name = "share", .missing = "no share sheet"},
+        Handler{.name = "advance", .missing = "no timers that a moved clock could fire"},
+    };
+    const auto handler = std::ranges::find(handlers, name, &Handler::name);
+    return handler != handlers.end() ? &*handler : nullptr;
+}
+
+ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session, Trace& trace)
+    : _scenario(scenario), _session(session), _trace(trace) {}
+
+std::expected<void, StepFailure> ScenarioPlayer::play() {
+    applyToBundle(_scenario.device);
+    for (std::size_t index = 0; index < _scenario.steps.size(); ++index) {
+        const ScenarioStep& step = _scenario.steps[index];
+        _trace.write("step", {{"index", index}, {"do", step.name}});
+        const Outcome outcome = perform(step);
+        _session.settle();
+        if (!outcome) {
+            return std::unexpected(StepFailure{index, step.name, outcome.error()});
+        }
+    }
+    return {};
+}
+
+void ScenarioPlayer::applyToBundle(const device::GivenDescription& given) {
+    if (given.description.strings) {
+        _session.replaceTexts(*given.description.strings);
+    }
+    if (given.keys.contains("paneBundleRegistered")) {
+        _session.device().bundles().setFindable(BundleIdentifier("com.vantrel.NimbraDriveSettings"),
+                                                given.description.paneBundleRegistered);
+    }
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::perform(const ScenarioStep& step) {
+    const Handler* handler = handlerFor(step.name);
+    if (handler == nullptr) {
+        return std::unexpected("this version does not know the step");
+    }
+    if (handler->perform == nullptr) {
+        return std::unexpected("this version has " + std::string(handler->missing) + " yet");
+    }
+    if (handler->needsPane && !_session.isPaneOpen()) {
+        return std::unexpected("no pane is open");
+    }
+    return (this->*handler->perform)(step);
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::open(const ScenarioStep& step) {
+    if (_session.isPaneOpen()) {
+        return std::unexpected("the pane is open already");
+    }
+    if (const auto opened = _session.openPane(_scenario.entry); !opened) {
+        return std::unexpected(opened.error().description);
+    }
+    _session.settle();
+    return list(step);
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::appear(const ScenarioStep& /*step*/) {
+    _session.appear();
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::disappear(const ScenarioStep& /*step*/) {
+    _session.disappear();
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::becomeActive(const ScenarioStep& /*step*/) {
+    _session.becomeActive();
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::list(const ScenarioStep& /*step*/) {
+    auto rows = nlohmann::ordered_json::array();
+    for (const RowDescription& row : RowDescription::of(_session.rows())) {
+        rows.push_back(row.json());
+    }
+    _trace.write("list", {{"rows", std::move(rows)}});
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::get(const ScenarioStep& step) {
+    const auto row = _session.row(std::get<RowArgument>(step.arguments).row);
+    if (!row) {
+        return std::unexpected(row.error().explanation);
+    }
+    _trace.write("value", {{"row", jsonOf((*row)->label())}, {"value", jsonOf((*row)->value())}});
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::set(const ScenarioStep& step) {
+    const auto& arguments = std::get<SetArguments>(step.arguments);
+    if (const auto done = _session.setRow(arguments.row, arguments.value); !done) {
+        return std::unexpected(done.error().explanation);
+    }
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::tap(const ScenarioStep& step) {
+    const auto done = _session.tapRow(std::get<RowArgument>(step.arguments).row);
+    if (!done) {
+        return std::unexpected(done.error().explanation);
+    }
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::pullToRefresh(const ScenarioStep& /*step*/) {
+    _session.pullToRefresh();
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::post(const ScenarioStep& step) {
+    const auto& arguments = std::get<PostArguments>(step.arguments);
+    if (arguments.distributed) {
+        return std::unexpected("this version has no notifications between processes yet");
+    }
+    if (arguments.fromOtherThread) {
+        std::thread([&] { _session.post(arguments.notification); }).join();
+    } else {
+        _session.post(arguments.notification);
+    }
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::change(const ScenarioStep& step) {
+    const device::GivenDescription& change = std::get<ChangeArguments>(step.arguments).device;
+    if (const auto changed = device::changeDeviceDirectory(_session.root(), change); !changed) {
+        return std::unexpected(changed.error().description);
+    }
+    if (const auto reloaded = _session.device().settings().reload(); !reloaded) {
+        return std::unexpected(reloaded.error().description);
+    }
+    applyToBundle(change);
+    return {};
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::close(const ScenarioStep& /*step*/) {
+    _session.closePane();
+    return {};
+}
+
+} // namespace nimbra::host

@@ -1,0 +1,61 @@
+#pragma once
+
+#include "host/core/scenario/Scenario.h"
+
+#include <cstddef>
+#include <expected>
+#include <string>
+
+namespace nimbra::host {
+
+class PaneSession;
+class Trace;
+
+/// The step that could not be done, and why.
+struct StepFailure {
+    /// Counted from 0.
+    std::size_t index = 0;
+    std::string name;
+    std::string reason;
+};
+
+/// Does the steps of a scenario on a session, one after the other, the way a person would. After
+/// each step it waits until nothing is left to do. Main queue.
+class ScenarioPlayer {
+public:
+    /// `session` uses the device that was made from the scenario's description, and traces to
+    /// `trace`. None is owned; all outlive the player.
+    ScenarioPlayer(const Scenario& scenario, PaneSession& session, Trace& trace);
+
+    /// Does all steps; ends at the first that cannot be done.
+    [[nodiscard]] std::expected<void, StepFailure> play();
+
+private:
+    /// Nothing, or why the step could not be done.
+    using Outcome = std::expected<void, std::string>;
+    struct Handler;
+
+    [[nodiscard]] static const Handler* handlerFor(const std::string& name);
+    /// Does what of a description stands in no file of the device directory.
+    void applyToBundle(const device::GivenDescription& given);
+    [[nodiscard]] Outcome perform(const ScenarioStep& step);
+
+    Outcome open(const ScenarioStep& step);
+    Outcome appear(const ScenarioStep& step);
+    Outcome disappear(const ScenarioStep& step);
+    Outcome becomeActive(const ScenarioStep& step);
+    Outcome list(const ScenarioStep& step);
+    Outcome get(const ScenarioStep& step);
+    Outcome set(const ScenarioStep& step);
+    Outcome tap(const ScenarioStep& step);
+    Outcome pullToRefresh(const ScenarioStep& step);
+    Outcome post(const ScenarioStep& step);
+    Outcome change(const ScenarioStep& step);
+    Outcome close(const ScenarioStep& step);
+
+    const Scenario& _scenario;
+    PaneSession& _session;
+    Trace& _trace;
+};
+
+} // namespace nimbra::host

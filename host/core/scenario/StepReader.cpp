@@ -1,0 +1,199 @@
+#include "host/core/scenario/StepReader.h"
+
+#include "device/description/DescriptionValues.h"
+#include "device/json/JsonReader.h"
+
+#include <algorithm>
+#include <array>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <string_view>
+#include <utility>
+
+namespace nimbra::host {
+
+namespace {
+
+using device::JsonReader;
+using Arguments = decltype(ScenarioStep::arguments);
+
+/// A member that has to be there.
+JsonReader required(const JsonReader& step, const std::string& key, const std::string& what) {
+    JsonReader member = step.member(key);
+    if (member.isAbsent()) {
+        member.expected(what);
+    }
+    return member;
+}
+
+std::string requiredString(const JsonReader& step, const std::string& key,
+                           const std::string& what) {
+    return required(step, key, what).string();
+}
+
+UserInfoValue readUserInfoValue(const JsonReader& reader) {
+    const nlohmann::ordered_json& value = reader.value();
+    if (value.is_boolean()) {
+        return value.get<bool>();
+    }
+    if (value.is_number_float()) {
+        return value.get<double>();
+    }
+    if (value.is_number()) {
+        return reader.integer();
+    }
+    if (value.is_string()) {
+        return Text(value.get<std::string>());
+    }
+    reader.expected("true, false, a number or a string");
+    return {};
+}
+
+Arguments nothing(const JsonReader& step) {
+    step.allowOnly({"do"});
+    return {};
+}
+
+Arguments row(const JsonReader& step) {
+    step.allowOnly({"do", "row"});
+    return RowArgument{requiredString(step, "row", "a row's identifier or name")};
+}
+
+Arguments set(const JsonReader& step) {
+    step.allowOnly({"do", "row", "value"});
+    return SetArguments{.row = requiredString(step, "row", "a row's identifier or name"),
+                        .value = required(step, "value", "true or false").boolean()};
+}
+
+Arguments post(const JsonReader& step) {
+    step.allowOnly({"do", "name", "userInfo", "distributed", "from"});
+    PostArguments arguments{.notification = {.name = NotificationName(requiredString(
+                                                 step, "name", "a notification's name"))}};
+    const JsonReader given = step.member("userInfo");
+    for (const std::string& key : given.keys()) {
+        arguments.notification.userInfo.emplace(UserInfoKey(key),
+                                                readUserInfoValue(given.member(key)));
+    }
+    arguments.distributed = step.member("distributed").boolean();
+    if (const JsonReader from = step.member("from"); !from.isAbsent()) {
+        arguments.fromOtherThread = device::readOneOf(from, {"main", "other"}) == "other";
+    }
+    return arguments;
+}
+
+Arguments change(const JsonReader& step) {
+    step.allowOnly({"do", "device"});
+    return ChangeArguments{device::readDeviceDescription(required(step, "device", "an object"))};
+}
+
+// What follows is checked only: nothing in this version uses it.
+
+Arguments publishProgress(const JsonReader& step) {
+    step.allowOnly({"do", "id", "fileOperationKind", "fraction", "indeterminate", "description",
+                    "additional"});
+    static_cast<void>(requiredString(step, "id", "a progress's id"));
+    static_cast<void>(step.member("fileOperationKind").stringOrNull());
+    static_cast<void>(step.member("fraction").number());
+    static_cast<void>(step.member("indeterminate").boolean());
+    static_cast<void>(step.member("description").stringOrNull());
+    static_cast<void>(step.member("additional").stringOrNull());
+    return {};
+}
+
+Arguments unpublishProgress(const JsonReader& step) {
+    step.allowOnly({"do", "id"});
+    static_cast<void>(requiredString(step, "id", "a progress's id"));
+    return {};
+}
+
+Arguments moveFooter(const JsonReader& step) {
+    step.allowOnly({"do", "window"});
+    static_cast<void>(required(step, "window", "true or false").boolean());
+    return {};
+}
+
+Arguments layout(const JsonReader& step) {
+    step.allowOnly({"do", "width", "height"});
+    static_cast<void>(required(step, "width", "a number").number());
+    static_cast<void>(required(step, "height", "a number").number());
+    return {};
+}
+
+Arguments tapButton(const JsonReader& step) {
+    step.allowOnly({"do", "title"});
+    static_cast<void>(requiredString(step, "title", "a button's title"));
+    return {};
+}
+
+Arguments alert(const JsonReader& step) {
+    step.allowOnly({"do", "choose"});
+    static_cast<void>(requiredString(step, "choose", "an action's title"));
+    return {};
+}
+
+Arguments share(const JsonReader& step) {
+    step.allowOnly({"do", "outcome"});
+    static_cast<void>(device::readOneOf(step.member("outcome"), {"sent", "cancelled", "failed"}));
+    return {};
+}
+
+Arguments advance(const JsonReader& step) {
+    step.allowOnly({"do", "seconds"});
+    static_cast<void>(required(step, "seconds", "a number").number());
+    return {};
+}
+
+struct StepForm {
+    std::string_view name;
+    Arguments (*read)(const JsonReader& step);
+};
+
+constexpr std::array forms{
+    StepForm{"open", nothing},
+    StepForm{"appear", nothing},
+    StepForm{"disappear", nothing},
+    StepForm{"becomeActive", nothing},
+    StepForm{"list", nothing},
+    StepForm{"get", row},
+    StepForm{"set", set},
+    StepForm{"tap", row},
+    StepForm{"pullToRefresh", nothing},
+    StepForm{"post", post},
+    StepForm{"publishProgress", publishProgress},
+    StepForm{"updateProgress", publishProgress},
+    StepForm{"unpublishProgress", unpublishProgress},
+    StepForm{"footer", nothing},
+    StepForm{"moveFooter", moveFooter},
+    StepForm{"layout", layout},
+    StepForm{"views", nothing},
+    StepForm{"tapButton", tapButton},
+    StepForm{"alert", alert},
+    StepForm{"share", share},
+    StepForm{"advance", advance},
+    StepForm{"change", change},
+    StepForm{"close", nothing},
+};
+
+std::string formNames() {
+    std::string names;
+    for (const StepForm& form : forms) {
+        names += (names.empty() ? "" : ", ") + std::string(form.name);
+    }
+    return names;
+}
+
+} // namespace
+
+ScenarioStep readStep(const JsonReader& reader) {
+    const JsonReader name = required(reader, "do", "what the step does");
+    ScenarioStep step{.name = name.string(), .arguments = {}};
+    const auto form = std::ranges::find(forms, step.name, &StepForm::name);
+    if (form == forms.end()) {
+        name.expected("one of " + formNames());
+    } else {
+        step.arguments = form->read(reader);
+    }
+    return step;
+}
+
+} // namespace nimbra::host
