@@ -1,0 +1,90 @@
+#include "host/cli/PaneCommands.h"
+
+#include "host/core/PaneSession.h"
+
+#include <nlohmann/json.hpp>
+#include <ostream>
+#include <utility>
+
+namespace nimbra::cli {
+
+namespace {
+
+using host::RowDescription;
+using host::RowKind;
+
+std::unexpected<Failure> refused(const host::RowRefusal& refusal) {
+    return std::unexpected(Failure{exitRefused, refusal.explanation});
+}
+
+} // namespace
+
+PaneCommands::PaneCommands(host::PaneSession& session, std::ostream& out)
+    : _session(session), _out(out), _text(Terminal::ofStandardOutput()), _shown(rows()) {}
+
+PaneCommands::Outcome PaneCommands::list() const {
+    _out << _text.page(_session.paneTitle(), rows());
+    return {};
+}
+
+PaneCommands::Outcome PaneCommands::listAsJson() const {
+    auto list = nlohmann::ordered_json::array();
+    for (const RowDescription& row : rows()) {
+        list.push_back(row.json());
+    }
+    _out << list.dump(2, ' ', false, nlohmann::ordered_json::error_handler_t::replace) << '\n';
+    return {};
+}
+
+PaneCommands::Outcome PaneCommands::get(std::string_view row) const {
+    const auto found = _session.row(row);
+    if (!found) {
+        return refused(found.error());
+    }
+    if (const auto refusal = host::refusalToRead(**found)) {
+        return refused(*refusal);
+    }
+    _out << host::displayedValue((*found)->value()) << '\n';
+    return {};
+}
+
+PaneCommands::Outcome PaneCommands::set(std::string_view row, std::string_view value) {
+    if (value != "on" && value != "off") {
+        return std::unexpected(
+            Failure{exitBadInput, "\"on\" or \"off\" expected, not \"" + std::string(value) + '"'});
+    }
+    if (const auto done = _session.setRow(row, value == "on"); !done) {
+        return refused(done.error());
+    }
+    return {};
+}
+
+PaneCommands::Outcome PaneCommands::tap(std::string_view row) {
+    if (const auto done = _session.tapRow(row); !done) {
+        return refused(done.error());
+    }
+    return {};
+}
+
+std::string PaneCommands::takeChanges() {
+    auto now = rows();
+    std::string changes = _text.changes(_shown, now);
+    _shown = std::move(now);
+    return changes;
+}
+
+std::vector<std::string> PaneCommands::rowNames() const {
+    std::vector<std::string> names;
+    for (const RowDescription& row : rows()) {
+        if (row.kind != RowKind::group && row.label()) {
+            names.push_back(row.label().string());
+        }
+    }
+    return names;
+}
+
+std::vector<RowDescription> PaneCommands::rows() const {
+    return RowDescription::of(_session.rows());
+}
+
+} // namespace nimbra::cli

@@ -1,0 +1,50 @@
+#pragma once
+
+#include "host/cli/Failure.h"
+#include "host/cli/ListText.h"
+#include "host/core/RowDescription.h"
+
+#include <expected>
+#include <iosfwd>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace nimbra::host {
+class PaneSession;
+}
+
+namespace nimbra::cli {
+
+/// What the user can do with the open pane of a session, the same from the command line and from
+/// the shell's prompt. Main queue.
+class PaneCommands {
+public:
+    /// Neither is owned; both outlive the commands. The session's pane is open.
+    PaneCommands(host::PaneSession& session, std::ostream& out);
+
+    using Outcome = std::expected<void, Failure>;
+
+    Outcome list() const;
+    Outcome listAsJson() const;
+    Outcome get(std::string_view row) const;
+    Outcome set(std::string_view row, std::string_view value);
+    Outcome tap(std::string_view row);
+
+    /// How the rows differ now from how they were when the commands were made, or when this was
+    /// asked last: a row a line, empty where nothing is different.
+    [[nodiscard]] std::string takeChanges();
+
+    /// The names by which the rows can be called, headings left out.
+    [[nodiscard]] std::vector<std::string> rowNames() const;
+
+private:
+    [[nodiscard]] std::vector<host::RowDescription> rows() const;
+
+    host::PaneSession& _session;
+    std::ostream& _out;
+    ListText _text;
+    std::vector<host::RowDescription> _shown;
+};
+
+} // namespace nimbra::cli

@@ -1,0 +1,77 @@
+#include "host/cli/PlayCommand.h"
+
+#include "device/DeviceDirectory.h"
+#include "device/files/Files.h"
+#include "host/core/PaneSession.h"
+#include "host/core/scenario/ScenarioPlayer.h"
+#include "host/core/scenario/ScenarioReader.h"
+#include "host/core/scenario/TemporaryDirectory.h"
+#include "host/core/scenario/TerminationGuard.h"
+#include "host/core/trace/Trace.h"
+
+#include <iostream>
+#include <iterator>
+
+namespace nimbra::cli {
+
+namespace {
+
+std::unexpected<Failure> badInput(const Error& error) {
+    return std::unexpected(Failure{exitBadInput, error.description});
+}
+
+std::expected<host::Scenario, Error> readScenario(const std::string& file) {
+    if (file == "-") {
+        const std::string text(std::istreambuf_iterator<char>(std::cin), {});
+        return host::readScenario(text, "standard input");
+    }
+    const auto text = device::readFile(file);
+    if (!text) {
+        return std::unexpected(text.error());
+    }
+    return host::readScenario(*text, file);
+}
+
+std::expected<void, Failure> playOn(const std::filesystem::path& root,
+                                    const host::Scenario& scenario, const PlayOptions& options,
+                                    std::ostream& out) {
+    if (const auto made = device::createDeviceDirectory(root, scenario.device.description); !made) {
+        return badInput(made.error());
+    }
+    host::Trace trace([&out](const std::string& line) { out << line << std::endl; });
+    const auto session = host::PaneSession::start(
+        {.root = root, .bundle = options.bundle, .locale = options.locale, .trace = &trace});
+    if (!session) {
+        return badInput(session.error());
+    }
+    if (const auto played = host::ScenarioPlayer(scenario, **session, trace).play(); !played) {
+        const host::StepFailure& failure = played.error();
+        return std::unexpected(Failure{exitRefused, "step " + std::to_string(failure.index) + " (" +
+                                                        failure.name + "): " + failure.reason});
+    }
+    return {};
+}
+
+} // namespace
+
+std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out,
+                                  std::ostream& messages) {
+    const auto scenario = readScenario(options.scenario);
+    if (!scenario) {
+        return badInput(scenario.error());
+    }
+    for (const std::string& note : scenario->notes) {
+        messages << "settingsctl: note: " << note << '\n';
+    }
+    if (options.keep) {
+        return playOn(*options.keep, *scenario, options, out);
+    }
+    const auto temporary = host::TemporaryDirectory::make();
+    if (!temporary) {
+        return badInput(temporary.error());
+    }
+    const host::TerminationGuard guard([&temporary] { temporary->remove(); });
+    return playOn(temporary->path() / "device", *scenario, options, out);
+}
+
+} // namespace nimbra::cli

@@ -1,0 +1,75 @@
+# Completion of settingsctl in bash.
+
+_settingsctl() {
+    local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
+    local commands="list get set tap init play shell completion"
+    local options="--root --locale --bundle --account --first-setup --version --help"
+    COMPREPLY=()
+
+    # What stands before the word: the command, how many arguments it has, and the options that
+    # say which page is meant.
+    local command="" place=0 index word
+    local -a page=()
+    for ((index = 1; index < COMP_CWORD; index++)); do
+        word=${COMP_WORDS[index]}
+        case $word in
+        --root | --locale | --bundle | --account)
+            page+=("$word" "$(eval "printf %s ${COMP_WORDS[index + 1]}" 2>/dev/null)")
+            ((index++))
+            ;;
+        --first-setup) page+=("$word") ;;
+        --from | --keep) ((index++)) ;;
+        -*) ;;
+        *) if [[ -z $command ]]; then command=$word; else ((place++)); fi ;;
+        esac
+    done
+
+    case $previous in
+    --root | --bundle | --keep)
+        mapfile -t COMPREPLY < <(compgen -d -- "$current")
+        return
+        ;;
+    --from)
+        mapfile -t COMPREPLY < <(compgen -f -- "$current")
+        return
+        ;;
+    --locale)
+        mapfile -t COMPREPLY < <(compgen -W "ar de-DE en-US fr-FR ja-JP" -- "$current")
+        return
+        ;;
+    --account) return ;;
+    esac
+
+    if [[ $current == -* ]]; then
+        case $command in
+        list) options+=" --json" ;;
+        init) options+=" --from" ;;
+        play) options+=" --keep" ;;
+        esac
+        mapfile -t COMPREPLY < <(compgen -W "$options" -- "$current")
+        return
+    fi
+
+    case $command:$place in
+    :0) mapfile -t COMPREPLY < <(compgen -W "$commands" -- "$current") ;;
+    get:0 | set:0 | tap:0)
+        # A row's name may hold blanks: compared as it is meant, completed as it has to be typed.
+        local typed row
+        typed=${current#[\"\']}
+        typed=${typed//\\/}
+        while IFS= read -r row; do
+            [[ $row == "$typed"* ]] || continue
+            case $current in
+            [\"\']*) COMPREPLY+=("$row") ;;
+            *) COMPREPLY+=("$(printf %q "$row")") ;;
+            esac
+        done < <("${COMP_WORDS[0]}" "${page[@]}" complete-rows 2>/dev/null)
+        ;;
+    set:1) mapfile -t COMPREPLY < <(compgen -W "on off" -- "$current") ;;
+    init:0) mapfile -t COMPREPLY < <(compgen -d -- "$current") ;;
+    play:0) mapfile -t COMPREPLY < <(compgen -f -- "$current") ;;
+    completion:0) mapfile -t COMPREPLY < <(compgen -W "bash zsh" -- "$current") ;;
+    esac
+}
+
+complete -F _settingsctl settingsctl

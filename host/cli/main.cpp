@@ -1,0 +1,158 @@
+#include "device/DevicePlatform.h"
+#include "device/store/DeviceAccountStore.h"
+#include "host/cli/Arguments.h"
+#include "host/cli/Completion.h"
+#include "host/cli/DeviceLocation.h"
+#include "host/cli/Failure.h"
+#include "host/cli/PaneCommands.h"
+#include "host/cli/PlayCommand.h"
+#include "host/cli/Shell.h"
+#include "host/core/PaneSession.h"
+
+#include <algorithm>
+#include <clocale>
+#include <iostream>
+
+namespace nimbra::cli {
+
+namespace {
+
+using Outcome = std::expected<void, Failure>;
+using SessionOutcome = std::expected<std::unique_ptr<host::PaneSession>, Failure>;
+
+std::unexpected<Failure> badInput(const std::string& message) {
+    return std::unexpected(Failure{exitBadInput, message});
+}
+
+/// Says which accounts there are when the device has none called `account`.
+Outcome checkAccount(host::PaneSession& session, const std::string& account) {
+    const auto known = session.device().accountStore().accountIdentifiers();
+    if (!known) {
+        return badInput(known.error().description);
+    }
+    if (std::ranges::find(*known, AccountIdentifier(account)) != known->end()) {
+        return {};
+    }
+    std::string list;
+    for (const AccountIdentifier& identifier : *known) {
+        list += (list.empty() ? "\"" : ", \"") + identifier.string() + '"';
+    }
+    return badInput("no account \"" + account + "\" (accounts: " + list + ')');
+}
+
+SessionOutcome openPane(const Arguments& arguments) {
+    const auto root = arguments.root.value_or(defaultDeviceDirectory());
+    if (const auto provided = provideDevice(root, std::cerr); !provided) {
+        return std::unexpected(provided.error());
+    }
+    auto session = host::PaneSession::start(
+        {.root = root, .bundle = arguments.bundle, .locale = arguments.locale});
+    if (!session) {
+        return badInput(session.error().description);
+    }
+    if (arguments.account) {
+        if (const auto known = checkAccount(**session, *arguments.account); !known) {
+            return std::unexpected(known.error());
+        }
+    }
+    const auto opened =
+        (*session)->openPane({.account = arguments.account, .firstSetup = arguments.firstSetup});
+    if (!opened) {
+        return badInput(opened.error().description);
+    }
+    (*session)->settle();
+    return std::move(*session);
+}
+
+Outcome runOnPane(const Arguments& arguments) {
+    const auto session = openPane(arguments);
+    if (!session) {
+        return std::unexpected(session.error());
+    }
+    PaneCommands commands(**session, std::cout);
+    const auto withChanges = [&](const Outcome& outcome) {
+        (*session)->settle();
+        std::cout << commands.takeChanges();
+        return outcome;
+    };
+    switch (arguments.command) {
+    case Command::get:
+        return commands.get(arguments.row);
+    case Command::set:
+        return withChanges(commands.set(arguments.row, arguments.value));
+    case Command::tap:
+        return withChanges(commands.tap(arguments.row));
+    default:
+        return arguments.json ? commands.listAsJson() : commands.list();
+    }
+}
+
+/// The rows' names, where that makes no device and says nothing of what is wrong: whoever presses
+/// the tabulator did not ask for either.
+void printRowNames(const Arguments& arguments) {
+    std::error_code ignored;
+    if (!std::filesystem::exists(arguments.root.value_or(defaultDeviceDirectory()), ignored)) {
+        return;
+    }
+    if (const auto session = openPane(arguments)) {
+        for (const std::string& name : PaneCommands(**session, std::cout).rowNames()) {
+            std::cout << name << '\n';
+        }
+    }
+}
+
+int runShell(const Arguments& arguments) {
+    const auto session = openPane(arguments);
+    if (!session) {
+        std::cerr << "settingsctl: " << session.error().message << '\n';
+        return session.error().exitStatus;
+    }
+    (*session)->appear();
+    return Shell(**session, std::cout, std::cerr).run();
+}
+
+Outcome run(const Arguments& arguments) {
+    switch (arguments.command) {
+    case Command::init:
+        return initializeDevice(arguments.directory, arguments.from, std::cout, std::cerr);
+    case Command::play:
+        return play({.scenario = arguments.scenario,
+                     .keep = arguments.keep,
+                     .bundle = arguments.bundle,
+                     .locale = arguments.locale},
+                    std::cout, std::cerr);
+    case Command::completion:
+        std::cout << (arguments.shellName == "bash" ? bashCompletion() : zshCompletion());
+        return {};
+    case Command::completeRows:
+        printRowNames(arguments);
+        return {};
+    default:
+        return runOnPane(arguments);
+    }
+}
+
+int runProgram(int count, char** words) {
+    const auto arguments = Arguments::parse(count, words);
+    if (!arguments) {
+        return arguments.error();
+    }
+    if (arguments->command == Command::shell) {
+        return runShell(*arguments);
+    }
+    if (const Outcome outcome = run(*arguments); !outcome) {
+        std::cerr << "settingsctl: " << outcome.error().message << '\n';
+        return outcome.error().exitStatus;
+    }
+    return exitDone;
+}
+
+} // namespace
+
+} // namespace nimbra::cli
+
+int main(int count, char** words) {
+    // The terminal's encoding; everything else follows the device's locale.
+    std::setlocale(LC_CTYPE, "");
+    return nimbra::cli::runProgram(count, words);
+}
