@@ -7,7 +7,10 @@ add_link_options(-Wl,--as-needed)
 include_directories(${PROJECT_SOURCE_DIR})
 
 if(NIMBRA_SANITIZERS)
-  add_compile_options(-fsanitize=${NIMBRA_SANITIZERS} -fno-omit-frame-pointer)
+  add_compile_options(-fsanitize=${NIMBRA_SANITIZERS} -fno-omit-frame-pointer
+                      -fno-sanitize-recover=all)
+  # The library's own checks of indices and of empty optionals, where nobody looks at speed.
+  add_compile_definitions(_GLIBCXX_ASSERTIONS)
   add_link_options(-fsanitize=${NIMBRA_SANITIZERS})
   # GCC 12's sanitizers make the optimiser see doubtful accesses in the standard library.
   add_compile_options(-Wno-maybe-uninitialized)
