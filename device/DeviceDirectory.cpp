@@ -36,16 +36,16 @@ std::expected<void, Error> writePreferences(const std::filesystem::path& directo
 /// Removes the files of the domains that `description` does not have.
 std::expected<void, Error> removeOtherPreferences(const std::filesystem::path& directory,
                                                   const DeviceDescription& description) {
-    std::error_code failure;
-    for (std::filesystem::directory_iterator entry(directory, failure), end;
-         !failure && entry != end; entry.increment(failure)) {
-        const std::filesystem::path& file = entry->path();
-        if (file.extension() == ".json" && !description.preferences.contains(file.stem())) {
-            std::filesystem::remove(file, failure);
-        }
+    const auto files = entriesOfDirectory(directory);
+    if (!files) {
+        return std::unexpected(files.error());
     }
-    if (failure) {
-        return std::unexpected(fileError(directory, "cannot be changed", failure.value()));
+    for (const std::filesystem::path& file : *files) {
+        std::error_code failure;
+        if (file.extension() == ".json" && !description.preferences.contains(file.stem()) &&
+            !std::filesystem::remove(file, failure) && failure) {
+            return std::unexpected(fileError(file, "cannot be removed", failure.value()));
+        }
     }
     return {};
 }

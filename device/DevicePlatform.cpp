@@ -14,7 +14,6 @@
 #include "device/system/DeviceWorkQueues.h"
 #include "platform/system/ClassRegistry.h"
 
-#include <cerrno>
 #include <system_error>
 #include <utility>
 
@@ -54,8 +53,9 @@ std::expected<void, Error> checkState(const DevicePaths& paths) {
     }
     std::error_code failure;
     if (!std::filesystem::is_directory(*state, failure)) {
-        return std::unexpected(
-            fileError(*state, "is not the state of a device", failure ? failure.value() : ENOTDIR));
+        return std::unexpected(deviceError(paths.root().string() +
+                                           ": not a device directory: it has no folder " +
+                                           std::string(kStateDirectory.substr(1))));
     }
     for (const DescriptionFile* file : {&restrictionsFile, &documentsFile}) {
         if (const auto description = readDescriptionFile(paths, *file); !description) {

@@ -1,9 +1,8 @@
 #include "device/bundles/StringTables.h"
 
-#include "device/DeviceError.h"
+#include "device/files/Files.h"
 #include "device/json/JsonReader.h"
 
-#include <algorithm>
 #include <nlohmann/json.hpp>
 #include <system_error>
 
@@ -34,27 +33,11 @@ std::expected<StringTable, Error> readTable(const std::filesystem::path& path) {
     return table;
 }
 
-/// What stands in `folder`, by name, so that of several mistakes always the same is reported.
-std::expected<std::vector<std::filesystem::path>, Error>
-entriesOf(const std::filesystem::path& folder) {
-    std::error_code failure;
-    std::vector<std::filesystem::path> entries;
-    for (std::filesystem::directory_iterator entry(folder, failure), end; !failure && entry != end;
-         entry.increment(failure)) {
-        entries.push_back(entry->path());
-    }
-    if (failure) {
-        return std::unexpected(fileError(folder, "cannot be read", failure.value()));
-    }
-    std::ranges::sort(entries);
-    return entries;
-}
-
 } // namespace
 
 std::expected<LanguageTables, Error> LanguageTables::read(const std::filesystem::path& folder) {
     LanguageTables tables;
-    const auto languages = entriesOf(folder);
+    const auto languages = entriesOfDirectory(folder);
     if (!languages) {
         return std::unexpected(languages.error());
     }
@@ -63,7 +46,7 @@ std::expected<LanguageTables, Error> LanguageTables::read(const std::filesystem:
         if (!std::filesystem::is_directory(language, failure)) {
             continue;
         }
-        const auto files = entriesOf(language);
+        const auto files = entriesOfDirectory(language);
         if (!files) {
             return std::unexpected(files.error());
         }

@@ -2,11 +2,13 @@
 
 #include "device/DeviceError.h"
 
+#include <algorithm>
 #include <array>
 #include <cerrno>
 #include <cstdio>
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <system_error>
 #include <unistd.h>
 
 namespace nimbra::device {
@@ -106,6 +108,21 @@ std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path
     }
     file.keep();
     return synchronizeDirectory(path.parent_path());
+}
+
+std::expected<std::vector<std::filesystem::path>, Error>
+entriesOfDirectory(const std::filesystem::path& directory) {
+    std::error_code failure;
+    std::vector<std::filesystem::path> entries;
+    for (std::filesystem::directory_iterator entry(directory, failure), end;
+         !failure && entry != end; entry.increment(failure)) {
+        entries.push_back(entry->path());
+    }
+    if (failure) {
+        return std::unexpected(fileError(directory, "cannot be read", failure.value()));
+    }
+    std::ranges::sort(entries);
+    return entries;
 }
 
 std::expected<void, Error> synchronizeDirectory(const std::filesystem::path& directory) {

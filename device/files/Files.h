@@ -6,6 +6,7 @@
 #include <filesystem>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace nimbra::device {
 
@@ -18,6 +19,10 @@ namespace nimbra::device {
 /// beside it.
 [[nodiscard]] std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,
                                                              std::string_view content);
+
+/// What stands in `directory`, sorted by name: of several mistakes always the same is met first.
+[[nodiscard]] std::expected<std::vector<std::filesystem::path>, Error>
+entriesOfDirectory(const std::filesystem::path& directory);
 
 /// Flushes the entries of `directory` to the disk.
 [[nodiscard]] std::expected<void, Error>

@@ -23,17 +23,31 @@ std::filesystem::path absoluteName(const std::filesystem::path& path) {
     return name.has_filename() ? name : name.parent_path();
 }
 
+/// Flushes the entries of `directory` and of all directories below it.
 std::expected<void, Error> synchronizeTree(const std::filesystem::path& directory) {
-    std::error_code failure;
-    for (std::filesystem::recursive_directory_iterator entry(directory, failure), end;
-         !failure && entry != end; entry.increment(failure)) {
-        if (entry->is_directory(failure)) {
-            if (auto synchronized = synchronizeDirectory(entry->path()); !synchronized) {
+    const auto entries = entriesOfDirectory(directory);
+    if (!entries) {
+        return std::unexpected(entries.error());
+    }
+    for (const std::filesystem::path& entry : *entries) {
+        std::error_code failure;
+        if (std::filesystem::is_directory(entry, failure)) {
+            if (auto synchronized = synchronizeTree(entry); !synchronized) {
                 return synchronized;
             }
         }
     }
     return synchronizeDirectory(directory);
+}
+
+std::expected<void, Error> moveTo(const std::filesystem::path& from,
+                                  const std::filesystem::path& target) {
+    std::error_code failure;
+    std::filesystem::rename(from, target, failure);
+    if (failure) {
+        return std::unexpected(fileError(target, "cannot be made", failure.value()));
+    }
+    return {};
 }
 
 } // namespace
@@ -103,24 +117,31 @@ std::expected<void, Error> StagedDirectory::makeParents() {
     return {};
 }
 
+std::expected<void, Error> StagedDirectory::moveEntriesIn() {
+    const auto entries = entriesOfDirectory(_path);
+    if (!entries) {
+        return std::unexpected(entries.error());
+    }
+    for (const std::filesystem::path& entry : *entries) {
+        if (auto moved = moveTo(entry, _target / entry.filename()); !moved) {
+            return moved;
+        }
+    }
+    std::error_code failure;
+    std::filesystem::remove(_path, failure);
+    if (failure) {
+        return std::unexpected(fileError(_path, "cannot be removed", failure.value()));
+    }
+    return {};
+}
+
 std::expected<void, Error> StagedDirectory::putInPlace() {
     if (auto synchronized = synchronizeTree(_path); !synchronized) {
         return synchronized;
     }
-    std::error_code failure;
-    if (_targetExists) {
-        for (std::filesystem::directory_iterator entry(_path, failure), end;
-             !failure && entry != end; entry.increment(failure)) {
-            std::filesystem::rename(entry->path(), _target / entry->path().filename(), failure);
-        }
-    } else {
-        std::filesystem::rename(_path, _target, failure);
-    }
-    if (failure) {
-        return std::unexpected(fileError(_target, "cannot be made", failure.value()));
-    }
-    if (_targetExists) {
-        std::filesystem::remove(_path, failure);
+    const auto moved = _targetExists ? moveEntriesIn() : moveTo(_path, _target);
+    if (!moved) {
+        return moved;
     }
     _path.clear();
     _made.clear();

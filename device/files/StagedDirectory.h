@@ -30,6 +30,7 @@ public:
 private:
     StagedDirectory() = default;
     [[nodiscard]] std::expected<void, Error> makeParents();
+    [[nodiscard]] std::expected<void, Error> moveEntriesIn();
 
     std::filesystem::path _target;
     std::filesystem::path _path;

@@ -29,14 +29,13 @@ std::string lineAndColumn(std::string_view text, std::size_t position) {
     return "line " + std::to_string(line) + ", column " + std::to_string(column);
 }
 
-/// The parser's message without its own heading and place.
+/// The parser's message without its heading, the place and the text that it read last.
 std::string shortReason(const std::string& message) {
-    constexpr std::size_t longest = 160;
-    const std::string_view placeEnd = ": ";
     auto start = message.find("parse error at line");
-    start = start == std::string::npos ? message.find("] ") : message.find(placeEnd, start);
-    std::string reason = start == std::string::npos ? message : message.substr(start + 2);
-    return reason.size() > longest ? reason.substr(0, longest) + "..." : reason;
+    start = message.find(start == std::string::npos ? "] " : ": ",
+                         start == std::string::npos ? 0 : start);
+    const std::string reason = start == std::string::npos ? message : message.substr(start + 2);
+    return reason.substr(0, reason.find("; last read: "));
 }
 
 /// Builds the document from what the parser reads, and stops it at the first thing wrong.

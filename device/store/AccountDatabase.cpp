@@ -55,9 +55,8 @@ Error notADatabase(const std::filesystem::path& path, const std::string& reason)
 /// `error` of the database at `path`, told as the reason why it is none.
 Error notADatabase(const std::filesystem::path& path, const Error& error) {
     const std::string start = path.string() + ": ";
-    return notADatabase(path, error.description.starts_with(start)
-                                  ? error.description.substr(start.size())
-                                  : error.description);
+    const bool namesPath = error.description.starts_with(start);
+    return notADatabase(path, error.description.substr(namesPath ? start.size() : 0));
 }
 
 } // namespace

@@ -4,6 +4,7 @@
 #include "device/files/PercentEncoding.h"
 
 #include <SQLiteCpp/SQLiteCpp.h>
+#include <cerrno>
 #include <map>
 #include <sqlite3.h>
 #include <system_error>
@@ -48,9 +49,7 @@ SQLite::Database openExisting(const std::filesystem::path& path) {
         return database;
     } catch (const SQLite::Exception& exception) {
         const int code = exception.getErrorCode();
-        std::error_code absent;
-        if ((code != SQLITE_CANTOPEN && code != SQLITE_READONLY) ||
-            !std::filesystem::is_regular_file(path, absent) || hasPendingChanges(path)) {
+        if ((code != SQLITE_CANTOPEN && code != SQLITE_READONLY) || hasPendingChanges(path)) {
             throw;
         }
         return openAsItStands(path);
@@ -117,6 +116,11 @@ Database::~Database() = default;
 
 std::expected<std::unique_ptr<Database>, Error> Database::open(const std::filesystem::path& path,
                                                                Access access) {
+    std::error_code failure;
+    if (access == Access::existing && !std::filesystem::is_regular_file(path, failure)) {
+        return std::unexpected(
+            fileError(path, "cannot be read", failure ? failure.value() : EISDIR));
+    }
     const bool foundPendingChanges = hasPendingChanges(path);
     try {
         SQLite::Database database =

@@ -1,6 +1,6 @@
 #include "device/system/DevicePreferences.h"
 
-#include "device/DeviceError.h"
+#include "device/files/Files.h"
 #include "device/json/JsonReader.h"
 #include "platform/system/SystemLog.h"
 
@@ -28,17 +28,16 @@ std::expected<void, Error> checkPreferences(const DevicePaths& paths) {
     if (!directory) {
         return std::unexpected(directory.error());
     }
-    std::error_code failure;
-    for (std::filesystem::directory_iterator entry(*directory, failure), end;
-         !failure && entry != end; entry.increment(failure)) {
-        if (entry->path().extension() == ".json") {
-            if (const auto reader = readDomain(entry->path()); !reader) {
+    const auto files = entriesOfDirectory(*directory);
+    if (!files) {
+        return std::unexpected(files.error());
+    }
+    for (const std::filesystem::path& file : *files) {
+        if (file.extension() == ".json") {
+            if (const auto reader = readDomain(file); !reader) {
                 return std::unexpected(reader.error());
             }
         }
-    }
-    if (failure) {
-        return std::unexpected(fileError(*directory, "cannot be read", failure.value()));
     }
     return {};
 }

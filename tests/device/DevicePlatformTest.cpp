@@ -1,0 +1,170 @@
+#include "device/DevicePlatform.h"
+
+#include "device/DeviceDirectory.h"
+#include "device/store/DeviceAccountStore.h"
+#include "device/system/DevicePreferences.h"
+#include "device/system/DeviceSettings.h"
+#include "device/system/DeviceWorkQueues.h"
+#include "platform/accounts/AccountStore.h"
+#include "platform/documents/DocumentContainers.h"
+#include "platform/system/FileManager.h"
+#include "platform/system/Localization.h"
+#include "platform/system/SystemLog.h"
+#include "tests/device/TestFiles.h"
+#include "tests/support/PumpedQueue.h"
+#include "tests/support/RecordingPresenter.h"
+#include "tests/support/TemporaryDirectory.h"
+
+#include <future>
+#include <gtest/gtest.h>
+#include <string>
+#include <vector>
+
+namespace nimbra::device {
+namespace {
+
+class DevicePlatformTest : public testing::Test {
+protected:
+    DevicePlatformTest() {
+        DeviceDescription description;
+        description.locale = "fr";
+        description.identity = "token";
+        description.containers = {{.identifier = "c", .isPublic = true}};
+        description.preferences["domain"] = {{"level", 4}};
+        const auto created = createDeviceDirectory(root(), description);
+        EXPECT_TRUE(created) << created.error();
+    }
+
+    [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }
+    [[nodiscard]] std::filesystem::path state(const std::string& name) const {
+        return root() / "var/lib/nimbra" / name;
+    }
+
+    [[nodiscard]] std::unique_ptr<DevicePlatform> open() {
+        auto platform = DevicePlatform::open(root(), _mainQueue);
+        EXPECT_TRUE(platform) << platform.error();
+        return std::move(*platform);
+    }
+
+    /// Expects that opening fails with `message` about `name` and leaves every byte as it was.
+    void expectRefusal(const std::string& name, const std::string& message) {
+        const auto before = test::treeOf(root());
+        const auto platform = DevicePlatform::open(root(), _mainQueue);
+        ASSERT_FALSE(platform);
+        EXPECT_EQ(platform.error().description, state(name).string() + ": " + message);
+        EXPECT_EQ(test::treeOf(root()), before);
+    }
+
+    [[nodiscard]] test::PumpedQueue& mainQueue() { return _mainQueue; }
+
+private:
+    test::TemporaryDirectory _directory;
+    test::PumpedQueue _mainQueue{"main"};
+};
+
+TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
+    const auto platform = open();
+    std::vector<std::string> calls;
+    test::RecordingPresenter presenter(calls);
+
+    const PlatformServices services = platform->servicesFor(presenter);
+
+    EXPECT_EQ(&services.presenter, &presenter);
+    EXPECT_TRUE(services.accountStore.accountWithIdentifier(AccountIdentifier("primary")));
+    EXPECT_EQ(services.fileManager.tidewaterIdentityToken(), Text("token"));
+    EXPECT_EQ(services.documentContainers.allContainers().size(), 1U);
+    EXPECT_EQ(services.localization.currentLocale(), Locale{"fr"});
+    EXPECT_EQ(&services.workQueues.mainQueue(), &mainQueue());
+    EXPECT_EQ(platform->accountStore().accountIdentifiers(),
+              std::vector{AccountIdentifier("primary")});
+    EXPECT_EQ(platform->preferences().integer("domain", "level"), 4);
+    EXPECT_EQ(platform->settings().localeIdentifier(), "fr");
+    EXPECT_TRUE(platform->systemLog().isEnabled(LogLevel::error));
+}
+
+TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
+    const auto platform = open();
+    std::vector<std::string> calls;
+    test::RecordingPresenter presenter(calls);
+    std::promise<void> completed;
+
+    platform->servicesFor(presenter).documentContainers.forceRefreshAllContainersWithCompletion(
+        [&completed] { completed.set_value(); });
+
+    completed.get_future().wait();
+}
+
+TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
+    std::vector<std::string> calls;
+    test::RecordingPresenter presenter(calls);
+    auto platform = open();
+    const PlatformServices services = platform->servicesFor(presenter);
+    const auto queue = services.workQueues.serialQueueWithLabel("late");
+    std::promise<void> start;
+    std::size_t found = 0;
+    queue->async([&] {
+        start.get_future().wait();
+        found = services.documentContainers.allContainers().size();
+    });
+    start.set_value();
+
+    platform.reset();
+
+    EXPECT_EQ(found, 1U);
+}
+
+TEST_F(DevicePlatformTest, OpeningAndReadingLeavesTheDirectoryAsItWas) {
+    const auto before = test::treeOf(root());
+
+    EXPECT_TRUE(open()->accountStore().accountIdentifiers());
+
+    EXPECT_EQ(test::treeOf(root()), before);
+}
+
+TEST_F(DevicePlatformTest, ADirectoryThatIsNoDeviceIsReported) {
+    const auto missing = DevicePlatform::open(root() / "none", mainQueue());
+
+    ASSERT_FALSE(missing);
+    EXPECT_EQ(missing.error().description,
+              (root() / "none").string() +
+                  ": not a device directory: it has no folder var/lib/nimbra");
+    EXPECT_FALSE(std::filesystem::exists(root() / "none"));
+}
+
+TEST_F(DevicePlatformTest, EachMissingFileIsReported) {
+    for (const char* const name : {"device.json", "restrictions.json", "documents.json"}) {
+        const std::string content = test::contentOf(state(name));
+        std::filesystem::remove(state(name));
+        expectRefusal(name, "cannot be read: No such file or directory");
+        test::writeTestFile(state(name), content);
+    }
+    std::filesystem::remove(state("accounts.db"));
+    expectRefusal("accounts.db",
+                  "not an account database: cannot be read: No such file or directory");
+}
+
+TEST_F(DevicePlatformTest, EachDamagedFileIsReportedWithItsPlaceAndLeftAsItWas) {
+    const auto expectRefusalOf = [this](const std::string& name, const std::string& text,
+                                        const std::string& message) {
+        const std::string content = test::contentOf(state(name));
+        test::writeTestFile(state(name), text);
+        expectRefusal(name, message);
+        test::writeTestFile(state(name), content);
+    };
+    expectRefusalOf("device.json", "{\n\"locale\": de}",
+                    "line 2, column 11: not JSON: syntax error while parsing value - invalid "
+                    "literal");
+    expectRefusalOf("device.json", R"({"abilities": {"cellularData": 1}})",
+                    "/abilities/cellularData: expected true or false, found 1");
+    expectRefusalOf("restrictions.json", R"({"cloudSyncDenied": 1})",
+                    "/cloudSyncDenied: expected an array, found 1");
+    expectRefusalOf("documents.json", R"({"containers": [{}]})",
+                    "/containers/0/identifier: expected a string that is not empty, found nothing");
+    expectRefusalOf("preferences/domain.json", "7",
+                    "/: expected an object of keys and values, found 7");
+    expectRefusalOf("accounts.db", std::string(4096, '?'),
+                    "not an account database: file is not a database");
+}
+
+} // namespace
+} // namespace nimbra::device

@@ -1,0 +1,153 @@
+#include "tests/device/bundles/TestBundles.h"
+
+namespace nimbra::device {
+namespace {
+
+using DeviceBundlesTest = BundlesFixture;
+
+TEST_F(DeviceBundlesTest, ALoadedBundleIsFoundByItsIdentifier) {
+    makeBundle(folder());
+
+    const auto bundle = load();
+
+    EXPECT_EQ(bundle->identifier(), BundleIdentifier("com.example.a"));
+    EXPECT_EQ(bundle->principalClass().name, "FirstController");
+    EXPECT_EQ(classes().classNamed("FirstController"), &bundle->principalClass());
+    EXPECT_EQ(bundles().bundleWithIdentifier(BundleIdentifier("com.example.a")), bundle);
+    EXPECT_EQ(bundles().bundleWithIdentifier(BundleIdentifier("com.example.b")), nullptr);
+}
+
+TEST_F(DeviceBundlesTest, TheSameFolderGivesTheSameBundle) {
+    makeBundle(folder());
+    std::filesystem::create_directory_symlink(folder(), folder().parent_path() / "link");
+
+    const auto bundle = load();
+
+    EXPECT_EQ(load(), bundle);
+    EXPECT_EQ(bundles().load(folder().parent_path() / "link"), bundle);
+}
+
+TEST_F(DeviceBundlesTest, AnotherPlatformOfTheProcessLoadsTheSameFolderForItself) {
+    makeBundle(folder());
+    const auto bundle = load();
+    ClassRegistry otherClasses;
+    DeviceBundles others(settings(), otherClasses);
+
+    const auto other = others.load(folder());
+
+    ASSERT_TRUE(other) << other.error();
+    EXPECT_NE(*other, bundle);
+    EXPECT_EQ(otherClasses.classNamed("FirstController"), &(*other)->principalClass());
+}
+
+TEST_F(DeviceBundlesTest, ABundleCanBeHiddenFromTheLookup) {
+    makeBundle(folder());
+    const BundleIdentifier identifier("com.example.a");
+
+    bundles().setFindable(identifier, false);
+    const auto bundle = load();
+    EXPECT_EQ(bundles().bundleWithIdentifier(identifier), nullptr);
+
+    bundles().setFindable(identifier, true);
+    EXPECT_EQ(bundles().bundleWithIdentifier(identifier), bundle);
+}
+
+TEST_F(DeviceBundlesTest, WhatIsNoFolderIsNoBundle) {
+    test::writeTestFile(folder(), "a file");
+
+    EXPECT_EQ(failureOf(folder()), folder().string() + ": is not a bundle: Not a directory");
+    EXPECT_EQ(failureOf(folder().parent_path() / "none"),
+              (folder().parent_path() / "none").string() +
+                  ": is not a bundle: No such file or directory");
+}
+
+TEST_F(DeviceBundlesTest, AManifestThatIsWrongIsReportedWithItsPlace) {
+    const auto manifest = folder() / "manifest.json";
+    const auto failureWith = [&](const std::string& text) {
+        test::writeTestFile(manifest, text);
+        return failureOf(folder());
+    };
+    std::filesystem::create_directory(folder());
+    EXPECT_EQ(failureOf(folder()),
+              manifest.string() + ": cannot be read: No such file or directory");
+    EXPECT_EQ(failureWith(R"({"executable": "A.so", "principalClass": "C"})"),
+              manifest.string() +
+                  ": /identifier: expected a string that is not empty, found nothing");
+    EXPECT_EQ(failureWith(R"({"identifier": "i", "executable": "../A.so", "principalClass": "C"})"),
+              manifest.string() + ": /executable: expected the name of a file beside the "
+                                  "manifest, found \"../A.so\"");
+    EXPECT_EQ(failureWith(R"({"identifier": "i", "version": 1})"),
+              manifest.string() + ": /version: unknown key; expected one of identifier, "
+                                  "executable, principalClass, developmentLanguage");
+    EXPECT_EQ(failureWith(R"("bundle")"),
+              manifest.string() + ": /: expected an object, found \"bundle\"");
+}
+
+TEST_F(DeviceBundlesTest, AStringTableThatIsWrongIsReportedWithItsPlace) {
+    makeBundle(folder());
+    const auto table = folder() / "de/Localizable.json";
+
+    writeTable("de", R"({"KEY": 7})");
+    EXPECT_EQ(failureOf(folder()), table.string() + ": /KEY: expected a text, found 7");
+    writeTable("de", "{\n  \"KEY\": \"x\",\n}");
+    EXPECT_EQ(failureOf(folder()),
+              table.string() + ": line 3, column 1: not JSON: syntax error while parsing object "
+                               "key - unexpected '}'; expected string literal");
+    writeTable("de", R"(["x"])");
+    EXPECT_EQ(failureOf(folder()),
+              table.string() + ": /: expected an object of keys and texts, found [\"x\"]");
+    EXPECT_EQ(classes().classNamed("FirstController"), nullptr);
+}
+
+TEST_F(DeviceBundlesTest, ABundleWithoutItsSharedObjectIsReported) {
+    makeBundle(folder());
+    std::filesystem::remove(folder() / "A.so");
+
+    EXPECT_EQ(failureOf(folder()), (folder() / "A.so").string() +
+                                       ": the bundle's shared object cannot be loaded: No such "
+                                       "file or directory");
+}
+
+TEST_F(DeviceBundlesTest, AFileThatIsNoSharedObjectIsReported) {
+    makeBundle(folder());
+    test::writeTestFile(folder() / "A.so", "not a shared object, but long enough for a header");
+
+    const std::string failure = failureOf(folder());
+
+    EXPECT_TRUE(failure.starts_with((folder() / "A.so").string() +
+                                    ": the bundle's shared object cannot be loaded: "))
+        << failure;
+    EXPECT_EQ(failure.find('\n'), std::string::npos);
+}
+
+TEST_F(DeviceBundlesTest, ASharedObjectWithoutItsEntryPointIsReported) {
+    makeBundle(folder(), "test-object-empty");
+
+    EXPECT_EQ(failureOf(folder()), (folder() / "A.so").string() +
+                                       ": the bundle's shared object lacks its entry point "
+                                       "NimbraBundleRegisterClasses");
+}
+
+TEST_F(DeviceBundlesTest, ABundleWhoseClassHasATakenNameIsReported) {
+    makeBundle(folder());
+    const auto first = load();
+    const auto second = folder().parent_path() / "B.bundle";
+    makeBundle(second, "test-object-same-class", "com.example.b");
+
+    EXPECT_EQ(failureOf(second),
+              (second / "A.so").string() + ": the name of one of its classes is taken");
+    EXPECT_EQ(bundles().bundleWithIdentifier(BundleIdentifier("com.example.b")), nullptr);
+}
+
+TEST_F(DeviceBundlesTest, ABundleWithoutItsPrincipalClassIsReported) {
+    makeBundle(folder());
+    test::writeTestFile(folder() / "manifest.json",
+                        R"({"identifier": "i", "executable": "A.so", "principalClass": "Other"})");
+
+    EXPECT_EQ(failureOf(folder()), (folder() / "A.so").string() +
+                                       ": registers no class named Other, the manifest's "
+                                       "principalClass");
+}
+
+} // namespace
+} // namespace nimbra::device

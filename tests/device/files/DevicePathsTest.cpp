@@ -1,0 +1,59 @@
+#include "device/files/DevicePaths.h"
+
+#include "tests/device/TestFiles.h"
+#include "tests/support/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
+
+namespace nimbra::device {
+namespace {
+
+class DevicePathsTest : public testing::Test {
+protected:
+    [[nodiscard]] std::string resolved(const std::string& devicePath) const {
+        const auto path = _paths.resolve(devicePath);
+        return path ? path->lexically_relative(_directory.path()).string()
+                    : path.error().description;
+    }
+
+    [[nodiscard]] const std::filesystem::path& root() const { return _directory.path(); }
+
+private:
+    test::TemporaryDirectory _directory;
+    DevicePaths _paths{_directory.path()};
+};
+
+TEST_F(DevicePathsTest, PathsStandBelowTheRoot) {
+    EXPECT_EQ(resolved("/var/lib/nimbra"), "var/lib/nimbra");
+    EXPECT_EQ(resolved("var/lib"), "var/lib");
+    EXPECT_EQ(resolved("//var/./lib//x"), "var/lib/x");
+}
+
+TEST_F(DevicePathsTest, DotDotStopsAtTheRoot) {
+    EXPECT_EQ(resolved("/../../etc/passwd"), "etc/passwd");
+    EXPECT_EQ(resolved("/var/../../../x"), "x");
+}
+
+TEST_F(DevicePathsTest, LinksAreFollowedInsideTheRoot) {
+    std::filesystem::create_directories(root() / "var");
+    std::filesystem::create_symlink("/etc", root() / "var/absolute");
+    std::filesystem::create_symlink("../../../etc", root() / "var/relative");
+    std::filesystem::create_symlink("absolute/deeper", root() / "var/twice");
+
+    EXPECT_EQ(resolved("/var/absolute/passwd"), "etc/passwd");
+    EXPECT_EQ(resolved("/var/relative/passwd"), "etc/passwd");
+    EXPECT_EQ(resolved("/var/twice/x"), "etc/deeper/x");
+}
+
+TEST_F(DevicePathsTest, LinksThatLeadRoundInACircleAreAnError) {
+    std::filesystem::create_symlink("b", root() / "a");
+    std::filesystem::create_symlink("a", root() / "b");
+
+    const std::string failure = resolved("/a/x");
+
+    EXPECT_TRUE(failure.ends_with(": cannot be followed: Too many levels of symbolic links"))
+        << failure;
+}
+
+} // namespace
+} // namespace nimbra::device

@@ -1,0 +1,76 @@
+#include "device/files/Files.h"
+
+#include "tests/device/TestFiles.h"
+#include "tests/support/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+namespace nimbra::device {
+namespace {
+
+TEST(FilesTest, AWrittenFileIsReadBackByteByByte) {
+    const test::TemporaryDirectory directory;
+    const auto path = directory.path() / "file";
+    std::string content(200000, 'x');
+    content += '\0';
+    content += "\n\xff";
+
+    ASSERT_TRUE(writeFileAtomically(path, content));
+
+    EXPECT_EQ(readFile(path), content);
+    EXPECT_EQ(test::treeOf(directory.path()).size(), 1U);
+}
+
+TEST(FilesTest, WritingReplacesTheContentAndKeepsThePermissions) {
+    const test::TemporaryDirectory directory;
+    const auto path = directory.path() / "file";
+    test::writeTestFile(path, "old and longer");
+    ASSERT_EQ(::chmod(path.c_str(), 0640), 0);
+
+    ASSERT_TRUE(writeFileAtomically(path, "new"));
+
+    EXPECT_EQ(test::contentOf(path), "new");
+    EXPECT_EQ(std::filesystem::status(path).permissions(), std::filesystem::perms(0640));
+}
+
+TEST(FilesTest, AWriteThatCannotStartNamesTheFile) {
+    const test::TemporaryDirectory directory;
+    test::writeTestFile(directory.path() / "file", "in the way");
+
+    const auto written = writeFileAtomically(directory.path() / "file/below", "text");
+
+    ASSERT_FALSE(written);
+    EXPECT_EQ(written.error().description,
+              (directory.path() / "file/below").string() + ": cannot be written: Not a directory");
+    EXPECT_EQ(test::treeOf(directory.path()),
+              (std::map<std::string, std::string>{{"file", "in the way"}}));
+}
+
+TEST(FilesTest, AWriteThatCannotEndLeavesNothingBeside) {
+    const test::TemporaryDirectory directory;
+    std::filesystem::create_directories(directory.path() / "place/taken");
+
+    const auto written = writeFileAtomically(directory.path() / "place", "text");
+
+    ASSERT_FALSE(written);
+    EXPECT_EQ(written.error().description,
+              (directory.path() / "place").string() + ": cannot be written: Is a directory");
+    EXPECT_EQ(
+        test::treeOf(directory.path()),
+        (std::map<std::string, std::string>{{"place", "directory"}, {"place/taken", "directory"}}));
+}
+
+TEST(FilesTest, ADirectoryThatIsMissingCannotBeFlushed) {
+    const test::TemporaryDirectory directory;
+
+    const auto synchronized = synchronizeDirectory(directory.path() / "missing");
+
+    ASSERT_FALSE(synchronized);
+    EXPECT_EQ(synchronized.error().description, (directory.path() / "missing").string() +
+                                                    ": cannot be flushed: No such file or "
+                                                    "directory");
+}
+
+} // namespace
+} // namespace nimbra::device

@@ -1,0 +1,111 @@
+#include "device/system/DeviceSystemLog.h"
+
+#include "tests/device/TestFiles.h"
+#include "tests/support/TemporaryDirectory.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <gtest/gtest.h>
+#include <regex>
+#include <string>
+#include <thread>
+#include <vector>
+
+namespace nimbra::device {
+namespace {
+
+class DeviceSystemLogTest : public testing::Test {
+protected:
+    ~DeviceSystemLogTest() override { ::unsetenv("NIMBRA_LOG"); }
+
+    [[nodiscard]] const std::filesystem::path& root() const { return _directory.path(); }
+    [[nodiscard]] std::filesystem::path file() const {
+        return root() / "var/log/nimbra/settings.log";
+    }
+    [[nodiscard]] DeviceSystemLog log() const {
+        return {DevicePaths(root()), DeviceSystemLog::Destination::file};
+    }
+
+    /// The lines of the file without their times, which are checked.
+    [[nodiscard]] std::string linesOfFile() const {
+        static const std::regex time(
+            R"((^|\n)\d{4}-\d\d-\d\dT\d\d:\d\d:\d\d\.\d{3}[+-]\d\d:\d\d )");
+        return std::regex_replace(test::contentOf(file()), time, "$1");
+    }
+
+private:
+    test::TemporaryDirectory _directory;
+};
+
+TEST_F(DeviceSystemLogTest, EachLineOfTheFileNamesItsLevel) {
+    ::setenv("NIMBRA_LOG", "debug", 1);
+    DeviceSystemLog systemLog = log();
+    testing::internal::CaptureStderr();
+
+    systemLog.write(LogLevel::debug, "looked");
+    systemLog.write(LogLevel::standard, "did {} and %s");
+    systemLog.write(LogLevel::error, "failed\nbadly");
+
+    EXPECT_EQ(linesOfFile(), "debug: looked\ndefault: did {} and %s\nerror: failed badly\n");
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "nimbra-settings: error: failed badly\n");
+}
+
+TEST_F(DeviceSystemLogTest, DebugIsDroppedUnlessItIsAskedFor) {
+    DeviceSystemLog quiet = log();
+    quiet.write(LogLevel::debug, "looked");
+
+    EXPECT_FALSE(quiet.isEnabled(LogLevel::debug));
+    EXPECT_TRUE(quiet.isEnabled(LogLevel::standard));
+    EXPECT_TRUE(quiet.isEnabled(LogLevel::error));
+    EXPECT_FALSE(std::filesystem::exists(file()));
+
+    ::setenv("NIMBRA_LOG", "info", 1);
+    EXPECT_FALSE(log().isEnabled(LogLevel::debug));
+    ::setenv("NIMBRA_LOG", "debug", 1);
+    EXPECT_TRUE(log().isEnabled(LogLevel::debug));
+}
+
+TEST_F(DeviceSystemLogTest, NothingIsMadeBeforeTheFirstLine) {
+    {
+        const DeviceSystemLog systemLog = log();
+    }
+
+    EXPECT_TRUE(test::treeOf(root()).empty());
+}
+
+TEST_F(DeviceSystemLogTest, AFileThatCannotBeOpenedIsToldOnceAndErrorsStillShow) {
+    test::writeTestFile(root() / "var/log", "in the way");
+    DeviceSystemLog systemLog = log();
+    testing::internal::CaptureStderr();
+
+    systemLog.write(LogLevel::standard, "did");
+    systemLog.write(LogLevel::error, "failed");
+
+    const std::string shown = testing::internal::GetCapturedStderr();
+    EXPECT_TRUE(shown.starts_with("nimbra-settings: " + file().string() + ": ")) << shown;
+    EXPECT_TRUE(shown.ends_with("\nnimbra-settings: error: failed\n")) << shown;
+    EXPECT_EQ(std::ranges::count(shown, '\n'), 2);
+    EXPECT_EQ(test::contentOf(root() / "var/log"), "in the way");
+}
+
+TEST_F(DeviceSystemLogTest, ManyThreadsMayWriteWholeLines) {
+    DeviceSystemLog systemLog = log();
+    {
+        std::vector<std::jthread> threads;
+        for (int index = 0; index < 4; ++index) {
+            threads.emplace_back([&systemLog] {
+                for (int round = 0; round < 50; ++round) {
+                    systemLog.write(LogLevel::standard, "line");
+                }
+            });
+        }
+    }
+    std::string expected;
+    for (int index = 0; index < 200; ++index) {
+        expected += "default: line\n";
+    }
+    EXPECT_EQ(linesOfFile(), expected);
+}
+
+} // namespace
+} // namespace nimbra::device
