@@ -1,0 +1,49 @@
+#pragma once
+
+#include "device/DevicePlatform.h"
+#include "host/core/HostLoop.h"
+#include "host/core/scenario/TemporaryDirectory.h"
+#include "platform/host/Presenter.h"
+#include "platform/host/SettingsListController.h"
+
+#include <cstddef>
+#include <filesystem>
+#include <memory>
+
+namespace nimbra {
+struct ControllerClass;
+}
+
+namespace nimbra::bench {
+
+/// A device with one account, its cloud documents on, in a directory of its own: real stores, real
+/// queues. Throws `std::runtime_error` when it cannot be made.
+class BenchDevice final : private Presenter {
+public:
+    BenchDevice();
+
+    [[nodiscard]] device::DevicePlatform& platform() { return *_platform; }
+    [[nodiscard]] PlatformServices services() { return _platform->servicesFor(*this); }
+    /// The same, but with other bundles, which are not owned.
+    [[nodiscard]] PlatformServices servicesWith(Bundles& bundles);
+
+    /// The folder of the pane's bundle as it was built.
+    [[nodiscard]] static std::filesystem::path builtBundle();
+    [[nodiscard]] std::filesystem::path accountsDatabase() const;
+    /// An empty place for a benchmark's own files.
+    [[nodiscard]] std::filesystem::path scratch() const { return _directory.path(); }
+
+    /// The rows of a pane of this class, opened on the device's account.
+    [[nodiscard]] static std::size_t rowsOfNewPane(const ControllerClass& paneClass,
+                                                   const PlatformServices& services);
+
+private:
+    void dismissPresentedController(bool /*animated*/) override {}
+    void dismissPane(bool /*animated*/) override {}
+
+    host::TemporaryDirectory _directory;
+    host::HostLoop _loop;
+    std::unique_ptr<device::DevicePlatform> _platform;
+};
+
+} // namespace nimbra::bench
