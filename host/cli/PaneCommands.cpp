@@ -2,6 +2,7 @@
 
 #include "host/core/PaneSession.h"
 
+#include <algorithm>
 #include <nlohmann/json.hpp>
 #include <ostream>
 #include <utility>
@@ -67,6 +68,9 @@ PaneCommands::Outcome PaneCommands::tap(std::string_view row) {
 }
 
 std::string PaneCommands::takeChanges() {
+    if (!_session.isPaneOpen()) {
+        return "The page has closed.\n";
+    }
     auto now = rows();
     std::string changes = _text.changes(_shown, now);
     _shown = std::move(now);
@@ -74,10 +78,18 @@ std::string PaneCommands::takeChanges() {
 }
 
 std::vector<std::string> PaneCommands::rowNames() const {
+    const std::vector<RowDescription> all = rows();
+    const auto isCalled = [](const RowDescription& row, const Text& name) {
+        return row.name == name || row.id == name;
+    };
     std::vector<std::string> names;
-    for (const RowDescription& row : rows()) {
-        if (row.kind != RowKind::group && row.label()) {
-            names.push_back(row.label().string());
+    for (const RowDescription& row : all) {
+        const bool isUnique = std::ranges::count_if(all, [&](const RowDescription& other) {
+                                  return isCalled(other, row.name);
+                              }) == 1;
+        const Text& name = row.name && (isUnique || !row.id) ? row.name : row.id;
+        if (row.kind != RowKind::group && name) {
+            names.push_back(name.string());
         }
     }
     return names;

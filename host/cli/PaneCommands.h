@@ -32,10 +32,11 @@ public:
     Outcome tap(std::string_view row);
 
     /// How the rows differ now from how they were when the commands were made, or when this was
-    /// asked last: a row a line, empty where nothing is different.
+    /// asked last: a row a line, empty where nothing is different. The page may have closed.
     [[nodiscard]] std::string takeChanges();
 
-    /// The names by which the rows can be called, headings left out.
+    /// What each row can be called by, headings left out: its name, or its identifier where
+    /// another row has the same name.
     [[nodiscard]] std::vector<std::string> rowNames() const;
 
 private:

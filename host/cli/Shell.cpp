@@ -54,9 +54,9 @@ const std::vector<Shell::Command>& Shell::commands() {
         {"set", Arguments::rowAndValue, "set ROW on|off", "turn a switch on or off", &Shell::set},
         {"tap", Arguments::row, "tap ROW", "press a button", &Shell::tap},
         {"refresh", Arguments::none, "refresh",
-         "pull the list down, to look for changes in the cloud", &Shell::refresh},
-        {"active", Arguments::none, "active",
-         "come back from another application: the list is built anew", &Shell::becomeActive},
+         "pull the list down to look for changes in the cloud", &Shell::refresh},
+        {"active", Arguments::none, "active", "come back from another application",
+         &Shell::becomeActive},
         {"help", Arguments::none, "help", "show this", &Shell::help},
         {"quit", Arguments::none, "quit", "leave; so does ^D", &Shell::quit},
     };
@@ -71,7 +71,7 @@ int Shell::run() {
 }
 
 int Shell::runAtTerminal() {
-    _out << "The pane is open. \"list\" shows its rows, \"help\" all commands.\n";
+    _out << "The page is open. \"list\" shows its rows, \"help\" all commands.\n";
     LineEditor editor({.prompt = "nimbra> ",
                        .history = stateDirectory() / "history",
                        .wakeUpDescriptor = _session.loop().wakeUpDescriptor(),
@@ -108,9 +108,6 @@ bool Shell::isDone() const {
 
 std::string Shell::takeChanges() {
     _session.loop().runPending();
-    if (!_session.isPaneOpen()) {
-        return "The pane has closed.\n";
-    }
     std::string changes = _commands.takeChanges();
     if (_isRefreshing && !_session.isRefreshing()) {
         _isRefreshing = false;

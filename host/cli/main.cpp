@@ -72,7 +72,9 @@ Outcome runOnPane(const Arguments& arguments) {
     PaneCommands commands(**session, std::cout);
     const auto withChanges = [&](const Outcome& outcome) {
         (*session)->settle();
-        std::cout << commands.takeChanges();
+        if (outcome) {
+            std::cout << commands.takeChanges();
+        }
         return outcome;
     };
     switch (arguments.command) {

@@ -111,6 +111,9 @@ void PaneSession::pullToRefresh() {
 }
 
 bool PaneSession::isRefreshing() {
+    if (!_pane) {
+        return false;
+    }
     const auto& control = _pane->table().refreshControl();
     return control && control->isRefreshing();
 }

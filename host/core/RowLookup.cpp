@@ -15,8 +15,10 @@ std::string quoted(std::string_view text) {
     return '"' + std::string(text) + '"';
 }
 
+/// The row as people call it.
 std::string quoted(const Specifier& row) {
-    return row.label() ? quoted(row.label().string()) : "the row without a name";
+    const Text& name = row.name() ? row.name() : row.identifier();
+    return name ? quoted(name.string()) : "the row without a name";
 }
 
 std::string joined(const std::vector<std::string>& pieces) {
@@ -57,7 +59,7 @@ RowRefusal ambiguous(const SpecifierArray& matches, std::string_view name) {
     std::vector<std::string> identifiers;
     for (const auto& row : matches) {
         if (row->identifier()) {
-            identifiers.push_back(quoted(*row));
+            identifiers.push_back(quoted(row->identifier().string()));
         }
     }
     return {Reason::ambiguous,

@@ -1,5 +1,16 @@
 # Completion of settingsctl in bash.
 
+# The word $1 as the shell would take it, without running anything that stands in it.
+_settingsctl_unquoted() {
+    local word=$1
+    case $word in
+    \"*\" | \'*\') word=${word:1:-1} ;;
+    \~/*) word=$HOME/${word:2} ;;
+    *) word=${word//\\/} ;;
+    esac
+    printf %s "$word"
+}
+
 _settingsctl() {
     local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
     local commands="list get set tap init play shell completion"
@@ -14,7 +25,7 @@ _settingsctl() {
         word=${COMP_WORDS[index]}
         case $word in
         --root | --locale | --bundle | --account)
-            page+=("$word" "$(eval "printf %s ${COMP_WORDS[index + 1]}" 2>/dev/null)")
+            page+=("$word" "$(_settingsctl_unquoted "${COMP_WORDS[index + 1]}")")
             ((index++))
             ;;
         --first-setup) page+=("$word") ;;
@@ -26,10 +37,12 @@ _settingsctl() {
 
     case $previous in
     --root | --bundle | --keep)
+        compopt -o filenames 2>/dev/null
         mapfile -t COMPREPLY < <(compgen -d -- "$current")
         return
         ;;
     --from)
+        compopt -o filenames 2>/dev/null
         mapfile -t COMPREPLY < <(compgen -f -- "$current")
         return
         ;;
@@ -66,8 +79,14 @@ _settingsctl() {
         done < <("${COMP_WORDS[0]}" "${page[@]}" complete-rows 2>/dev/null)
         ;;
     set:1) mapfile -t COMPREPLY < <(compgen -W "on off" -- "$current") ;;
-    init:0) mapfile -t COMPREPLY < <(compgen -d -- "$current") ;;
-    play:0) mapfile -t COMPREPLY < <(compgen -f -- "$current") ;;
+    init:0)
+        compopt -o filenames 2>/dev/null
+        mapfile -t COMPREPLY < <(compgen -d -- "$current")
+        ;;
+    play:0)
+        compopt -o filenames 2>/dev/null
+        mapfile -t COMPREPLY < <(compgen -f -- "$current")
+        ;;
     completion:0) mapfile -t COMPREPLY < <(compgen -W "bash zsh" -- "$current") ;;
     esac
 }

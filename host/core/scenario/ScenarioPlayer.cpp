@@ -61,16 +61,19 @@ ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session, T
 
 std::expected<void, StepFailure> ScenarioPlayer::play() {
     applyToBundle(_scenario.device);
-    for (std::size_t index = 0; index < _scenario.steps.size(); ++index) {
+    std::expected<void, StepFailure> result;
+    for (std::size_t index = 0; result && index < _scenario.steps.size(); ++index) {
         const ScenarioStep& step = _scenario.steps[index];
         _trace.write("step", {{"index", index}, {"do", step.name}});
         const Outcome outcome = perform(step);
         _session.settle();
         if (!outcome) {
-            return std::unexpected(StepFailure{index, step.name, outcome.error()});
+            result = std::unexpected(StepFailure{index, step.name, outcome.error()});
         }
     }
-    return {};
+    // That the session then closes a pane that is still open is no step's doing.
+    _trace.end();
+    return result;
 }
 
 void ScenarioPlayer::applyToBundle(const device::GivenDescription& given) {

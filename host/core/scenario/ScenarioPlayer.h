@@ -27,7 +27,7 @@ public:
     /// `trace`. None is owned; all outlive the player.
     ScenarioPlayer(const Scenario& scenario, PaneSession& session, Trace& trace);
 
-    /// Does all steps; ends at the first that cannot be done.
+    /// Does all steps, or those up to the first that cannot be done, and ends the trace.
     [[nodiscard]] std::expected<void, StepFailure> play();
 
 private:

@@ -14,7 +14,14 @@ void Trace::write(std::string_view event, Keys keys) {
     const std::string line =
         object.dump(-1, ' ', false, nlohmann::ordered_json::error_handler_t::replace);
     const std::scoped_lock lock(_mutex);
-    _sink(line);
+    if (!_hasEnded) {
+        _sink(line);
+    }
+}
+
+void Trace::end() {
+    const std::scoped_lock lock(_mutex);
+    _hasEnded = true;
 }
 
 } // namespace nimbra::host

@@ -24,9 +24,13 @@ public:
     /// Text that is not UTF-8 is written with replacement characters.
     void write(std::string_view event, Keys keys);
 
+    /// What happens from now on is no longer written.
+    void end();
+
 private:
     std::mutex _mutex;
     Sink _sink;
+    bool _hasEnded = false;
 };
 
 } // namespace nimbra::host
