@@ -1,0 +1,2 @@
+// A shared object that exports nothing: no bundle's.
+namespace nimbra::test {}

@@ -1,0 +1,176 @@
+#include "host/core/AccountPage.h"
+#include "host/core/trace/SessionTracer.h"
+#include "host/core/trace/Trace.h"
+#include "platform/host/SettingsListController.h"
+#include "platform/system/ClassRegistry.h"
+#include "tests/support/SyslogCapture.h"
+#include "tests/support/TestPlatform.h"
+
+#include <gtest/gtest.h>
+#include <string>
+#include <vector>
+
+namespace nimbra::host {
+namespace {
+
+using Lines = std::vector<std::string>;
+
+class Tracers : public testing::Test {
+protected:
+    /// What was traced since the last call, without the queue, which is the same everywhere.
+    Lines takeLines() {
+        Lines lines;
+        for (std::string line : std::exchange(_lines, {})) {
+            const std::string queue = R"("queue":"other",)";
+            line.erase(line.find(queue), queue.size());
+            lines.push_back(line);
+        }
+        return lines;
+    }
+
+    test::SyslogCapture _syslog;
+    test::TestPlatform _platform;
+    Lines _lines;
+    Trace _trace{[this](const std::string& line) { _lines.push_back(line); }};
+    SessionTracer _tracer{_platform.services(), _trace};
+    PlatformServices _services = _tracer.services();
+};
+
+TEST_F(Tracers, TellWhichAccountIsFetchedAndWhatIsChangedOnIt) {
+    _platform.accountStore.stored.usesStratafile = false;
+    const auto account = _services.accountStore.accountWithIdentifier(AccountIdentifier("primary"));
+    ASSERT_TRUE(account);
+    account->setEnabledForDataclass(true, kAccountDataclassTidewater);
+
+    EXPECT_TRUE(account->isEnabledForDataclass(kAccountDataclassTidewater));
+    EXPECT_FALSE(account->vt_isUsingStratafile());
+    EXPECT_EQ(account->identifier(), AccountIdentifier("primary"));
+    EXPECT_EQ(takeLines(),
+              (Lines{R"({"event":"fetchAccount","account":"primary"})",
+                     R"({"event":"account","op":"setEnabled:forDataclass:","account":"primary",)"
+                     R"("dataclass":"kAccountDataclassTidewater","value":true})"}));
+}
+
+TEST_F(Tracers, GiveNoAccountWhereThereIsNone) {
+    EXPECT_FALSE(_services.accountStore.accountWithIdentifier(AccountIdentifier("nobody")));
+    EXPECT_FALSE(_tracer.traced(nullptr));
+}
+
+TEST_F(Tracers, TellOfObserversAsLongAsTheyAreRegistered) {
+    const NotificationName name("Changed");
+    int calls = 0;
+    const auto token = _services.notificationCenter.addObserverForName(
+        name, {.usingBlock = [&](const Notification&) { ++calls; }});
+    _services.notificationCenter.postNotification({.name = name});
+    _services.notificationCenter.removeObserver(token);
+    _services.notificationCenter.removeObserver(token);
+    _services.notificationCenter.removeObserver(nullptr);
+    _services.notificationCenter.postNotification({.name = name});
+
+    EXPECT_EQ(calls, 1);
+    EXPECT_EQ(takeLines(),
+              (Lines{R"({"event":"observer","op":"add","center":"local","name":"Changed"})",
+                     R"({"event":"observer","op":"remove","center":"local","name":"Changed"})"}));
+}
+
+TEST_F(Tracers, TellWhatIsAskedOfTheContainers) {
+    _platform.documentContainers.listed = {
+        {.identifier = "one", .isPublic = false},
+        {.identifier = "two", .isPublic = true, .registrationFails = true}};
+
+    const auto containers = _services.documentContainers.allContainers();
+    ASSERT_EQ(containers.size(), 2U);
+    EXPECT_FALSE(containers[0]->isDocumentScopePublic());
+    EXPECT_FALSE(containers[1]->registerCurrentProcessAsPriorityHintWithError().has_value());
+    bool isRefreshed = false;
+    _services.documentContainers.forceRefreshAllContainersWithCompletion(
+        [&] { isRefreshed = true; });
+    _platform.documentContainers.refreshes.at(0)();
+    _services.documentContainers.unregisterCurrentProcessAsPriorityHint();
+
+    EXPECT_TRUE(isRefreshed);
+    EXPECT_EQ(_platform.documentContainers.calls, (Lines{"register two", "unregister"}));
+    EXPECT_EQ(
+        takeLines(),
+        (Lines{R"({"event":"container","op":"registerCurrentProcessAsPriorityHintWithError:",)"
+               R"("container":null})",
+               R"({"event":"container","op":"forceRefreshAllContainersWithCompletion:"})",
+               R"({"event":"container","op":"unregisterCurrentProcessAsPriorityHint"})"}));
+}
+
+TEST_F(Tracers, TellThatThePaneIsDismissedButNotWhereThereIsNothingToDismiss) {
+    _services.presenter.dismissPresentedController(true);
+    _services.presenter.dismissPane(false);
+
+    EXPECT_EQ(_platform.calls, (Lines{"dismiss presented, animated", "dismiss pane"}));
+    EXPECT_EQ(takeLines(), Lines{R"({"event":"dismiss","what":"pane","animated":false})"});
+}
+
+TEST_F(Tracers, TellThatTheParentIsBuiltAnew) {
+    const ControllerClass paneClass{.name = "Pane", .create = {}};
+    const auto page = std::make_shared<AccountPage>(_services, "Drive", paneClass, UserInfo());
+    _tracer.observeParent(*page);
+
+    page->reloadSpecifiers();
+    page->reloadSpecifierAnimated(page->entryRow(), true);
+
+    EXPECT_EQ(takeLines(), Lines{R"({"event":"parent","op":"reloadSpecifiers"})"});
+}
+
+TEST_F(Tracers, TellOfEachChangeOfTheList) {
+    const ControllerClass paneClass{.name = "Pane", .create = {}};
+    const auto page = std::make_shared<AccountPage>(_services, "Drive", paneClass, UserInfo());
+    static_cast<void>(page->specifiers());
+    _tracer.observeList(*page);
+    const auto more = Specifier::groupSpecifierWithID("More");
+    const auto nameless = Specifier::preferenceSpecifierNamed(nullptr, {.cell = ButtonCell});
+
+    page->beginUpdates();
+    page->insertSpecifierAfterSpecifierAnimated(more, page->entryRow(), true);
+    page->addSpecifiersFromArrayAnimated({nameless}, false);
+    page->endUpdates();
+    page->removeContiguousSpecifiersAnimated({more, nameless}, true);
+    page->removeSpecifierAnimated(more, true);
+    page->reloadSpecifierAnimated(page->entryRow(), true);
+    page->reloadSpecifiers();
+
+    EXPECT_EQ(
+        takeLines(),
+        (Lines{R"({"event":"table","op":"beginUpdates","rows":[],"animated":true})",
+               R"({"event":"table","op":"insert","rows":["More"],"after":"Drive","animated":true})",
+               R"({"event":"table","op":"append","rows":[null],"animated":false})",
+               R"({"event":"table","op":"endUpdates","rows":[],"animated":true})",
+               R"({"event":"table","op":"remove","rows":["More",null],"animated":true})",
+               R"({"event":"table","op":"reloadRow","rows":["Drive"],"animated":true})",
+               R"({"event":"table","op":"reload","rows":["Services","Drive"],"animated":false})"}));
+}
+
+TEST_F(Tracers, TellThatARefreshHasEnded) {
+    const ControllerClass paneClass{.name = "Pane", .create = {}};
+    const auto page = std::make_shared<AccountPage>(_services, "Drive", paneClass, UserInfo());
+    _tracer.observeRefreshControl(*page);
+    const auto control = std::make_shared<RefreshControl>();
+    page->table().setRefreshControl(control);
+    _tracer.observeRefreshControl(*page);
+
+    control->endRefreshing();
+
+    EXPECT_EQ(takeLines(), Lines{R"({"event":"refreshControl","op":"endRefreshing"})"});
+}
+
+TEST_F(Tracers, TakeTheLinesForSyslogWhileTheyLive) {
+    Lines lines;
+    Trace trace([&](const std::string& line) { lines.push_back(line); });
+    {
+        const SessionTracer tracer(_platform.services(), trace);
+        writeSyslog(3, "lost");
+    }
+    writeSyslog(4, "found");
+
+    EXPECT_EQ(lines, Lines{R"({"event":"syslog","queue":"other","priority":3,"message":"lost"})"});
+    EXPECT_EQ(takeLines(), Lines{R"({"event":"syslog","priority":4,"message":"found"})"});
+    EXPECT_TRUE(_syslog.lines.empty());
+}
+
+} // namespace
+} // namespace nimbra::host

@@ -1,0 +1,61 @@
+#include "tests/host/program/Program.h"
+
+#include <gtest/gtest.h>
+
+namespace nimbra::test {
+namespace {
+
+TEST(Init, MakesTheSampleDevice) {
+    const Program program;
+    const auto device = program.path("new/device");
+
+    const auto result = program.run({"init", device.string()});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output, "Made the device \"Nimbra Phone\" in " + device.string() + ".\n");
+    EXPECT_EQ(program.run({"--root", device.string(), "get", "Nimbra Drive"}).output, "on\n");
+}
+
+TEST(Init, MakesTheDeviceThatAFileDescribes) {
+    const Program program;
+    const auto description =
+        program.write("phone.json", R"({"name": "Peter's Phone", "locale": "de-DE", "apps": []})");
+    const auto device = program.path("device");
+
+    const auto result = program.run({"init", device.string(), "--from", description.string()});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output, "Made the device \"Peter's Phone\" in " + device.string() + ".\n");
+    EXPECT_EQ(result.messages, "settingsctl: note: /apps has no effect in this version\n");
+    EXPECT_NE(program.run({"--root", device.string(), "list"}).output.find("Apps können"),
+              std::string::npos);
+}
+
+TEST(Init, RefusesADescriptionWithItsPlaceAndMakesNothing) {
+    const Program program;
+    const auto description = program.write("phone.json", R"({"locale": 3})");
+
+    const auto result =
+        program.run({"init", program.path("device").string(), "--from", description.string()});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_TRUE(result.messages.starts_with("settingsctl: " + description.string() + ": /locale: "))
+        << result.messages;
+    EXPECT_FALSE(std::filesystem::exists(program.path("device")));
+}
+
+TEST(Init, LeavesADirectoryThatIsInUseAsItIs) {
+    const Program program;
+    program.write("used/file", "mine");
+    const std::string before = contentsOf(program.path("used"));
+
+    const auto result = program.run({"init", program.path("used").string()});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.messages.find('\n'), result.messages.size() - 1);
+    EXPECT_EQ(contentsOf(program.path("used")), before);
+}
+
+} // namespace
+} // namespace nimbra::test

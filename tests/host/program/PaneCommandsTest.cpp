@@ -1,0 +1,205 @@
+#include "tests/host/program/Program.h"
+
+#include <gtest/gtest.h>
+#include <nlohmann/json.hpp>
+#include <string>
+#include <vector>
+
+namespace nimbra::test {
+namespace {
+
+ProgramResult runOnRows(const Program& program, std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), {"--bundle", NIMBRA_TEST_BUNDLE});
+    static_cast<void>(program.run({"init", program.path("device").string()}));
+    arguments.insert(arguments.begin(), {"--root", program.path("device").string()});
+    return program.run(arguments);
+}
+
+void expectRefused(const ProgramResult& result, const std::string& reason) {
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.messages, "settingsctl: " + reason + '\n');
+}
+
+TEST(DefaultDevice, IsMadeFromTheSampleOnFirstUse) {
+    const Program program;
+
+    const auto first = program.run({"list"});
+    const auto second = program.run({"list"});
+
+    EXPECT_EQ(first.status, 0);
+    EXPECT_EQ(first.messages,
+              "settingsctl: made the sample device in " + program.defaultDevice().string() + '\n');
+    EXPECT_EQ(first.output,
+              "Nimbra Drive\n"
+              "\n"
+              "  Nimbra Drive                                                        "
+              "        on\n"
+              "    Apps can keep their documents and data in Nimbra Drive, so you can "
+              "get\n"
+              "    to them on all your devices.\n");
+    EXPECT_EQ(second.messages, "");
+    EXPECT_EQ(second.output, first.output);
+}
+
+TEST(DefaultDevice, IsBelowTheHomeWhereNoStateDirectoryIsNamed) {
+    const Program program;
+
+    const auto result = program.runOther(
+        {"env", "-u", "XDG_STATE_HOME", NIMBRA_SETTINGSCTL, "get", "Nimbra Drive"});
+
+    EXPECT_EQ(result.output, "on\n");
+    EXPECT_TRUE(std::filesystem::is_directory(program.path("home/.local/state/nimbra/device")));
+}
+
+TEST(List, ShowsEveryKindOfRow) {
+    const Program program;
+
+    const auto result = runOnRows(program, {"list"});
+
+    EXPECT_EQ(result.output,
+              "Nimbra Drive\n"
+              "\n"
+              "  Notes                                                                      off\n"
+              "  Locked (locked)                                                            off\n"
+              "  Twin                                                                         ›\n"
+              "  Twin                                                                         ›\n"
+              "  Storage                                                               3 apps ›\n"
+              "    What the group is about.\n"
+              "\n"
+              "  [Later]\n"
+              "  [Reload Parent]\n"
+              "  [Leave]\n"
+              "  [Nothing Behind]\n");
+    EXPECT_EQ(result.status, 0);
+}
+
+TEST(List, PrintsTheRowsAsJson) {
+    const Program program;
+
+    const auto result = runOnRows(program, {"list", "--json"});
+
+    const auto rows = nlohmann::ordered_json::parse(result.output);
+    ASSERT_EQ(rows.size(), 11U);
+    EXPECT_EQ(
+        rows[0].dump(),
+        R"({"kind":"group","id":"Group","name":null,"enabled":true,"value":null,)"
+        R"("footer":"What the group is about.","footerClass":null,"icon":null,"detail":null})");
+    EXPECT_EQ(rows[2].dump(),
+              R"({"kind":"switch","id":"com.example.locked","name":"Locked","enabled":false,)"
+              R"("value":false,"footer":null,"footerClass":null,"icon":null,"detail":null})");
+    EXPECT_EQ(rows[5]["kind"], "link");
+    EXPECT_EQ(rows[5]["value"], "3 apps");
+    EXPECT_EQ(rows[7]["kind"], "button");
+}
+
+TEST(List, IsInTheLanguageAskedFor) {
+    const Program program;
+
+    EXPECT_NE(program.run({"list", "--locale", "fr-FR"}).output.find("Les apps"),
+              std::string::npos);
+}
+
+TEST(List, OpensThePageOfTheAccountAskedFor) {
+    const Program program;
+    const auto description = program.write("device.json", R"({"accounts": [
+        {"identifier": "one", "enabled": ["kAccountDataclassTidewater"]}, {"identifier": "two"}]})");
+    const std::string device = program.path("device").string();
+    ASSERT_EQ(program.run({"init", device, "--from", description.string()}).status, 0);
+
+    EXPECT_EQ(program.run({"--root", device, "get", "Nimbra Drive"}).output, "on\n");
+    EXPECT_EQ(program.run({"--root", device, "--account", "two", "get", "Nimbra Drive"}).output,
+              "off\n");
+    EXPECT_EQ(
+        program.run({"--root", device, "--first-setup", "--account", "one", "get", "Nimbra Drive"})
+            .output,
+        "on\n");
+    const auto unknown = program.run({"--root", device, "--account", "three", "list"});
+    EXPECT_EQ(unknown.status, 2);
+    EXPECT_EQ(unknown.messages, "settingsctl: no account \"three\" (accounts: \"one\", \"two\")\n");
+}
+
+TEST(Get, PrintsAValueByNameAndByIdentifier) {
+    const Program program;
+
+    EXPECT_EQ(runOnRows(program, {"get", "Notes"}).output, "off\n");
+    EXPECT_EQ(runOnRows(program, {"get", "com.example.notes"}).output, "off\n");
+    EXPECT_EQ(runOnRows(program, {"get", "Storage"}).output, "3 apps\n");
+}
+
+TEST(Get, SaysWhyThereIsNothingToPrint) {
+    const Program program;
+
+    expectRefused(runOnRows(program, {"get", "Group"}), "\"Group\" is a heading and has no value");
+    expectRefused(runOnRows(program, {"get", "Later"}), "\"Later\" is a button and has no value");
+    expectRefused(runOnRows(program, {"get", "Twin"}),
+                  "\"Twin\" stands for 2 rows (name one by its identifier: \"twin.one\", "
+                  "\"twin.two\")");
+    expectRefused(program.run({"--root", program.path("device").string(), "get", "Foo"}),
+                  "no row \"Foo\" (rows: \"Nimbra Drive\")");
+}
+
+TEST(Set, TurnsASwitchAndPrintsWhatChanges) {
+    const Program program;
+
+    const auto result = runOnRows(program, {"set", "Notes", "on"});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output,
+              "~ Notes                                                                       on\n"
+              "+ Details                                                                      ›\n");
+}
+
+TEST(Set, RefusesWhatCannotBeSet) {
+    const Program program;
+
+    expectRefused(runOnRows(program, {"set", "Locked", "on"}), "\"Locked\" is locked");
+    expectRefused(runOnRows(program, {"set", "Later", "on"}),
+                  "\"Later\" is a button, not a switch");
+    expectRefused(runOnRows(program, {"set", "Storage", "on"}),
+                  "\"Storage\" is a link, not a switch");
+    expectRefused(
+        program.run({"--root", program.path("device").string(), "set", "Nimbra Drive", "off"}),
+        "\"Nimbra Drive\" cannot be changed in this version");
+}
+
+TEST(Set, TakesNothingButOnAndOff) {
+    const Program program;
+
+    const auto result = runOnRows(program, {"set", "Notes", "maybe"});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.messages, "settingsctl: \"on\" or \"off\" expected, not \"maybe\"\n");
+}
+
+TEST(Tap, PressesAButtonAndPrintsWhatChanges) {
+    const Program program;
+
+    const auto result = runOnRows(program, {"tap", "Later"});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output,
+              "+ Arrived                                                                      ›\n");
+}
+
+TEST(Tap, RefusesWhatIsNoButton) {
+    const Program program;
+
+    expectRefused(runOnRows(program, {"tap", "Notes"}), "\"Notes\" is a switch, not a button");
+    expectRefused(runOnRows(program, {"tap", "Storage"}),
+                  "\"Storage\" opens another page, which this version cannot show");
+    expectRefused(runOnRows(program, {"tap", "Nothing Behind"}),
+                  "\"Nothing Behind\" does nothing in this version");
+}
+
+TEST(Tap, MayCloseThePage) {
+    const Program program;
+
+    const auto result = runOnRows(program, {"tap", "Leave"});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.output, "The page has closed.\n");
+}
+
+} // namespace
+} // namespace nimbra::test

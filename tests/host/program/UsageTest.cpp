@@ -1,0 +1,60 @@
+#include "tests/host/program/Program.h"
+
+#include <gtest/gtest.h>
+#include <string>
+#include <vector>
+
+namespace nimbra::test {
+namespace {
+
+TEST(Usage, AMistakeOnTheCommandLineIsOneLineAndMakesNothing) {
+    const std::vector<std::vector<std::string>> mistakes{
+        {},
+        {"dance"},
+        {"list", "more"},
+        {"get"},
+        {"set", "Nimbra Drive"},
+        {"init"},
+        {"play"},
+        {"completion", "fish"},
+        {"--locale", "x!", "list"},
+        {"--locale", "", "list"},
+        {"--unknown", "list"},
+        {"play", "--root", "somewhere", "scenario.json"},
+        {"init", "--account", "a", "somewhere"},
+    };
+    for (const auto& arguments : mistakes) {
+        const Program program;
+
+        const auto result = program.run(arguments);
+
+        SCOPED_TRACE(arguments.empty() ? "" : arguments.front());
+        EXPECT_EQ(result.status, 2);
+        EXPECT_EQ(result.output, "");
+        EXPECT_TRUE(result.messages.starts_with("settingsctl: ")) << result.messages;
+        EXPECT_EQ(result.messages.find('\n'), result.messages.size() - 1) << result.messages;
+        EXPECT_FALSE(std::filesystem::exists(program.path("state")));
+    }
+}
+
+TEST(Usage, HelpNamesEveryCommand) {
+    const Program program;
+
+    const auto result = program.run({"--help"});
+
+    EXPECT_EQ(result.status, 0);
+    for (const std::string command :
+         {"list", "get", "set", "tap", "init", "play", "shell", "completion"}) {
+        EXPECT_NE(result.output.find("\n  " + command + ' '), std::string::npos) << command;
+        EXPECT_EQ(program.run({command, "--help"}).status, 0) << command;
+    }
+}
+
+TEST(Usage, TheVersionIsTheProjects) {
+    const Program program;
+
+    EXPECT_EQ(program.run({"--version"}).output, "settingsctl " NIMBRA_VERSION "\n");
+}
+
+} // namespace
+} // namespace nimbra::test
