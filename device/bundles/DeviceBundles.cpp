@@ -40,6 +40,7 @@ std::expected<BundleEntryPoint*, Error> entryPoint(const std::filesystem::path& 
                                            ": the bundle's shared object lacks its entry point " +
                                            kBundleEntryPoint));
     }
+    // NOLINTNEXTLINE(cppcoreguidelines-pro-type-reinterpret-cast): dlsym knows objects only
     return reinterpret_cast<BundleEntryPoint*>(symbol);
 }
 

@@ -16,7 +16,7 @@ bool isLanguageTag(const std::string& tag) {
     char locale[ULOC_FULLNAME_CAPACITY]; // NOLINT(*-avoid-c-arrays): the library's interface
     int parsed = 0;
     uloc_forLanguageTag(tag.c_str(), locale, ULOC_FULLNAME_CAPACITY, &parsed, &status);
-    return U_SUCCESS(status) && !tag.empty() && static_cast<std::size_t>(parsed) == tag.size();
+    return U_SUCCESS(status) != 0 && !tag.empty() && static_cast<std::size_t>(parsed) == tag.size();
 }
 
 bool isTimeZone(const std::string& name) {
@@ -24,7 +24,7 @@ bool isTimeZone(const std::string& name) {
     UBool isKnown = 0;
     icu::UnicodeString canonical;
     icu::TimeZone::getCanonicalID(icu::UnicodeString::fromUTF8(name), canonical, isKnown, status);
-    return U_SUCCESS(status) && isKnown != 0;
+    return U_SUCCESS(status) != 0 && isKnown != 0;
 }
 
 } // namespace

@@ -3,8 +3,11 @@
 #include "device/DeviceError.h"
 #include "device/files/Files.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdlib>
+#include <iterator>
+#include <ranges>
 #include <string>
 #include <sys/stat.h>
 #include <system_error>
@@ -23,21 +26,25 @@ std::filesystem::path absoluteName(const std::filesystem::path& path) {
     return name.has_filename() ? name : name.parent_path();
 }
 
-/// Flushes the entries of `directory` and of all directories below it.
-std::expected<void, Error> synchronizeTree(const std::filesystem::path& directory) {
-    const auto entries = entriesOfDirectory(directory);
-    if (!entries) {
-        return std::unexpected(entries.error());
-    }
-    for (const std::filesystem::path& entry : *entries) {
-        std::error_code failure;
-        if (std::filesystem::is_directory(entry, failure)) {
-            if (auto synchronized = synchronizeTree(entry); !synchronized) {
-                return synchronized;
-            }
+/// Flushes the entries of `root` and of all directories below it.
+std::expected<void, Error> synchronizeTree(const std::filesystem::path& root) {
+    std::vector<std::filesystem::path> directories{root};
+    while (!directories.empty()) {
+        const std::filesystem::path directory = std::move(directories.back());
+        directories.pop_back();
+        const auto entries = entriesOfDirectory(directory);
+        if (!entries) {
+            return std::unexpected(entries.error());
+        }
+        std::ranges::copy_if(*entries, std::back_inserter(directories), [](const auto& entry) {
+            std::error_code failure;
+            return std::filesystem::is_directory(entry, failure);
+        });
+        if (auto synchronized = synchronizeDirectory(directory); !synchronized) {
+            return synchronized;
         }
     }
-    return synchronizeDirectory(directory);
+    return {};
 }
 
 std::expected<void, Error> moveTo(const std::filesystem::path& from,
@@ -94,8 +101,8 @@ StagedDirectory::~StagedDirectory() {
     if (!_path.empty()) {
         std::filesystem::remove_all(_path, ignored);
     }
-    for (auto directory = _made.rbegin(); directory != _made.rend(); ++directory) {
-        std::filesystem::remove(*directory, ignored);
+    for (const std::filesystem::path& directory : _made | std::views::reverse) {
+        std::filesystem::remove(directory, ignored);
     }
 }
 

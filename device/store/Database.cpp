@@ -88,7 +88,7 @@ struct Database::Connection {
 
     /// Runs `work`, which may throw what the library throws.
     template <class Work>
-    std::expected<void, Error> guarded(Work work) const {
+    [[nodiscard]] std::expected<void, Error> guarded(Work work) const {
         try {
             work();
             return {};

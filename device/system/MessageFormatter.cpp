@@ -63,7 +63,8 @@ void useTimeZone(icu::MessageFormat& message, const Placeholders& placeholders,
     const std::unique_ptr<icu::TimeZone> zone(
         icu::TimeZone::createTimeZone(icu::UnicodeString::fromUTF8(timeZone)));
     int count = 0;
-    const icu::Format* const* const formats = message.getFormats(count);
+    const icu::Format* const* const first = message.getFormats(count);
+    const std::span formats(first, static_cast<std::size_t>(count));
     std::vector<std::unique_ptr<icu::DateFormat>> dates(placeholders.size());
     for (std::size_t index = 0; index < placeholders.size(); ++index) {
         if (!std::holds_alternative<Date>(arguments[placeholders[index]])) {
