@@ -9,7 +9,8 @@
 
 #include <algorithm>
 #include <array>
-#include <optional>
+#include <string>
+#include <string_view>
 #include <system_error>
 #include <utility>
 
@@ -96,17 +97,12 @@ std::expected<AccountDatabase, Error> openAccounts(const DevicePaths& paths) {
     return AccountDatabase::open(*path);
 }
 
-} // namespace
-
-std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
-                                                 const DeviceDescription& description) {
-    auto staged = StagedDirectory::start(root);
-    if (!staged) {
-        return std::unexpected(staged.error());
-    }
-    const DevicePaths paths(staged->path());
-    const auto below = [&staged](std::string_view devicePath) {
-        return staged->path() / std::filesystem::path(devicePath).relative_path();
+/// Makes everything of a device in the empty directory `root`.
+std::expected<void, Error> buildDevice(const std::filesystem::path& root,
+                                       const DeviceDescription& description) {
+    const DevicePaths paths(root);
+    const auto below = [&root](std::string_view devicePath) {
+        return root / std::filesystem::path(devicePath).relative_path();
     };
     std::error_code failure;
     std::filesystem::create_directories(below(kPreferencesDirectory), failure);
@@ -121,15 +117,27 @@ std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& ro
     if (auto written = writePreferences(below(kPreferencesDirectory), description); !written) {
         return written;
     }
-    {
-        // Closed before the directory moves.
-        auto accounts = AccountDatabase::create(below(kAccountsDatabase));
-        if (!accounts) {
-            return std::unexpected(accounts.error());
+    auto accounts = AccountDatabase::create(below(kAccountsDatabase));
+    return accounts ? accounts->replaceAccounts(description.accounts)
+                    : std::unexpected(accounts.error());
+}
+
+} // namespace
+
+std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
+                                                 const DeviceDescription& description) {
+    auto staged = StagedDirectory::start(root);
+    if (!staged) {
+        return std::unexpected(staged.error());
+    }
+    if (auto built = buildDevice(staged->path(), description); !built) {
+        // The place where it was built goes with the failure and says nothing to anybody.
+        Error error = built.error();
+        const std::string place = staged->path().string();
+        if (error.description.starts_with(place)) {
+            error.description.replace(0, place.size(), root.string());
         }
-        if (auto written = accounts->replaceAccounts(description.accounts); !written) {
-            return written;
-        }
+        return std::unexpected(error);
     }
     return staged->putInPlace();
 }

@@ -87,7 +87,9 @@ TEST_F(DeviceBundleTest, FilesThatAreNoTablesAreNotRead) {
 TEST_F(DeviceBundleTest, ManyThreadsMayLookUpWhileTheLocaleChanges) {
     const auto bundle = load();
     std::vector<std::jthread> threads;
-    for (int index = 0; index < 4; ++index) {
+    constexpr int threadCount = 4;
+    threads.reserve(threadCount);
+    for (int index = 0; index < threadCount; ++index) {
         threads.emplace_back([&bundle] {
             for (int round = 0; round < 200; ++round) {
                 const Text text =

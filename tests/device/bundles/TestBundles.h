@@ -24,9 +24,9 @@ protected:
     [[nodiscard]] ClassRegistry& classes() { return _classes; }
 
     /// A whole bundle in `folder`, whose shared object is the test's `object`.
-    void makeBundle(const std::filesystem::path& folder,
-                    const std::string& object = "test-object-first",
-                    const std::string& identifier = "com.example.a") const {
+    static void makeBundle(const std::filesystem::path& folder,
+                           const std::string& object = "test-object-first",
+                           const std::string& identifier = "com.example.a") {
         test::writeTestFile(folder / "manifest.json",
                             R"({"identifier": ")" + identifier +
                                 R"(", "executable": "A.so", "principalClass": "FirstController",
