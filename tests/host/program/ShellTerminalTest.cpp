@@ -166,6 +166,8 @@ TEST_F(ShellAtATerminal, RemembersLinesFromOneUseToTheNext) {
     ASSERT_TRUE(second.shows("nimbra> "));
     second.type("\x10\r");
     ASSERT_TRUE(second.shows("3 apps"));
+    // Before the prompt the terminal would take the key for itself.
+    ASSERT_TRUE(second.shows("nimbra> "));
     second.type("\x04");
     EXPECT_EQ(second.end(), 0);
 }
