@@ -1,7 +1,5 @@
+#include "tests/device/Threads.h"
 #include "tests/device/bundles/TestBundles.h"
-
-#include <thread>
-#include <vector>
 
 namespace nimbra::device {
 namespace {
@@ -86,21 +84,20 @@ TEST_F(DeviceBundleTest, FilesThatAreNoTablesAreNotRead) {
 
 TEST_F(DeviceBundleTest, ManyThreadsMayLookUpWhileTheLocaleChanges) {
     const auto bundle = load();
-    std::vector<std::jthread> threads;
-    constexpr int threadCount = 4;
-    threads.reserve(threadCount);
-    for (int index = 0; index < threadCount; ++index) {
-        threads.emplace_back([&bundle] {
-            for (int round = 0; round < 200; ++round) {
-                const Text text =
-                    bundle->localizedStringForKeyValueTable("BOTH", "MISSING", "Localizable");
-                EXPECT_TRUE(text == Text("both") || text == Text("beide"));
-            }
-        });
-    }
-    for (int round = 0; round < 50; ++round) {
-        settings().overrideLocale(round % 2 == 0 ? "de" : "en");
-    }
+    const auto lookUp = [&bundle] {
+        for (int round = 0; round < 200; ++round) {
+            const Text text =
+                bundle->localizedStringForKeyValueTable("BOTH", "MISSING", "Localizable");
+            EXPECT_TRUE(text == Text("both") || text == Text("beide"));
+        }
+    };
+    const auto changeLocale = [this] {
+        for (int round = 0; round < 50; ++round) {
+            settings().overrideLocale(round % 2 == 0 ? "de" : "en");
+        }
+    };
+
+    test::runAtOnce({lookUp, lookUp, lookUp, changeLocale});
 }
 
 } // namespace

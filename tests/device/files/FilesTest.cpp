@@ -31,7 +31,9 @@ TEST(FilesTest, WritingReplacesTheContentAndKeepsThePermissions) {
     ASSERT_TRUE(writeFileAtomically(path, "new"));
 
     EXPECT_EQ(test::contentOf(path), "new");
-    EXPECT_EQ(std::filesystem::status(path).permissions(), std::filesystem::perms(0640));
+    using std::filesystem::perms;
+    EXPECT_EQ(std::filesystem::status(path).permissions(),
+              perms::owner_read | perms::owner_write | perms::group_read);
 }
 
 TEST(FilesTest, AWriteThatCannotStartNamesTheFile) {

@@ -86,7 +86,7 @@ TEST_F(AccountDatabaseTest, EveryFlagIsKept) {
              .cellular = {"kAccountDataclassKeyValue"},
              .tessaryAccount = "t"}});
 
-    SQLite::Database database(path().string());
+    const SQLite::Database database(path().string());
     SQLite::Statement account(database, "SELECT is_primary, uses_stratafile, tessary_account "
                                         "FROM accounts");
     ASSERT_TRUE(account.executeStep());

@@ -2,11 +2,11 @@
 
 #include "tests/device/RecordingLog.h"
 #include "tests/device/TestFiles.h"
+#include "tests/device/Threads.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <SQLiteCpp/SQLiteCpp.h>
 #include <gtest/gtest.h>
-#include <thread>
 
 namespace nimbra::device {
 namespace {
@@ -87,16 +87,15 @@ TEST_F(DeviceAccountStoreTest, AListThatCannotBeReadIsAnError) {
 }
 
 TEST_F(DeviceAccountStoreTest, ManyThreadsMayAskAtOnce) {
-    std::vector<std::jthread> threads;
-    for (int index = 0; index < 8; ++index) {
-        threads.emplace_back([this] {
-            for (int round = 0; round < 50; ++round) {
-                EXPECT_TRUE(store().accountWithIdentifier(AccountIdentifier("a")));
-                EXPECT_EQ(store().accountIdentifiers()->size(), 2U);
-            }
-        });
-    }
-    threads.clear();
+    const auto ask = [this] {
+        for (int round = 0; round < 50; ++round) {
+            EXPECT_TRUE(store().accountWithIdentifier(AccountIdentifier("a")));
+            EXPECT_EQ(store().accountIdentifiers()->size(), 2U);
+        }
+    };
+
+    test::runAtOnce({ask, ask, ask, ask});
+
     EXPECT_TRUE(log().lines().empty());
 }
 

@@ -1,13 +1,12 @@
 #include "device/system/DataOrSource.h"
 
 #include "device/system/DeviceWorkQueues.h"
+#include "tests/device/Threads.h"
 #include "tests/support/PumpedQueue.h"
 
 #include <atomic>
 #include <gtest/gtest.h>
 #include <memory>
-#include <thread>
-#include <vector>
 
 namespace nimbra::device {
 namespace {
@@ -114,7 +113,7 @@ TEST_F(DataOrSourceTest, AHandlerThatLetsItsSourceGoRunsToItsEnd) {
 }
 
 TEST(DataOrSourceThreadTest, RequestsFromManyThreadsAreNeverLostAndNeverMultiplied) {
-    constexpr int threadCount = 8;
+    constexpr int threadCount = 4;
     constexpr int requests = 200;
     test::PumpedQueue mainQueue("main");
     std::atomic<int> asked = 0;
@@ -128,16 +127,13 @@ TEST(DataOrSourceThreadTest, RequestsFromManyThreadsAreNeverLostAndNeverMultipli
             seen = asked.load();
         });
         source->resume();
-        std::vector<std::jthread> threads;
-        for (int index = 0; index < threadCount; ++index) {
-            threads.emplace_back([&] {
-                for (int request = 0; request < requests; ++request) {
-                    ++asked;
-                    source->mergeData(1);
-                }
-            });
-        }
-        threads.clear();
+        const auto ask = [&] {
+            for (int request = 0; request < requests; ++request) {
+                ++asked;
+                source->mergeData(1);
+            }
+        };
+        test::runAtOnce({ask, ask, ask, ask});
         queues.finish();
     }
     EXPECT_EQ(seen, threadCount * requests);

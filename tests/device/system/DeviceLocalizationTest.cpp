@@ -139,19 +139,18 @@ TEST_F(DeviceLocalizationTest, AFormatThatCannotBeFilledComesBackWithALine) {
     EXPECT_EQ(formatted("en", "an {0 open one", {Text("x")}), "an {0 open one");
     EXPECT_EQ(formatted("en", "{0} {1}", {Text("x")}), "{0} {1}");
     EXPECT_EQ(formatted("en", "{name}", {Text("x")}), "{name}");
-    EXPECT_EQ(formatted("en", "{1, plural, other {{0, time}}}", {date, std::int64_t{2}}),
-              "{1, plural, other {{0, time}}}");
+    const std::string nested = "{1, plural, other {{0, time}}}";
+    EXPECT_EQ(formatted("en", nested, {date, std::int64_t{2}}), nested);
     EXPECT_EQ(formatted("en", "{0, date, short}", {Text("x")}), "{0, date, short}");
 
+    const std::string start = "Can't fill the format ";
     EXPECT_EQ(log().lines(),
               (std::vector<std::string>{
-                  "Can't fill the format \"an {0 open one\": malformed near character 5",
-                  "Can't fill the format \"{0} {1}\": there is no argument 1",
-                  "Can't fill the format \"{name}\": a placeholder has a name where a number was "
-                  "expected",
-                  "Can't fill the format \"{1, plural, other {{0, time}}}\": a date stands inside "
-                  "another placeholder",
-                  "Can't fill the format \"{0, date, short}\": U_ILLEGAL_ARGUMENT_ERROR"}));
+                  start + R"("an {0 open one": malformed near character 5)",
+                  start + R"("{0} {1}": there is no argument 1)",
+                  start + R"("{name}": a placeholder has a name where a number was expected)",
+                  start + "\"" + nested + "\": a date stands inside another placeholder",
+                  start + R"("{0, date, short}": U_ILLEGAL_ARGUMENT_ERROR)"}));
 }
 
 } // namespace

@@ -1,11 +1,11 @@
 #include "device/system/DeviceNotificationCenter.h"
 
+#include "tests/device/Threads.h"
 #include "tests/support/PumpedQueue.h"
 
 #include <atomic>
 #include <gtest/gtest.h>
 #include <string>
-#include <thread>
 #include <vector>
 
 namespace nimbra::device {
@@ -15,8 +15,8 @@ using Calls = std::vector<std::string>;
 
 class DeviceNotificationCenterTest : public testing::Test {
 protected:
-    [[nodiscard]] NotificationCenter::Block recording(const std::string& who) {
-        return [this, who](const Notification& /*notification*/) { calls.push_back(who); };
+    [[nodiscard]] NotificationCenter::Block recording(const char* who) {
+        return [this, who](const Notification& /*notification*/) { calls.emplace_back(who); };
     }
 
     DeviceNotificationCenter center;     // NOLINT(*-non-private-member-*): for the tests
@@ -152,30 +152,27 @@ TEST_F(DeviceNotificationCenterTest, ABlockMayPost) {
 }
 
 TEST_F(DeviceNotificationCenterTest, ManyThreadsMayPostWhileObserversComeAndGo) {
-    constexpr int threadCount = 4;
     constexpr int rounds = 200;
     std::atomic<int> told = 0;
     const auto staying =
         center.addObserverForName(name, {.usingBlock = [&told](const Notification&) { ++told; }});
-    {
-        std::vector<std::jthread> threads;
-        for (int index = 0; index < threadCount; ++index) {
-            threads.emplace_back([this] {
-                for (int round = 0; round < rounds; ++round) {
-                    center.postNotification({.name = name});
-                }
-            });
+    const auto post = [this] {
+        for (int round = 0; round < rounds; ++round) {
+            center.postNotification({.name = name});
         }
-        threads.emplace_back([this] {
-            for (int round = 0; round < rounds; ++round) {
-                const auto held = std::make_shared<std::atomic<int>>(0);
-                const auto token = center.addObserverForName(
-                    name, {.usingBlock = [held](const Notification&) { ++*held; }});
-                center.removeObserver(token);
-            }
-        });
-    }
-    EXPECT_EQ(told, threadCount * rounds);
+    };
+    const auto comeAndGo = [this] {
+        for (int round = 0; round < rounds; ++round) {
+            const auto held = std::make_shared<std::atomic<int>>(0);
+            const auto token = center.addObserverForName(
+                name, {.usingBlock = [held](const Notification&) { ++*held; }});
+            center.removeObserver(token);
+        }
+    };
+
+    test::runAtOnce({post, post, post, comeAndGo});
+
+    EXPECT_EQ(told, 3 * rounds);
 }
 
 } // namespace

@@ -1,6 +1,7 @@
 #include "device/system/DeviceSystemLog.h"
 
 #include "tests/device/TestFiles.h"
+#include "tests/device/Threads.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <algorithm>
@@ -8,15 +9,14 @@
 #include <gtest/gtest.h>
 #include <regex>
 #include <string>
-#include <thread>
-#include <vector>
 
 namespace nimbra::device {
 namespace {
 
 class DeviceSystemLogTest : public testing::Test {
 protected:
-    ~DeviceSystemLogTest() override { ::unsetenv("NIMBRA_LOG"); }
+    void SetUp() override { ::unsetenv("NIMBRA_LOG"); }
+    void TearDown() override { ::unsetenv("NIMBRA_LOG"); }
 
     [[nodiscard]] const std::filesystem::path& root() const { return _directory.path(); }
     [[nodiscard]] std::filesystem::path file() const {
@@ -90,16 +90,14 @@ TEST_F(DeviceSystemLogTest, AFileThatCannotBeOpenedIsToldOnceAndErrorsStillShow)
 
 TEST_F(DeviceSystemLogTest, ManyThreadsMayWriteWholeLines) {
     DeviceSystemLog systemLog = log();
-    {
-        std::vector<std::jthread> threads;
-        for (int index = 0; index < 4; ++index) {
-            threads.emplace_back([&systemLog] {
-                for (int round = 0; round < 50; ++round) {
-                    systemLog.write(LogLevel::standard, "line");
-                }
-            });
+    const auto write = [&systemLog] {
+        for (int round = 0; round < 50; ++round) {
+            systemLog.write(LogLevel::standard, "line");
         }
-    }
+    };
+
+    test::runAtOnce({write, write, write, write});
+
     std::string expected;
     for (int index = 0; index < 200; ++index) {
         expected += "default: line\n";

@@ -1,6 +1,7 @@
 #include "device/system/DeviceWorkQueues.h"
 
 #include "device/system/CurrentQueue.h"
+#include "tests/device/Threads.h"
 #include "tests/support/PumpedQueue.h"
 
 #include <algorithm>
@@ -12,7 +13,6 @@
 #include <memory>
 #include <optional>
 #include <string>
-#include <thread>
 #include <vector>
 
 namespace nimbra::device {
@@ -222,18 +222,16 @@ TEST_F(DeviceWorkQueuesTest, ManyQueuesComeAndGo) {
 TEST_F(DeviceWorkQueuesTest, ManyThreadsMayQueueAtOnce) {
     const auto queue = queues().serialQueueWithLabel("a-queue");
     int sum = 0; // the queue's own: no two pieces of work run at once
-    {
-        std::vector<std::jthread> threads;
-        for (int index = 0; index < 8; ++index) {
-            threads.emplace_back([&queue, &sum] {
-                for (int round = 0; round < 100; ++round) {
-                    queue->async([&sum] { ++sum; });
-                    queue->sync([&sum] { ++sum; });
-                }
-            });
+    const auto count = [&queue, &sum] {
+        for (int round = 0; round < 100; ++round) {
+            queue->async([&sum] { ++sum; });
+            queue->sync([&sum] { ++sum; });
         }
-    }
-    queue->sync([&sum] { EXPECT_EQ(sum, 1600); });
+    };
+
+    test::runAtOnce({count, count, count, count});
+
+    queue->sync([&sum] { EXPECT_EQ(sum, 800); });
 }
 
 TEST(DeviceWorkQueuesDeathTest, AQueueThatWaitsForItselfStopsTheProgram) {
