@@ -10,6 +10,7 @@
 #include <regex>
 #include <set>
 #include <string>
+#include <vector>
 
 namespace nimbra::test {
 namespace {
@@ -36,24 +37,34 @@ std::set<std::string> keysOf(const Table& table) {
     return keys;
 }
 
-/// Every key that the code of the pane names: each literal in capitals with an underscore, and
-/// whatever is handed to a lookup, in each source and header of the folders with user texts.
+/// The sources and headers of the folders in which user texts are named, as far as they exist.
+std::vector<fs::path> sourcesWithTexts() {
+    std::vector<fs::path> sources;
+    for (const char* folder : {"pane", "upgrade", "footer"}) {
+        const fs::path place = fs::path(NIMBRA_SOURCE_DIR) / folder;
+        if (!fs::exists(place)) {
+            continue;
+        }
+        for (const auto& entry : fs::recursive_directory_iterator(place)) {
+            if (entry.path().extension() == ".cpp" || entry.path().extension() == ".h") {
+                sources.push_back(entry.path());
+            }
+        }
+    }
+    return sources;
+}
+
+/// Every key that the code of the pane names, and where: each literal in capitals with an
+/// underscore, and each that is handed to a lookup.
 std::map<std::string, std::string> keysInCode() {
     const std::regex key(
         R"re((?:ocalized(?:String|Format)\(\s*)"([^"]+)"|"([A-Z0-9]+(?:_[A-Z0-9]+)+)")re");
     std::map<std::string, std::string> keys;
-    for (const std::string folder : {"pane", "upgrade", "footer"}) {
-        for (const auto& entry :
-             fs::recursive_directory_iterator(NIMBRA_SOURCE_DIR + ("/" + folder))) {
-            if (entry.path().extension() != ".cpp" && entry.path().extension() != ".h") {
-                continue;
-            }
-            const std::string source = readFile(entry.path());
-            for (std::sregex_iterator found(source.begin(), source.end(), key), end; found != end;
-                 ++found) {
-                keys.emplace((*found)[1].matched ? (*found)[1] : (*found)[2],
-                             entry.path().filename());
-            }
+    for (const fs::path& path : sourcesWithTexts()) {
+        const std::string source = readFile(path);
+        for (std::sregex_iterator found(source.begin(), source.end(), key), end; found != end;
+             ++found) {
+            keys.emplace((*found)[1].matched ? (*found)[1] : (*found)[2], path.filename());
         }
     }
     return keys;
