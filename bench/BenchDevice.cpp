@@ -43,7 +43,10 @@ PlatformServices BenchDevice::servicesWith(Bundles& bundles) {
             .workQueues = own.workQueues,
             .fileManager = own.fileManager,
             .bundles = bundles,
-            .localization = own.localization};
+            .localization = own.localization,
+            .deviceInfo = own.deviceInfo,
+            .restrictions = own.restrictions,
+            .systemLog = own.systemLog};
 }
 
 std::filesystem::path BenchDevice::builtBundle() {

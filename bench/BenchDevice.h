@@ -38,6 +38,10 @@ public:
                                                    const PlatformServices& services);
 
 private:
+    void showActivityInProgress(const Text& /*message*/) override {}
+    void hideActivityInProgress() override {}
+    void reloadParentSpecifier() override {}
+    void reloadAllParentSpecifiers() override {}
     void dismissPresentedController(bool /*animated*/) override {}
     void dismissPane(bool /*animated*/) override {}
 

@@ -25,7 +25,6 @@ constexpr std::array laterParts{
     LaterPart{"deviceList", checkDeviceList},
     LaterPart{"databaseSettings", checkDatabaseSettings},
     LaterPart{"tool", checkTool},
-    LaterPart{"faults", checkFaults},
 };
 
 struct Part {
@@ -36,7 +35,7 @@ struct Part {
 constexpr std::array parts{
     Part{"preferences", readPreferences}, Part{"restrictions", readRestrictions},
     Part{"accounts", readAccounts},       Part{"documents", readDocuments},
-    Part{"strings", readStrings},
+    Part{"strings", readStrings},         Part{"faults", readFaults},
 };
 
 } // namespace
@@ -70,6 +69,11 @@ GivenDescription readDeviceDescription(const JsonReader& reader) {
     GivenDescription given;
     std::ranges::copy(reader.keys(), std::inserter(given.keys, given.keys.end()));
 
+    // Of the faults each kind is a key of its own: some have an effect and others none yet.
+    for (const std::string& kind : reader.member("faults").keys()) {
+        given.keys.insert("faults/" + kind);
+    }
+
     DeviceDescription& description = given.description;
     readDeviceFacts(reader, description);
     description.now = readInstant(reader.member("now"), description.now);
@@ -95,6 +99,9 @@ std::vector<std::string> keysWithoutEffect(const GivenDescription& given) {
             keys.emplace_back(part.key);
         }
     }
+    std::ranges::copy_if(given.keys, std::back_inserter(keys), [](const std::string& key) {
+        return key.starts_with("faults/") && key != "faults/save";
+    });
     return keys;
 }
 

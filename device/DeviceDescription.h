@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/values/Error.h"
+
 #include <chrono>
 #include <cstdint>
 #include <map>
@@ -57,6 +59,8 @@ struct DeviceDescription {
     /// The table "Localizable" instead of the bundle's own.
     std::optional<std::map<std::string, std::string>> strings;
     bool paneBundleRegistered = true;
+    /// The outcomes of the next saves of an account, in order: an error for one that fails.
+    std::vector<std::optional<Error>> saveFaults;
 
     DeviceDescription();
 };

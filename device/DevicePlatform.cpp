@@ -6,9 +6,11 @@
 #include "device/documents/DeviceDocumentContainers.h"
 #include "device/documents/DeviceFileManager.h"
 #include "device/store/DeviceAccountStore.h"
+#include "device/system/DeviceAbilities.h"
 #include "device/system/DeviceLocalization.h"
 #include "device/system/DeviceNotificationCenter.h"
 #include "device/system/DevicePreferences.h"
+#include "device/system/DeviceRestrictions.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/DeviceSystemLog.h"
 #include "device/system/DeviceWorkQueues.h"
@@ -24,9 +26,9 @@ struct DevicePlatform::Parts {
     Parts(const DevicePaths& paths, DeviceSettings deviceSettings, AccountDatabase accounts,
           WorkQueue& mainQueue)
         : systemLog(paths, DeviceSystemLog::usualDestination()),
-          settings(std::move(deviceSettings)), preferences(paths, systemLog),
-          accountStore(std::move(accounts), systemLog), bundles(settings, classes),
-          localization(settings, systemLog), workQueues(mainQueue),
+          settings(std::move(deviceSettings)), preferences(paths, systemLog), workQueues(mainQueue),
+          accountStore(std::move(accounts), workQueues, systemLog), bundles(settings, classes),
+          localization(settings, systemLog), abilities(settings), restrictions(paths, systemLog),
           fileManager(DocumentsFile(paths, systemLog)),
           documentContainers(paths, workQueues.serialQueueWithLabel("document-refresh"),
                              systemLog) {}
@@ -34,12 +36,14 @@ struct DevicePlatform::Parts {
     DeviceSystemLog systemLog;
     DeviceSettings settings;
     DevicePreferences preferences;
+    DeviceWorkQueues workQueues;
     DeviceAccountStore accountStore;
     ClassRegistry classes;
     DeviceBundles bundles;
     DeviceLocalization localization;
+    DeviceAbilities abilities;
+    DeviceRestrictions restrictions;
     DeviceNotificationCenter notificationCenter;
-    DeviceWorkQueues workQueues;
     DeviceFileManager fileManager;
     DeviceDocumentContainers documentContainers;
 };
@@ -106,7 +110,10 @@ PlatformServices DevicePlatform::servicesFor(Presenter& presenter) {
             .workQueues = _parts->workQueues,
             .fileManager = _parts->fileManager,
             .bundles = _parts->bundles,
-            .localization = _parts->localization};
+            .localization = _parts->localization,
+            .deviceInfo = _parts->abilities,
+            .restrictions = _parts->restrictions,
+            .systemLog = _parts->systemLog};
 }
 
 DeviceAccountStore& DevicePlatform::accountStore() {

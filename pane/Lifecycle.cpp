@@ -13,22 +13,29 @@ Text RSPNimbraDriveViewController::_localizedString(const Text& key) const {
                               services().bundles.bundleWithIdentifier(paneBundle));
 }
 
-const std::shared_ptr<Account>& RSPNimbraDriveViewController::_vantrelAccount() {
-    if (!_vantrelAccount_) {
-        _reloadVantrelAccount();
+std::shared_ptr<Account> RSPNimbraDriveViewController::_vantrelAccount() {
+    {
+        const std::scoped_lock lock(_vantrelAccountMutex);
+        if (_vantrelAccount_) {
+            return _vantrelAccount_;
+        }
     }
+    _reloadVantrelAccount();
+    const std::scoped_lock lock(_vantrelAccountMutex);
     return _vantrelAccount_;
 }
 
 void RSPNimbraDriveViewController::_reloadVantrelAccount() {
     const UserInfo& entry = specifier()->userInfo();
     _isFirstSetup = userInfoValue<bool>(entry, FirstSetupKey);
+    std::shared_ptr<Account> account;
     if (_isFirstSetup) {
-        _vantrelAccount_ = userInfoValue<std::shared_ptr<Account>>(entry, AccountKey);
-        return;
+        account = userInfoValue<std::shared_ptr<Account>>(entry, AccountKey);
+    } else if (const auto identifier = userInfoValue<Text>(entry, AccountIdentifierKey)) {
+        account = accountStore().accountWithIdentifier(AccountIdentifier(identifier.string()));
     }
-    const auto identifier = userInfoValue<Text>(entry, AccountIdentifierKey);
-    _vantrelAccount_ = accountStore().accountWithIdentifier(AccountIdentifier(identifier.string()));
+    const std::scoped_lock lock(_vantrelAccountMutex);
+    _vantrelAccount_ = std::move(account);
 }
 
 void RSPNimbraDriveViewController::viewDidLoad() {

@@ -5,6 +5,7 @@
 #include "platform/values/RowValue.h"
 #include "upgrade/RSPUpgradeViewControllerDelegate.h"
 
+#include <atomic>
 #include <memory>
 #include <mutex>
 #include <optional>
@@ -34,6 +35,12 @@ public:
     void viewDidAppear(bool animated) override;
     void viewDidDisappear(bool animated) override;
 
+    void operationsHelperWillSaveAccount(AccountOperationsHelper& helper,
+                                         const std::shared_ptr<Account>& account) override;
+    void operationsHelperDidSaveAccountWithSuccessError(
+        AccountOperationsHelper& helper, const std::shared_ptr<Account>& account,
+        const std::expected<void, Error>& saved) override;
+
     void upgradeViewControllerDidCancel(
         const std::shared_ptr<RSPUpgradeViewController>& screen) override;
     void upgradeViewControllerDidSucceed(
@@ -47,7 +54,7 @@ protected:
     /// One row an application, unsorted; empty for none.
     [[nodiscard]] virtual SpecifierArray _appSpecifiersForPRVServices();
     /// The group and the switch of cellular data; nothing on a device without it.
-    [[nodiscard]] virtual std::optional<SpecifierArray> _createSpecifiersForCellularSwitchCell();
+    [[nodiscard]] std::optional<SpecifierArray> _createSpecifiersForCellularSwitchCell();
     /// The row of the cloud database; null for none.
     [[nodiscard]] virtual std::shared_ptr<Specifier> _specifierForTessary();
     /// The group and the button of diagnostics; nothing while diagnostics are off.
@@ -58,8 +65,9 @@ protected:
 
     /// The account that the page shows and edits, read on the first call; null when the store has
     /// none for the entry row.
-    [[nodiscard]] const std::shared_ptr<Account>& _vantrelAccount();
-    /// Reads the account anew; changes that were not saved are lost.
+    [[nodiscard]] std::shared_ptr<Account> _vantrelAccount();
+    /// Reads the account anew; changes that were not saved are lost. Any queue: a failed save reads
+    /// it on the queue that reports the failure.
     void _reloadVantrelAccount();
 
     /// Asks for a run of the priority registration; requests that come before it starts share it.
@@ -73,6 +81,12 @@ private:
     [[nodiscard]] SpecifierArray _arrangedSpecifiers();
     [[nodiscard]] bool _isTidewaterEnabled();
     [[nodiscard]] RowValue _documentsAndDataEnabled(const Specifier* row);
+    void _setDocumentsAndDataEnabledForSpecifier(const RowValue& value,
+                                                 const std::shared_ptr<Specifier>& row);
+    void _setDocumentsAndDataEnabled(bool enabled);
+
+    [[nodiscard]] RowValue _useCellular(const Specifier& row);
+    void _setUseCellularForSpecifier(const RowValue& value, const std::shared_ptr<Specifier>& row);
 
     void _refresh(const std::shared_ptr<RefreshControl>& sender);
     [[nodiscard]] std::shared_ptr<ObserverToken>
@@ -85,15 +99,17 @@ private:
     std::optional<SpecifierArray> _cellularSpecifiers;
     std::optional<SpecifierArray> _logsSpecifiers;
     std::shared_ptr<Account> _vantrelAccount_;
-    bool _isFirstSetup = false;
+    std::atomic<bool> _isFirstSetup = false;
     std::shared_ptr<ObserverToken> _uiApplicationDidBecomeActiveObserver;
-    /// Kept for the page's layout of tokens; the status footer watches the sync status itself.
+    /// Never set: the status footer watches the sync status itself.
     std::shared_ptr<ObserverToken> _mrDidUpdateLastSyncStatusObserver;
     std::shared_ptr<ObserverToken> _mrTidewaterIdentityTokenStatusObserver;
     std::shared_ptr<ObserverToken> _mrContainersListChangedNotification;
     std::shared_ptr<EventSource> _containerPriorityHintingSource;
     std::shared_ptr<WorkQueue> _containerPriorityHintingQueue;
     std::once_flag _containerPriorityHintingCreation;
+    /// A failed save replaces the account while the main queue may read it.
+    std::mutex _vantrelAccountMutex;
 };
 
 } // namespace nimbra

@@ -62,6 +62,8 @@ std::shared_ptr<Specifier> RSPNimbraDriveViewController::_masterSwitch() {
     return Specifier::preferenceSpecifierNamed(
         _localizedString("CLOUD_DRIVE"),
         {.target = this,
+         .set = [this](const RowValue& value,
+                       const auto& row) { _setDocumentsAndDataEnabledForSpecifier(value, row); },
          .get = [this](const Specifier& row) { return _documentsAndDataEnabled(&row); },
          .cell = SwitchCell});
 }
@@ -108,17 +110,8 @@ void RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndData
     }
 }
 
-bool RSPNimbraDriveViewController::_isTidewaterEnabled() {
-    const std::shared_ptr<Account>& account = _vantrelAccount();
-    return account && account->isEnabledForDataclass(kAccountDataclassTidewater);
-}
-
-RowValue RSPNimbraDriveViewController::_documentsAndDataEnabled(const Specifier* /*row*/) {
-    return _isTidewaterEnabled();
-}
-
-// Until an application, a cellular modem, the diagnostics, the upgrade and the cloud database have
-// rows of their own, these answer with nothing.
+// Until the applications, the diagnostics, the upgrade and the cloud database have rows of their
+// own, these answer with nothing.
 
 std::shared_ptr<Specifier> RSPNimbraDriveViewController::_createSpecifierForUpgradeButton() {
     return nullptr;
@@ -126,11 +119,6 @@ std::shared_ptr<Specifier> RSPNimbraDriveViewController::_createSpecifierForUpgr
 
 SpecifierArray RSPNimbraDriveViewController::_appSpecifiersForPRVServices() {
     return {};
-}
-
-std::optional<SpecifierArray>
-RSPNimbraDriveViewController::_createSpecifiersForCellularSwitchCell() {
-    return std::nullopt;
 }
 
 std::shared_ptr<Specifier> RSPNimbraDriveViewController::_specifierForTessary() {

@@ -4,11 +4,14 @@ namespace nimbra {
 
 class AccountStore;
 class Bundles;
+class DeviceInfo;
 class DocumentContainers;
 class FileManager;
 class Localization;
 class NotificationCenter;
 class Presenter;
+class RestrictionsProfile;
+class SystemLog;
 class WorkQueues;
 
 /// Everything that a pane reaches the platform through: handed to it when it is created. The host
@@ -22,6 +25,9 @@ struct PlatformServices {
     FileManager& fileManager;
     Bundles& bundles;
     Localization& localization;
+    DeviceInfo& deviceInfo;
+    RestrictionsProfile& restrictions;
+    SystemLog& systemLog;
 };
 
 } // namespace nimbra

@@ -1,8 +1,12 @@
 #include "device/description/DescriptionFiles.h"
 
 #include "device/description/DescriptionParts.h"
+#include "device/description/MachineFacts.h"
 #include "device/files/Files.h"
 #include "device/json/JsonReader.h"
+
+#include <filesystem>
+#include <system_error>
 
 namespace nimbra::device {
 
@@ -68,6 +72,10 @@ std::expected<DeviceDescription, Error> readDescriptionFile(const DevicePaths& p
     const auto path = paths.resolve(file.path);
     if (!path) {
         return std::unexpected(path.error());
+    }
+    if (std::error_code failure;
+        paths.isThisMachine() && !std::filesystem::exists(*path, failure) && !failure) {
+        return describeMachine(paths.root());
     }
     const auto reader = JsonReader::readFile(*path);
     if (!reader) {

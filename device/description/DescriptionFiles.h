@@ -27,6 +27,7 @@ extern const DescriptionFile restrictionsFile;
 extern const DescriptionFile documentsFile;
 
 /// A description whose part in `file` is as the file says and whose other parts are the default.
+/// On a real device a file may be missing: what Linux tells of the machine then stands for it.
 [[nodiscard]] std::expected<DeviceDescription, Error>
 readDescriptionFile(const DevicePaths& paths, const DescriptionFile& file);
 

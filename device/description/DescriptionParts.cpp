@@ -1,6 +1,7 @@
 #include "device/description/DescriptionParts.h"
 
 #include "device/description/DescriptionValues.h"
+#include "device/description/LaterParts.h"
 #include "device/json/JsonReader.h"
 
 #include <utility>
@@ -28,7 +29,7 @@ template <class CheckString>
 nlohmann::json readLastSync(const JsonReader& reader, CheckString checkString) {
     if (reader.isObject()) {
         reader.allowOnly({"error"});
-        checkError(reader.member("error"));
+        static_cast<void>(readError(reader.member("error")));
     } else if (!reader.isNull()) {
         checkString(reader);
     }
@@ -117,6 +118,15 @@ void readStrings(const JsonReader& reader, DeviceDescription& description) {
     description.strings.emplace();
     for (const std::string& key : reader.keys()) {
         description.strings->emplace(key, reader.member(key).string());
+    }
+}
+
+void readFaults(const JsonReader& reader, DeviceDescription& description) {
+    checkFaults(reader);
+    description.saveFaults.clear();
+    for (const JsonReader& outcome : reader.member("save").elements()) {
+        description.saveFaults.push_back(outcome.isNull() ? std::nullopt
+                                                          : std::optional(readError(outcome)));
     }
 }
 

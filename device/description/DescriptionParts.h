@@ -15,6 +15,7 @@ void readRestrictions(const JsonReader& reader, DeviceDescription& description);
 void readAccounts(const JsonReader& reader, DeviceDescription& description);
 void readDocuments(const JsonReader& reader, DeviceDescription& description);
 void readStrings(const JsonReader& reader, DeviceDescription& description);
+void readFaults(const JsonReader& reader, DeviceDescription& description);
 
 /// The members `name`, `idiom`, `screen`, `locale` and `timeZone` of the object at `reader`.
 void readDeviceFacts(const JsonReader& reader, DeviceDescription& description);

@@ -116,20 +116,24 @@ std::chrono::system_clock::time_point readInstant(const JsonReader& reader,
     return instant.value_or(fallback);
 }
 
-void checkError(const JsonReader& reader) {
+Error readError(const JsonReader& reader) {
     if (!reader.isObject()) {
         reader.expected("an error: an object with domain, code and description");
-        return;
+        return {};
     }
     reader.allowOnly({"domain", "code", "description"});
-    static_cast<void>(readName(reader.member("domain")));
-    if (reader.member("code").isAbsent()) {
-        reader.member("code").expected("an integer");
+    const JsonReader code = reader.member("code");
+    if (code.isAbsent()) {
+        code.expected("an integer");
     }
-    static_cast<void>(reader.member("code").integer());
-    if (!reader.member("description").isString()) {
-        reader.member("description").expected("a string");
+    const JsonReader description = reader.member("description");
+    if (!description.isString()) {
+        description.expected("a string");
+        return {};
     }
+    return {.domain = readName(reader.member("domain")),
+            .code = static_cast<int>(code.integer()),
+            .description = description.string()};
 }
 
 } // namespace nimbra::device

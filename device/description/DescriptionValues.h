@@ -1,6 +1,7 @@
 #pragma once
 
 #include "device/json/JsonReader.h"
+#include "platform/values/Error.h"
 
 #include <chrono>
 #include <initializer_list>
@@ -34,7 +35,7 @@ namespace nimbra::device {
 [[nodiscard]] std::chrono::system_clock::time_point
 readInstant(const JsonReader& reader, std::chrono::system_clock::time_point fallback);
 
-/// Checks an error: an object with domain, code and description.
-void checkError(const JsonReader& reader);
+/// An error: an object with domain, code and description.
+[[nodiscard]] Error readError(const JsonReader& reader);
 
 } // namespace nimbra::device

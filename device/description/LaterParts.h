@@ -12,6 +12,7 @@ void checkConsent(const JsonReader& reader);
 void checkDeviceList(const JsonReader& reader);
 void checkDatabaseSettings(const JsonReader& reader);
 void checkTool(const JsonReader& reader);
+/// Of the faults only those that stand beside the faults of saves.
 void checkFaults(const JsonReader& reader);
 
 } // namespace nimbra::device

@@ -26,6 +26,9 @@ public:
     explicit DevicePaths(std::filesystem::path root);
 
     [[nodiscard]] const std::filesystem::path& root() const { return _root; }
+    /// Whether the device is the machine that this process runs on, not a directory that is laid
+    /// out like one.
+    [[nodiscard]] bool isThisMachine() const { return _root == "/"; }
 
     /// `devicePath` below the root, its links followed as the device itself would: ".." stops at
     /// the root, and a link's target starts there. What does not exist (yet) is taken as written.

@@ -35,8 +35,17 @@ constexpr auto currentVersion = static_cast<std::int64_t>(migrations.size());
 constexpr auto selectIdentifiers = "SELECT identifier FROM accounts ORDER BY position";
 // One statement sees one state, whatever another process writes meanwhile.
 constexpr auto selectAccount =
-    "SELECT uses_stratafile, dataclass, enabled FROM accounts "
+    "SELECT uses_stratafile, dataclass, enabled, cellular FROM accounts "
     "LEFT JOIN account_dataclasses ON account = identifier WHERE identifier = ?";
+constexpr auto countAccount = "SELECT count(*) FROM accounts WHERE identifier = ?";
+constexpr auto writeEnabled =
+    "INSERT INTO account_dataclasses (account, dataclass, enabled, provisioned, cellular) "
+    "VALUES (?, ?, ?, 0, 0) "
+    "ON CONFLICT (account, dataclass) DO UPDATE SET enabled = excluded.enabled";
+constexpr auto writeCellular =
+    "INSERT INTO account_dataclasses (account, dataclass, cellular, enabled, provisioned) "
+    "VALUES (?, ?, ?, 0, 0) "
+    "ON CONFLICT (account, dataclass) DO UPDATE SET cellular = excluded.cellular";
 constexpr auto insertAccountRow =
     "INSERT INTO accounts (identifier, position, is_primary, uses_stratafile, tessary_account) "
     "VALUES (?, ?, ?, ?, ?)";
@@ -79,8 +88,9 @@ std::expected<AccountDatabase, Error> AccountDatabase::create(const std::filesys
     return database;
 }
 
-std::expected<AccountDatabase, Error> AccountDatabase::open(const std::filesystem::path& path) {
-    auto opened = Database::open(path, Database::Access::existing);
+std::expected<AccountDatabase, Error> AccountDatabase::open(const std::filesystem::path& path,
+                                                            std::chrono::milliseconds patience) {
+    auto opened = Database::open(path, Database::Access::existing, patience);
     if (!opened) {
         return std::unexpected(notADatabase(path, opened.error()));
     }
@@ -171,23 +181,67 @@ std::expected<std::vector<AccountIdentifier>, Error> AccountDatabase::accountIde
     return identifiers;
 }
 
-std::expected<std::optional<DeviceAccount::Record>, Error>
+std::expected<std::optional<AccountRecord>, Error>
 AccountDatabase::account(const AccountIdentifier& identifier) {
-    std::optional<DeviceAccount::Record> record;
+    std::optional<AccountRecord> record;
     const auto read = _database->query(
         selectAccount, {identifier.string()}, [&record, &identifier](const Database::Row& row) {
             if (!record) {
-                record.emplace(DeviceAccount::Record{.identifier = identifier,
-                                                     .usesStratafile = row.integer(0) != 0});
+                record.emplace(
+                    AccountRecord{.identifier = identifier, .usesStratafile = row.integer(0) != 0});
             }
-            if (!row.isNull(1) && row.integer(2) != 0) {
+            if (row.isNull(1)) {
+                return;
+            }
+            if (row.integer(2) != 0) {
                 record->enabled.emplace(row.text(1));
+            }
+            if (row.integer(3) != 0) {
+                record->cellular.emplace(row.text(1));
             }
         });
     if (!read) {
         return std::unexpected(read.error());
     }
     return record;
+}
+
+std::expected<void, Error> AccountDatabase::writeChanges(const AccountIdentifier& identifier,
+                                                         const AccountChanges& changes) {
+    return _database->transaction([this, &identifier, &changes]() -> std::expected<void, Error> {
+        auto written = requireAccount(identifier);
+        if (written) {
+            written = writeFlags(writeEnabled, identifier, changes.enabled);
+        }
+        if (written) {
+            written = writeFlags(writeCellular, identifier, changes.cellular);
+        }
+        return written;
+    });
+}
+
+std::expected<void, Error> AccountDatabase::requireAccount(const AccountIdentifier& identifier) {
+    std::int64_t count = 0;
+    auto counted = _database->query(countAccount, {identifier.string()},
+                                    [&count](const Database::Row& row) { count = row.integer(0); });
+    if (counted && count == 0) {
+        return std::unexpected(
+            deviceError(_database->path().string() + ": holds no such account any more"));
+    }
+    return counted;
+}
+
+std::expected<void, Error> AccountDatabase::writeFlags(const char* statement,
+                                                       const AccountIdentifier& identifier,
+                                                       const std::map<Dataclass, bool>& flags) {
+    std::expected<void, Error> written;
+    for (const auto& [dataclass, value] : flags) {
+        if (written) {
+            written = _database->execute(
+                statement, {identifier.string(), dataclass.string(), std::int64_t{value}});
+        }
+    }
+    return written;
 }
 
 std::expected<void, Error> AccountDatabase::replaceAccounts(

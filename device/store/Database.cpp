@@ -14,12 +14,25 @@ namespace nimbra::device {
 
 namespace {
 
-constexpr int busyTimeoutMilliseconds = 5000;
+/// What went wrong, in words for whoever uses the device rather than the library.
+std::string inWords(const SQLite::Exception& exception) {
+    switch (exception.getErrorCode()) {
+    case SQLITE_BUSY:
+    case SQLITE_LOCKED:
+        return "another program is using it";
+    case SQLITE_READONLY:
+        return "it can only be read";
+    case SQLITE_FULL:
+        return "the disk is full";
+    default:
+        return exception.what();
+    }
+}
 
 Error databaseError(const std::filesystem::path& path, const SQLite::Exception& exception) {
     return {.domain = "SQLite",
             .code = exception.getErrorCode(),
-            .description = oneLine(path.string() + ": " + exception.what())};
+            .description = oneLine(path.string() + ": " + inWords(exception))};
 }
 
 std::filesystem::path withSuffix(std::filesystem::path path, const char* suffix) {
@@ -41,9 +54,9 @@ SQLite::Database openAsItStands(const std::filesystem::path& path) {
             SQLite::OPEN_READONLY | SQLite::OPEN_URI};
 }
 
-SQLite::Database openExisting(const std::filesystem::path& path) {
+SQLite::Database openExisting(const std::filesystem::path& path, int busyTimeout) {
     try {
-        SQLite::Database database(path.string(), SQLite::OPEN_READWRITE, busyTimeoutMilliseconds);
+        SQLite::Database database(path.string(), SQLite::OPEN_READWRITE, busyTimeout);
         // Opening reads nothing yet; this does.
         static_cast<void>(database.execAndGet("PRAGMA schema_version"));
         return database;
@@ -115,19 +128,21 @@ Database::Database(std::unique_ptr<Connection> connection) : _connection(std::mo
 Database::~Database() = default;
 
 std::expected<std::unique_ptr<Database>, Error> Database::open(const std::filesystem::path& path,
-                                                               Access access) {
+                                                               Access access,
+                                                               std::chrono::milliseconds patience) {
     std::error_code failure;
     if (access == Access::existing && !std::filesystem::is_regular_file(path, failure)) {
         return std::unexpected(
             fileError(path, "cannot be read", failure ? failure.value() : EISDIR));
     }
+    const int busyTimeout = static_cast<int>(patience.count());
     const bool foundPendingChanges = hasPendingChanges(path);
     try {
         SQLite::Database database =
             access == Access::existing
-                ? openExisting(path)
+                ? openExisting(path, busyTimeout)
                 : SQLite::Database(path.string(), SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE,
-                                   busyTimeoutMilliseconds);
+                                   busyTimeout);
         database.exec("PRAGMA foreign_keys = ON");
         return std::unique_ptr<Database>(new Database(
             std::make_unique<Connection>(path, foundPendingChanges, std::move(database),

@@ -2,6 +2,7 @@
 
 #include "platform/values/Error.h"
 
+#include <chrono>
 #include <cstdint>
 #include <expected>
 #include <filesystem>
@@ -39,10 +40,14 @@ public:
 
     enum class Access { existing, create };
 
+    /// How long a statement waits for another program that is using the file.
+    static constexpr std::chrono::milliseconds patience{5000};
+
     /// Opens the file at `path`; with `create` it is made where it does not exist. Where the file
     /// can only be read, reading works and writing fails.
     [[nodiscard]] static std::expected<std::unique_ptr<Database>, Error>
-    open(const std::filesystem::path& path, Access access);
+    open(const std::filesystem::path& path, Access access,
+         std::chrono::milliseconds patience = Database::patience);
 
     Database(const Database&) = delete;
     Database& operator=(const Database&) = delete;

@@ -1,29 +1,88 @@
 #include "device/store/DeviceAccount.h"
 
+#include "device/store/DeviceAccountStore.h"
+
 #include <utility>
 
 namespace nimbra::device {
 
-DeviceAccount::DeviceAccount(Record record) : _record(std::move(record)) {}
+namespace {
 
-const AccountIdentifier& DeviceAccount::identifier() const {
-    return _record.identifier;
+bool flag(const std::set<Dataclass>& stored, const std::map<Dataclass, bool>& changes,
+          const Dataclass& dataclass) {
+    const auto change = changes.find(dataclass);
+    return change != changes.end() ? change->second : stored.contains(dataclass);
 }
 
-bool DeviceAccount::isEnabledForDataclass(const Dataclass& dataclass) const {
-    return _record.enabled.contains(dataclass);
-}
-
-void DeviceAccount::setEnabledForDataclass(bool enabled, const Dataclass& dataclass) {
-    if (enabled) {
-        _record.enabled.insert(dataclass);
-    } else {
-        _record.enabled.erase(dataclass);
+/// Makes of the changes in `saved` a part of `stored`, and of `changes` what differs from them.
+void takeOver(const std::map<Dataclass, bool>& saved, std::set<Dataclass>& stored,
+              std::map<Dataclass, bool>& changes) {
+    for (const auto& [dataclass, value] : saved) {
+        if (value) {
+            stored.insert(dataclass);
+        } else {
+            stored.erase(dataclass);
+        }
+        if (const auto change = changes.find(dataclass);
+            change != changes.end() && change->second == value) {
+            changes.erase(change);
+        }
     }
 }
 
+} // namespace
+
+DeviceAccount::DeviceAccount(AccountRecord record, DeviceAccountStore& store)
+    : _identifier(record.identifier), _store(store), _record(std::move(record)) {}
+
+const AccountIdentifier& DeviceAccount::identifier() const {
+    return _identifier;
+}
+
+bool DeviceAccount::isEnabledForDataclass(const Dataclass& dataclass) const {
+    const std::scoped_lock lock(_mutex);
+    return flag(_record.enabled, _changes.enabled, dataclass);
+}
+
+void DeviceAccount::setEnabledForDataclass(bool enabled, const Dataclass& dataclass) {
+    const std::scoped_lock lock(_mutex);
+    _changes.enabled.insert_or_assign(dataclass, enabled);
+}
+
 bool DeviceAccount::vt_isUsingStratafile() const {
+    const std::scoped_lock lock(_mutex);
     return _record.usesStratafile;
+}
+
+bool DeviceAccount::vt_useCellularForDataclass(const Dataclass& dataclass) const {
+    const std::scoped_lock lock(_mutex);
+    return flag(_record.cellular, _changes.cellular, dataclass);
+}
+
+void DeviceAccount::vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) {
+    const std::scoped_lock lock(_mutex);
+    _changes.cellular.insert_or_assign(dataclass, useCellular);
+}
+
+void DeviceAccount::reload() {
+    auto stored = _store.record(_identifier);
+    const std::scoped_lock lock(_mutex);
+    _changes = {};
+    // Where nothing can be read, what was read last stands.
+    if (stored) {
+        _record = std::move(*stored);
+    }
+}
+
+AccountChanges DeviceAccount::changes() const {
+    const std::scoped_lock lock(_mutex);
+    return _changes;
+}
+
+void DeviceAccount::didSave(const AccountChanges& saved) {
+    const std::scoped_lock lock(_mutex);
+    takeOver(saved.enabled, _record.enabled, _changes.enabled);
+    takeOver(saved.cellular, _record.cellular, _changes.cellular);
 }
 
 } // namespace nimbra::device

@@ -1,30 +1,40 @@
 #pragma once
 
+#include "device/store/AccountRecord.h"
 #include "platform/accounts/Account.h"
 
-#include <set>
+#include <mutex>
 
 namespace nimbra::device {
 
-/// An account as the device's store gave it out.
+class DeviceAccountStore;
+
+/// An account as the device's store gave it out, and what has been changed on it since. Any thread.
 class DeviceAccount final : public Account {
 public:
-    /// What the store keeps of an account.
-    struct Record {
-        AccountIdentifier identifier;
-        bool usesStratafile = false;
-        std::set<Dataclass> enabled;
-    };
-
-    explicit DeviceAccount(Record record);
+    /// `store`, to which the account belongs, outlives it.
+    DeviceAccount(AccountRecord record, DeviceAccountStore& store);
 
     [[nodiscard]] const AccountIdentifier& identifier() const override;
     [[nodiscard]] bool isEnabledForDataclass(const Dataclass& dataclass) const override;
     void setEnabledForDataclass(bool enabled, const Dataclass& dataclass) override;
     [[nodiscard]] bool vt_isUsingStratafile() const override;
+    [[nodiscard]] bool vt_useCellularForDataclass(const Dataclass& dataclass) const override;
+    void vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) override;
+    void reload() override;
+
+    /// What was changed and not saved.
+    [[nodiscard]] AccountChanges changes() const;
+    /// Takes `saved` as what the store holds now; what was changed otherwise since then stays a
+    /// change.
+    void didSave(const AccountChanges& saved);
 
 private:
-    Record _record;
+    const AccountIdentifier _identifier;
+    DeviceAccountStore& _store;
+    mutable std::mutex _mutex;
+    AccountRecord _record;
+    AccountChanges _changes;
 };
 
 } // namespace nimbra::device

@@ -1,30 +1,111 @@
 #include "device/store/DeviceAccountStore.h"
 
+#include "device/DeviceError.h"
+#include "device/files/DevicePaths.h"
+#include "device/store/DeviceAccount.h"
+#include "device/store/DeviceAccountOperationsHelper.h"
 #include "platform/system/SystemLog.h"
+#include "platform/system/WorkQueues.h"
 
+#include <iterator>
 #include <utility>
 
 namespace nimbra::device {
 
-DeviceAccountStore::DeviceAccountStore(AccountDatabase database, SystemLog& log)
-    : _database(std::move(database)), _log(log) {}
+DeviceAccountStore::DeviceAccountStore(AccountDatabase database, WorkQueues& queues, SystemLog& log)
+    : _database(std::move(database)), _queues(queues), _log(log) {}
+
+DeviceAccountStore::~DeviceAccountStore() = default;
 
 std::shared_ptr<Account>
 DeviceAccountStore::accountWithIdentifier(const AccountIdentifier& identifier) {
-    std::unique_lock lock(_mutex);
-    auto record = _database.account(identifier);
-    lock.unlock();
-    if (!record) {
-        _log.write(LogLevel::error,
-                   "Can't read account " + identifier.string() + ": " + record.error().description);
-        return nullptr;
-    }
-    return *record ? std::make_shared<DeviceAccount>(std::move(**record)) : nullptr;
+    auto found = record(identifier);
+    return found ? std::make_shared<DeviceAccount>(std::move(*found), *this) : nullptr;
+}
+
+void DeviceAccountStore::saveVerifiedAccountWithCompletionHandler(
+    const std::shared_ptr<Account>& account, SaveCompletion completion) {
+    std::call_once(_saveQueueCreation,
+                   [this] { _saveQueue = _queues.serialQueueWithLabel("account-store"); });
+    _saveQueue->async(
+        [this, account, completion = std::move(completion)] { completion(save(account)); });
+}
+
+std::shared_ptr<AccountOperationsHelper> DeviceAccountStore::operationsHelperWithDelegate(
+    std::weak_ptr<AccountOperationsHelperDelegate> delegate) {
+    return std::make_shared<DeviceAccountOperationsHelper>(
+        *this, _queues.serialQueueWithLabel("account-operations"), std::move(delegate));
 }
 
 std::expected<std::vector<AccountIdentifier>, Error> DeviceAccountStore::accountIdentifiers() {
     const std::scoped_lock lock(_mutex);
     return _database.accountIdentifiers();
+}
+
+std::optional<AccountRecord> DeviceAccountStore::record(const AccountIdentifier& identifier) {
+    std::unique_lock lock(_mutex);
+    auto found = _database.account(identifier);
+    lock.unlock();
+    if (!found) {
+        _log.write(LogLevel::error,
+                   "Can't read account " + identifier.string() + ": " + found.error().description);
+        return std::nullopt;
+    }
+    return std::move(*found);
+}
+
+std::expected<void, Error> DeviceAccountStore::save(const std::shared_ptr<Account>& account) {
+    // Whoever plans a failure knows of it: the log is for real ones.
+    if (auto planned = takePlannedFailure()) {
+        return std::unexpected(std::move(*planned));
+    }
+    auto written = write(account);
+    if (!written) {
+        _log.write(LogLevel::error, "Can't save account " + account->identifier().string() + ": " +
+                                        written.error().description);
+    }
+    return written;
+}
+
+void DeviceAccountStore::planSaveOutcomes(std::vector<std::optional<Error>> outcomes) {
+    const std::scoped_lock lock(_mutex);
+    _plannedOutcomes.assign(std::make_move_iterator(outcomes.begin()),
+                            std::make_move_iterator(outcomes.end()));
+}
+
+std::optional<Error> DeviceAccountStore::takePlannedFailure() {
+    const std::scoped_lock lock(_mutex);
+    if (_plannedOutcomes.empty()) {
+        return std::nullopt;
+    }
+    std::optional<Error> outcome = std::move(_plannedOutcomes.front());
+    _plannedOutcomes.pop_front();
+    return outcome;
+}
+
+/// Where the device's directory stands on this machine concerns no page and no log of the device.
+Error DeviceAccountStore::asTheDeviceSaysIt(Error error) const {
+    const std::string here = _database.path().string();
+    if (error.description.starts_with(here)) {
+        error.description.replace(0, here.size(), kAccountsDatabase);
+    }
+    return error;
+}
+
+std::expected<void, Error> DeviceAccountStore::write(const std::shared_ptr<Account>& account) {
+    const auto own = std::dynamic_pointer_cast<DeviceAccount>(account);
+    if (!own) {
+        return std::unexpected(deviceError("the account is not of this store"));
+    }
+    const AccountChanges changes = own->changes();
+    {
+        const std::scoped_lock lock(_mutex);
+        if (auto written = _database.writeChanges(own->identifier(), changes); !written) {
+            return std::unexpected(asTheDeviceSaysIt(std::move(written.error())));
+        }
+    }
+    own->didSave(changes);
+    return {};
 }
 
 } // namespace nimbra::device

@@ -14,6 +14,8 @@ struct DeviceSettings::State {
     mutable std::mutex mutex;
     std::string locale;
     std::string timeZone;
+    bool hasCellularData = false;
+    std::optional<std::string> wirelessVariant;
     std::optional<std::string> overridingLocale;
 };
 
@@ -37,6 +39,16 @@ std::string DeviceSettings::timeZone() const {
     return _state->timeZone;
 }
 
+bool DeviceSettings::hasCellularData() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->hasCellularData;
+}
+
+std::optional<std::string> DeviceSettings::wirelessVariant() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->wirelessVariant;
+}
+
 void DeviceSettings::overrideLocale(const std::string& identifier) {
     const std::scoped_lock lock(_state->mutex);
     _state->overridingLocale = identifier;
@@ -50,6 +62,8 @@ std::expected<void, Error> DeviceSettings::reload() {
     const std::scoped_lock lock(_state->mutex);
     _state->locale = std::move(description->locale);
     _state->timeZone = std::move(description->timeZone);
+    _state->hasCellularData = description->cellularData;
+    _state->wirelessVariant = std::move(description->wirelessVariant);
     return {};
 }
 

@@ -5,12 +5,13 @@
 #include <expected>
 #include <filesystem>
 #include <memory>
+#include <optional>
 #include <string>
 
 namespace nimbra::device {
 
-/// What `device.json` says of the device: its language and its time zone. Copies are the same
-/// settings. Any thread.
+/// What `device.json` says of the device: its language, its time zone and its abilities. Copies are
+/// the same settings. Any thread.
 class DeviceSettings {
 public:
     [[nodiscard]] static std::expected<DeviceSettings, Error>
@@ -20,6 +21,11 @@ public:
     [[nodiscard]] std::string localeIdentifier() const;
     /// The IANA name of the time zone.
     [[nodiscard]] std::string timeZone() const;
+
+    /// Whether the device has cellular data.
+    [[nodiscard]] bool hasCellularData() const;
+    /// The name of the device's own wording of wireless networks; nothing for the usual one.
+    [[nodiscard]] std::optional<std::string> wirelessVariant() const;
 
     /// Shows everything in another locale than the file's, for this process only.
     void overrideLocale(const std::string& identifier);

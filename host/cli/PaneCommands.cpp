@@ -1,5 +1,6 @@
 #include "host/cli/PaneCommands.h"
 
+#include "host/cli/TextLayout.h"
 #include "host/core/PaneSession.h"
 
 #include <algorithm>
@@ -54,8 +55,17 @@ PaneCommands::Outcome PaneCommands::set(std::string_view row, std::string_view v
         return std::unexpected(
             Failure{exitBadInput, "\"on\" or \"off\" expected, not \"" + std::string(value) + '"'});
     }
-    if (const auto done = _session.setRow(row, value == "on"); !done) {
+    const bool wanted = value == "on";
+    if (const auto done = _session.setRow(row, wanted); !done) {
         return refused(done.error());
+    }
+    // The page itself says nothing of a save that failed: its switch goes back.
+    _session.settle();
+    if (const auto set = _session.row(row); set && (*set)->value() != RowValue(wanted)) {
+        return std::unexpected(Failure{exitRefused, '"' + printable(std::string(row)) +
+                                                        "\" is still " +
+                                                        host::displayedValue((*set)->value()) +
+                                                        ": the change could not be saved"});
     }
     return {};
 }

@@ -7,6 +7,7 @@
 #include "host/cli/PaneCommands.h"
 #include "host/cli/PlayCommand.h"
 #include "host/cli/Shell.h"
+#include "host/cli/TextLayout.h"
 #include "host/core/PaneSession.h"
 
 #include <algorithm>
@@ -64,11 +65,21 @@ SessionOutcome openPane(const Arguments& arguments) {
     return std::move(*session);
 }
 
+/// Says on `messages` what the pane is busy with, as soon as it is.
+void showActivity(host::PaneSession& session, std::ostream& messages) {
+    session.setActivityObserver([&session, &messages] {
+        if (const std::string& activity = session.activity().string(); !activity.empty()) {
+            messages << printable(activity) << std::endl;
+        }
+    });
+}
+
 Outcome runOnPane(const Arguments& arguments) {
     const auto session = openPane(arguments);
     if (!session) {
         return std::unexpected(session.error());
     }
+    showActivity(**session, std::cerr);
     PaneCommands commands(**session, std::cout);
     const auto withChanges = [&](const Outcome& outcome) {
         (*session)->settle();
@@ -109,6 +120,7 @@ int runShell(const Arguments& arguments) {
         std::cerr << "settingsctl: " << session.error().message << '\n';
         return session.error().exitStatus;
     }
+    showActivity(**session, std::cerr);
     (*session)->appear();
     return Shell(**session, std::cout, std::cerr).run();
 }

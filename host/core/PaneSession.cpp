@@ -162,6 +162,37 @@ void PaneSession::post(const Notification& notification) {
     _services->notificationCenter.postNotification(notification);
 }
 
+void PaneSession::setActivityObserver(std::function<void()> observer) {
+    _activityObserver = std::move(observer);
+}
+
+void PaneSession::showActivityInProgress(const Text& message) {
+    setActivity(message ? message : Text(""));
+}
+
+void PaneSession::hideActivityInProgress() {
+    setActivity(Text());
+}
+
+void PaneSession::setActivity(Text activity) {
+    _activity = std::move(activity);
+    if (_activityObserver) {
+        _activityObserver();
+    }
+}
+
+void PaneSession::reloadParentSpecifier() {
+    // The pane may have been dismissed meanwhile, and its page with it.
+    if (_accountPage) {
+        _accountPage->reloadSpecifierAnimated(_accountPage->entryRow(), false);
+    }
+}
+
+void PaneSession::reloadAllParentSpecifiers() {
+    // The account's page is the only one above the pane.
+    reloadParentSpecifier();
+}
+
 void PaneSession::dismissPresentedController(bool /*animated*/) {
     // Nothing can be presented over the pane yet.
 }

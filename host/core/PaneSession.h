@@ -10,6 +10,7 @@
 
 #include <expected>
 #include <filesystem>
+#include <functional>
 #include <map>
 #include <memory>
 #include <optional>
@@ -71,6 +72,11 @@ public:
     /// Dismisses the open pane, which disappears first if it is shown, and lets it go.
     void closePane();
 
+    /// What the pane is busy with, as it says; absent while it is not.
+    [[nodiscard]] const Text& activity() const { return _activity; }
+    /// Calls `observer` on the main queue each time the pane becomes busy or ends being it.
+    void setActivityObserver(std::function<void()> observer);
+
     // What happens to an open pane.
 
     void appear();
@@ -95,9 +101,14 @@ public:
 private:
     explicit PaneSession(Configuration configuration);
 
+    void showActivityInProgress(const Text& message) override;
+    void hideActivityInProgress() override;
+    void reloadParentSpecifier() override;
+    void reloadAllParentSpecifiers() override;
     void dismissPresentedController(bool animated) override;
     void dismissPane(bool animated) override;
 
+    void setActivity(Text activity);
     [[nodiscard]] std::expected<void, Error> loadBundle();
     [[nodiscard]] PlatformServices servicesForPane();
     [[nodiscard]] std::expected<UserInfo, Error> userInfoFor(const PaneEntry& entry);
@@ -114,6 +125,8 @@ private:
     std::shared_ptr<AccountPage> _accountPage;
     std::shared_ptr<SettingsListController> _pane;
     bool _isShown = false;
+    Text _activity;
+    std::function<void()> _activityObserver;
 };
 
 } // namespace nimbra::host

@@ -115,7 +115,7 @@ std::optional<RowRefusal> refusalToSet(const Specifier& row) {
         return locked(row);
     }
     if (!row.hasSetter()) {
-        return RowRefusal{Reason::noSetter, quoted(row) + " cannot be changed in this version"};
+        return RowRefusal{Reason::noSetter, quoted(row) + " cannot be changed"};
     }
     return std::nullopt;
 }

@@ -7,7 +7,7 @@ namespace nimbra {
 
 /// A cloud account as the pane shows and edits it: a copy in memory of what the store holds.
 /// Changes stay in the object until the account is saved; they are lost with the object.
-/// Not thread-safe: one queue at a time.
+/// Any queue: a save reads the object while the page shows it.
 class Account {
 public:
     Account() = default;
@@ -24,6 +24,16 @@ public:
 
     /// Whether the account has moved from the older document storage to the new document service.
     [[nodiscard]] virtual bool vt_isUsingStratafile() const = 0;
+
+    /// Whether data of this class may be synced over cellular data. False for a class that the
+    /// account does not know.
+    [[nodiscard]] virtual bool vt_useCellularForDataclass(const Dataclass& dataclass) const = 0;
+    /// Sets the flag in this object only; nothing is written to the store.
+    virtual void vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) = 0;
+
+    /// Drops the changes that were not saved and reads what the store holds now. Where the store
+    /// cannot be read the changes are dropped all the same, and the store logs the reason.
+    virtual void reload() = 0;
 };
 
 } // namespace nimbra

@@ -6,5 +6,9 @@ namespace nimbra {
 
 /// Cloud-document storage: what the master switch turns on and off.
 inline const Dataclass kAccountDataclassTidewater{"kAccountDataclassTidewater"};
+/// The photo stream, which cannot do without document storage.
+inline const Dataclass kAccountDataclassLarder{"kAccountDataclassLarder"};
+/// Key-value storage, which uses cellular data together with document storage.
+inline const Dataclass kAccountDataclassKeyValue{"kAccountDataclassKeyValue"};
 
 } // namespace nimbra

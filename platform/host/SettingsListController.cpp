@@ -113,6 +113,14 @@ void SettingsListController::setObserver(SettingsListObserver* observer) {
     _observer = observer;
 }
 
+void SettingsListController::reloadParentSpecifier() {
+    _services.presenter.reloadParentSpecifier();
+}
+
+void SettingsListController::reloadAllParentSpecifiers() {
+    _services.presenter.reloadAllParentSpecifiers();
+}
+
 void SettingsListController::dismissViewControllerAnimated(bool animated) {
     _services.presenter.dismissPresentedController(animated);
 }

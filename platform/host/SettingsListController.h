@@ -72,6 +72,10 @@ public:
 protected:
     [[nodiscard]] const PlatformServices& services() const { return _services; }
 
+    /// Draws the row anew that opened this page, or the rows on every page above it.
+    void reloadParentSpecifier();
+    void reloadAllParentSpecifiers();
+
     /// Takes away the screen presented over this page, or this page itself.
     void dismissViewControllerAnimated(bool animated);
     void dismissAnimated(bool animated);

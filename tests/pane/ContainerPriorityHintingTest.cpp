@@ -84,6 +84,20 @@ TEST_F(ContainerPriorityHintingTest, ChangesThatComeBeforeTheRunShareIt) {
     EXPECT_EQ(platform.documentContainers.enumerations, 2);
 }
 
+TEST_F(ContainerPriorityHintingTest, ChangesThatComeDuringARunShareOneMore) {
+    pane->viewDidAppear(true);
+    pumpHinting();
+    platform.documentContainers.onEnumeration = [this] {
+        platform.documentContainers.onEnumeration = nullptr;
+        postChange();
+    };
+
+    platform.notificationCenter.postNotification({.name = TidewaterIdentityDidChangeNotification});
+    pumpHinting();
+
+    EXPECT_EQ(platform.documentContainers.enumerations, 3);
+}
+
 TEST_F(ContainerPriorityHintingTest, DisappearingTakesTheRegistrationBackAfterItWasMade) {
     pane->viewDidAppear(true);
     pane->viewDidDisappear(true);

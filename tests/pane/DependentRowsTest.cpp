@@ -17,10 +17,10 @@ TEST_F(DependentRowsTest, TurningOnShowsTheRowsInOneAnimatedBatch) {
 
     flip(true);
 
-    EXPECT_EQ(platform.calls,
-              Calls({"begin", "insert RSPStatusInfo after Nimbra Drive, animated",
-                     "append RSPUIApps Alpha Zeta, animated", "append RSPCellular C, animated",
-                     "append RSPDiagnostics D, animated", "end"}));
+    EXPECT_EQ(platform.calls, Calls({"begin", "insert RSPStatusInfo after Nimbra Drive, animated",
+                                     "append RSPUIApps Alpha Zeta, animated",
+                                     "append RSPCellular Cellular, animated",
+                                     "append RSPDiagnostics D, animated", "end"}));
 }
 
 TEST_F(DependentRowsTest, TurningOnGivesTheOrderOfAFreshBuild) {
@@ -54,10 +54,10 @@ TEST_F(DependentRowsTest, TurningOffRemovesTheRowsInOneAnimatedBatch) {
 
     flip(false);
 
-    EXPECT_EQ(
-        platform.calls,
-        Calls({"begin", "remove RSPDiagnostics D, animated", "remove RSPCellular C, animated",
-               "remove RSPUIApps Alpha Zeta, animated", "remove RSPStatusInfo, animated", "end"}));
+    EXPECT_EQ(platform.calls, Calls({"begin", "remove RSPDiagnostics D, animated",
+                                     "remove RSPCellular Cellular, animated",
+                                     "remove RSPUIApps Alpha Zeta, animated",
+                                     "remove RSPStatusInfo, animated", "end"}));
     EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPLookMeUpByEmail T");
 }
 

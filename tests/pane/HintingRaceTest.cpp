@@ -56,7 +56,10 @@ struct HintingRaceTest : PaneFixture {
                 .workQueues = queues,
                 .fileManager = fakes.fileManager,
                 .bundles = fakes.bundles,
-                .localization = fakes.localization};
+                .localization = fakes.localization,
+                .deviceInfo = fakes.deviceInfo,
+                .restrictions = fakes.restrictions,
+                .systemLog = fakes.systemLog};
     }
 
     void postChange() {

@@ -17,6 +17,7 @@ namespace nimbra::test {
 /// The pane with rows around the master switch, which a test lists.
 class PaneWithRows final : public RSPNimbraDriveViewController {
 public:
+    using RSPNimbraDriveViewController::_createSpecifiersForCellularSwitchCell;
     using RSPNimbraDriveViewController::_registerContainerPriorityHinting;
     using RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState;
     using RSPNimbraDriveViewController::_reloadVantrelAccount;
@@ -30,21 +31,26 @@ public:
 
     std::shared_ptr<Specifier> upgrade;
     SpecifierArray apps;
-    std::optional<SpecifierArray> cellular;
     std::shared_ptr<Specifier> tessary;
     std::optional<SpecifierArray> diagnostics;
     int appQueries = 0;
+    /// The sources that were asked for rows, in order.
+    std::vector<std::string> asked;
 
 protected:
-    std::shared_ptr<Specifier> _createSpecifierForUpgradeButton() override { return upgrade; }
+    std::shared_ptr<Specifier> _createSpecifierForUpgradeButton() override {
+        asked.emplace_back("upgrade");
+        return upgrade;
+    }
     SpecifierArray _appSpecifiersForPRVServices() override {
         ++appQueries;
+        asked.emplace_back("apps");
         return apps;
     }
-    std::optional<SpecifierArray> _createSpecifiersForCellularSwitchCell() override {
-        return cellular;
+    std::shared_ptr<Specifier> _specifierForTessary() override {
+        asked.emplace_back("tessary");
+        return tessary;
     }
-    std::shared_ptr<Specifier> _specifierForTessary() override { return tessary; }
     std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override { return diagnostics; }
 };
 
@@ -64,15 +70,19 @@ struct PaneFixture : testing::Test {
     }
 
     void storeTidewater(bool enabled) {
-        platform.accountStore.stored.setEnabledForDataclass(enabled, kAccountDataclassTidewater);
+        if (enabled) {
+            platform.accountStore.stored.enabled.insert(kAccountDataclassTidewater);
+        } else {
+            platform.accountStore.stored.enabled.erase(kAccountDataclassTidewater);
+        }
     }
 
-    /// Every row source answers with rows: U, T, two apps, C and D with their groups.
+    /// Every row source answers with rows: U, T, two apps, Cellular and D with their groups.
     void fillAllRows() {
         pane->upgrade = row("U");
         pane->tessary = row("T");
         pane->apps = {row("Zeta"), row("Alpha")};
-        pane->cellular = SpecifierArray{Specifier::groupSpecifierWithID("RSPCellular"), row("C")};
+        platform.deviceInfo.hasCellularData = true;
         pane->diagnostics =
             SpecifierArray{Specifier::groupSpecifierWithID("RSPDiagnostics"), row("D")};
     }

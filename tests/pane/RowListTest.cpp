@@ -17,7 +17,7 @@ TEST_F(RowListTest, WithEveryConditionTrueTheListHasAllRowsInTheirOrder) {
     fillAllRows();
 
     EXPECT_EQ(rows(), "U RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPLookMeUpByEmail T "
-                      "RSPUIApps Alpha Zeta RSPCellular C RSPDiagnostics D");
+                      "RSPUIApps Alpha Zeta RSPCellular Cellular RSPDiagnostics D");
 }
 
 TEST_F(RowListTest, AnAccountOnTheOldServiceHasTheUpgradeRowFirstWhateverTheSwitch) {
@@ -70,12 +70,21 @@ TEST_F(RowListTest, WithoutAppsThereIsNoGroupOfApps) {
     EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo");
 }
 
-TEST_F(RowListTest, EmptyAndAbsentRowSourcesContributeNothing) {
+TEST_F(RowListTest, AbsentRowSourcesContributeNothing) {
     storeTidewater(true);
-    pane->cellular = SpecifierArray();
+    platform.deviceInfo.hasCellularData = false;
     pane->diagnostics = std::nullopt;
 
     EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo");
+}
+
+TEST_F(RowListTest, TheSourcesAreAskedInTheirOrderWhateverTheSwitch) {
+    storeTidewater(false);
+    platform.accountStore.stored.usesStratafile = false;
+
+    static_cast<void>(pane->specifiers());
+
+    EXPECT_EQ(pane->asked, Calls({"apps", "diagnostics", "upgrade", "tessary"}));
 }
 
 TEST_F(RowListTest, TheListIsBuiltOnceAndKept) {

@@ -5,6 +5,7 @@
 #include <set>
 #include <string>
 #include <utility>
+#include <vector>
 
 namespace nimbra::test {
 
@@ -15,21 +16,45 @@ public:
 
     [[nodiscard]] const AccountIdentifier& identifier() const override { return _identifier; }
     [[nodiscard]] bool isEnabledForDataclass(const Dataclass& dataclass) const override {
-        return enabled.contains(dataclass);
+        return flags.enabled.contains(dataclass);
     }
-    void setEnabledForDataclass(bool value, const Dataclass& dataclass) override {
-        if (value) {
-            enabled.insert(dataclass);
-        } else {
-            enabled.erase(dataclass);
-        }
+    void setEnabledForDataclass(bool enabled, const Dataclass& dataclass) override {
+        set(flags.enabled, dataclass, enabled);
     }
-    [[nodiscard]] bool vt_isUsingStratafile() const override { return usesStratafile; }
+    [[nodiscard]] bool vt_isUsingStratafile() const override { return flags.usesStratafile; }
+    [[nodiscard]] bool vt_useCellularForDataclass(const Dataclass& dataclass) const override {
+        cellularReads.push_back(dataclass);
+        return flags.cellular.contains(dataclass);
+    }
+    void vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) override {
+        set(flags.cellular, dataclass, useCellular);
+    }
+    void reload() override {
+        ++reloads;
+        flags = *stored;
+    }
 
-    std::set<Dataclass> enabled;
-    bool usesStratafile = true;
+    struct Flags {
+        std::set<Dataclass> enabled;
+        std::set<Dataclass> cellular;
+        bool usesStratafile = true;
+    };
+    Flags flags;
+    /// What a reload brings back; owned by the store that gave the account out.
+    const Flags* stored = nullptr;
+    int reloads = 0;
+    /// The data classes of which it was asked whether they may use cellular data, in order.
+    mutable std::vector<Dataclass> cellularReads;
 
 private:
+    static void set(std::set<Dataclass>& classes, const Dataclass& dataclass, bool isMember) {
+        if (isMember) {
+            classes.insert(dataclass);
+        } else {
+            classes.erase(dataclass);
+        }
+    }
+
     AccountIdentifier _identifier;
 };
 

@@ -3,15 +3,20 @@
 #include "platform/accounts/AccountStore.h"
 #include "tests/support/FakeAccount.h"
 
+#include <functional>
 #include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 namespace nimbra::test {
 
-/// A store with at most one account, "primary", of which every question gives a fresh copy.
+/// A store with at most one account, "primary", of which every question gives a fresh copy. A save
+/// is under way until the test ends it.
 class FakeAccountStore final : public AccountStore {
 public:
+    using Saved = std::expected<void, Error>;
+
     [[nodiscard]] std::shared_ptr<Account>
     accountWithIdentifier(const AccountIdentifier& identifier) override {
         asked.push_back(identifier.string());
@@ -19,16 +24,69 @@ public:
             return nullptr;
         }
         auto account = std::make_shared<FakeAccount>("primary");
-        account->enabled = stored.enabled;
-        account->usesStratafile = stored.usesStratafile;
+        account->flags = stored;
+        account->stored = &stored;
         return account;
     }
 
+    void saveVerifiedAccountWithCompletionHandler(const std::shared_ptr<Account>& account,
+                                                  SaveCompletion completion) override {
+        saves.push_back(
+            {.operation = "saveVerifiedAccount", .account = account, .end = std::move(completion)});
+    }
+
+    [[nodiscard]] std::shared_ptr<AccountOperationsHelper>
+    operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) override {
+        return std::make_shared<Helper>(*this, std::move(delegate));
+    }
+
+    struct Save {
+        std::string operation;
+        std::shared_ptr<Account> account;
+        std::function<void(const Saved&)> end;
+    };
+
+    /// Ends the save asked for first, as a queue of the store's would.
+    void endSave(const Saved& saved) {
+        const Save save = std::move(saves.front());
+        saves.erase(saves.begin());
+        if (saved) {
+            stored = std::static_pointer_cast<FakeAccount>(save.account)->flags;
+        }
+        save.end(saved);
+    }
+
     /// What the store holds.
-    FakeAccount stored{"primary"};
+    FakeAccount::Flags stored;
     bool isReadable = true;
     /// The identifiers asked for, in order.
     std::vector<std::string> asked;
+    /// The saves under way, in order.
+    std::vector<Save> saves;
+
+private:
+    class Helper final : public AccountOperationsHelper {
+    public:
+        Helper(FakeAccountStore& store, std::weak_ptr<AccountOperationsHelperDelegate> delegate)
+            : _store(store), _delegate(std::move(delegate)) {}
+
+        void saveAccountRequireVerification(const std::shared_ptr<Account>& account,
+                                            bool requireVerification) override {
+            const auto end = [this, account](const Saved& saved) {
+                const auto delegate = _delegate.lock();
+                delegate->operationsHelperWillSaveAccount(*this, account);
+                delegate->operationsHelperDidSaveAccountWithSuccessError(*this, account, saved);
+            };
+            _store.saves.push_back({.operation = requireVerification ? "saveAccount, verified"
+                                                                     : "saveAccount, not verified",
+                                    .account = account,
+                                    .end = end});
+        }
+
+    private:
+        FakeAccountStore& _store;
+        std::weak_ptr<AccountOperationsHelperDelegate> _delegate;
+    };
 };
 
 } // namespace nimbra::test

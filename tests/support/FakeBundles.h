@@ -17,9 +17,14 @@ public:
         return paneBundle && paneBundle->identifier() == identifier ? paneBundle : nullptr;
     }
 
-    std::shared_ptr<FakeBundle> paneBundle =
-        std::make_shared<FakeBundle>(std::map<std::string, Text>{
-            {"CLOUD_DRIVE", "Nimbra Drive"}, {"CLOUD_DRIVE_EXPLANATION", "Keeps your documents."}});
+    std::shared_ptr<FakeBundle> paneBundle = std::make_shared<FakeBundle>(
+        std::map<std::string, Text>{{"CLOUD_DRIVE", "Nimbra Drive"},
+                                    {"CLOUD_DRIVE_EXPLANATION", "Keeps your documents."},
+                                    {"TURNING_ON_CLOUD_DRIVE", "Turning on"},
+                                    {"TURNING_OFF_CLOUD_DRIVE", "Turning off"},
+                                    {"CLOUD_DRIVE_CELLULAR", "Cellular"},
+                                    {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI", "Over Wi-Fi."},
+                                    {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI_WLAN", "Over WLAN."}});
     /// How often a bundle was looked up.
     mutable int lookups = 0;
 };

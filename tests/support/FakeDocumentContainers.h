@@ -20,6 +20,9 @@ public:
 
     [[nodiscard]] std::vector<std::shared_ptr<DocumentContainer>> allContainers() override {
         ++enumerations;
+        if (onEnumeration) {
+            onEnumeration();
+        }
         std::vector<std::shared_ptr<DocumentContainer>> containers;
         for (const Listed& container : listed) {
             containers.push_back(std::make_shared<Container>(*this, container));
@@ -35,6 +38,8 @@ public:
     /// "register IDENTIFIER" and "unregister", in order.
     std::vector<std::string> calls;
     int enumerations = 0;
+    /// What happens elsewhere while the containers are enumerated.
+    std::function<void()> onEnumeration;
     /// The completions of the refreshes asked for, for the test to call.
     std::vector<std::function<void()>> refreshes;
 

@@ -12,6 +12,12 @@ class RecordingPresenter final : public Presenter {
 public:
     explicit RecordingPresenter(std::vector<std::string>& calls) : _calls(calls) {}
 
+    void showActivityInProgress(const Text& message) override {
+        _calls.push_back("busy: " + message.string());
+    }
+    void hideActivityInProgress() override { _calls.emplace_back("not busy"); }
+    void reloadParentSpecifier() override { _calls.emplace_back("reload parent row"); }
+    void reloadAllParentSpecifiers() override { _calls.emplace_back("reload all parent rows"); }
     void dismissPresentedController(bool animated) override {
         _calls.emplace_back(animated ? "dismiss presented, animated" : "dismiss presented");
     }

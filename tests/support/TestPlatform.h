@@ -4,9 +4,12 @@
 #include "platform/PlatformServices.h"
 #include "tests/support/FakeAccountStore.h"
 #include "tests/support/FakeBundles.h"
+#include "tests/support/FakeDeviceInfo.h"
 #include "tests/support/FakeDocumentContainers.h"
 #include "tests/support/FakeFileManager.h"
 #include "tests/support/FakeLocalization.h"
+#include "tests/support/FakeRestrictionsProfile.h"
+#include "tests/support/FakeSystemLog.h"
 #include "tests/support/PumpedQueues.h"
 #include "tests/support/RecordingPresenter.h"
 
@@ -27,6 +30,9 @@ struct TestPlatform {
     FakeFileManager fileManager;
     FakeBundles bundles;
     FakeLocalization localization;
+    FakeDeviceInfo deviceInfo;
+    FakeRestrictionsProfile restrictions;
+    FakeSystemLog systemLog;
 
     [[nodiscard]] PlatformServices services() {
         return {.presenter = presenter,
@@ -36,7 +42,10 @@ struct TestPlatform {
                 .workQueues = workQueues,
                 .fileManager = fileManager,
                 .bundles = bundles,
-                .localization = localization};
+                .localization = localization,
+                .deviceInfo = deviceInfo,
+                .restrictions = restrictions,
+                .systemLog = systemLog};
     }
 };
 

@@ -1,25 +1,15 @@
 #include "support/LogMessages.h"
 
+#include "tests/support/FakeSystemLog.h"
+
 #include <gtest/gtest.h>
-#include <set>
 #include <string>
-#include <utility>
-#include <vector>
 
 namespace nimbra {
 namespace {
 
-struct FakeSystemLog final : SystemLog {
-    [[nodiscard]] bool isEnabled(LogLevel level) const override { return enabled.contains(level); }
-    void write(LogLevel level, const std::string& message) override {
-        lines.emplace_back(level, message);
-    }
-
-    std::set<LogLevel> enabled{LogLevel::debug, LogLevel::standard, LogLevel::error};
-    std::vector<std::pair<LogLevel, std::string>> lines;
-};
-
-using Lines = std::vector<std::pair<LogLevel, std::string>>;
+using test::FakeSystemLog;
+using Lines = FakeSystemLog::Lines;
 
 TEST(LogMessages, TheArgumentStandsInThePlaceOfThePlaceholder) {
     FakeSystemLog log;

@@ -3,6 +3,7 @@
 #include "device/DeviceDirectory.h"
 #include "device/DevicePlatform.h"
 #include "device/bundles/DeviceBundles.h"
+#include "device/store/DeviceAccountStore.h"
 #include "device/system/DeviceSettings.h"
 #include "host/core/PaneSession.h"
 #include "host/core/RowDescription.h"
@@ -60,7 +61,7 @@ ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session, T
     : _scenario(scenario), _session(session), _trace(trace) {}
 
 std::expected<void, StepFailure> ScenarioPlayer::play() {
-    applyToBundle(_scenario.device);
+    applyToSession(_scenario.device);
     std::expected<void, StepFailure> result;
     for (std::size_t index = 0; result && index < _scenario.steps.size(); ++index) {
         const ScenarioStep& step = _scenario.steps[index];
@@ -76,13 +77,16 @@ std::expected<void, StepFailure> ScenarioPlayer::play() {
     return result;
 }
 
-void ScenarioPlayer::applyToBundle(const device::GivenDescription& given) {
+void ScenarioPlayer::applyToSession(const device::GivenDescription& given) {
     if (given.description.strings) {
         _session.replaceTexts(*given.description.strings);
     }
     if (given.keys.contains("paneBundleRegistered")) {
         _session.device().bundles().setFindable(BundleIdentifier("com.vantrel.NimbraDriveSettings"),
                                                 given.description.paneBundleRegistered);
+    }
+    if (given.keys.contains("faults")) {
+        _session.device().accountStore().planSaveOutcomes(given.description.saveFaults);
     }
 }
 
@@ -186,7 +190,7 @@ ScenarioPlayer::Outcome ScenarioPlayer::change(const ScenarioStep& step) {
     if (const auto reloaded = _session.device().settings().reload(); !reloaded) {
         return std::unexpected(reloaded.error().description);
     }
-    applyToBundle(change);
+    applyToSession(change);
     return {};
 }
 

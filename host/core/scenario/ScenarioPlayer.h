@@ -37,7 +37,7 @@ private:
 
     [[nodiscard]] static const Handler* handlerFor(const std::string& name);
     /// Does what of a description stands in no file of the device directory.
-    void applyToBundle(const device::GivenDescription& given);
+    void applyToSession(const device::GivenDescription& given);
     [[nodiscard]] Outcome perform(const ScenarioStep& step);
 
     Outcome open(const ScenarioStep& step);

@@ -12,8 +12,8 @@ SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
     : _services(services), _trace(trace), _presenter(services.presenter, trace),
       _accountStore(services.accountStore, trace),
       _documentContainers(services.documentContainers, trace),
-      _notificationCenter(services.notificationCenter, "local", trace), _table(trace),
-      _parent(trace),
+      _notificationCenter(services.notificationCenter, "local", trace), _systemLog(trace),
+      _table(trace), _parent(trace),
       _earlierSyslogSink(replaceSyslogSink([&trace](int priority, const std::string& message) {
           trace.write("syslog", {{"priority", priority}, {"message", message}});
       })) {}
@@ -30,7 +30,10 @@ PlatformServices SessionTracer::services() {
             .workQueues = _services.workQueues,
             .fileManager = _services.fileManager,
             .bundles = _services.bundles,
-            .localization = _services.localization};
+            .localization = _services.localization,
+            .deviceInfo = _services.deviceInfo,
+            .restrictions = _services.restrictions,
+            .systemLog = _systemLog};
 }
 
 std::shared_ptr<Account> SessionTracer::traced(std::shared_ptr<Account> account) const {

@@ -6,6 +6,7 @@
 #include "host/core/trace/TracingDocumentContainers.h"
 #include "host/core/trace/TracingNotificationCenter.h"
 #include "host/core/trace/TracingPresenter.h"
+#include "host/core/trace/TracingSystemLog.h"
 #include "platform/PlatformServices.h"
 #include "platform/system/Syslog.h"
 
@@ -50,6 +51,7 @@ private:
     TracingAccountStore _accountStore;
     TracingDocumentContainers _documentContainers;
     TracingNotificationCenter _notificationCenter;
+    TracingSystemLog _systemLog;
     TableTracer _table;
     ParentTracer _parent;
     SyslogSink _earlierSyslogSink;

@@ -17,6 +17,11 @@ public:
     [[nodiscard]] std::shared_ptr<Account>
     accountWithIdentifier(const AccountIdentifier& identifier) override;
 
+    void saveVerifiedAccountWithCompletionHandler(const std::shared_ptr<Account>& account,
+                                                  SaveCompletion completion) override;
+    [[nodiscard]] std::shared_ptr<AccountOperationsHelper>
+    operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) override;
+
     /// An account that stands for `account` and traces its changes; null for null.
     [[nodiscard]] std::shared_ptr<Account> traced(std::shared_ptr<Account> account) const;
 

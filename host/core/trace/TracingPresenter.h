@@ -12,6 +12,10 @@ public:
     /// Neither is owned; both outlive this one.
     TracingPresenter(Presenter& presenter, Trace& trace) : _presenter(presenter), _trace(trace) {}
 
+    void showActivityInProgress(const Text& message) override;
+    void hideActivityInProgress() override;
+    void reloadParentSpecifier() override;
+    void reloadAllParentSpecifiers() override;
     void dismissPresentedController(bool animated) override;
     void dismissPane(bool animated) override;
 

@@ -3,6 +3,7 @@
 #include "tests/device/RecordingLog.h"
 #include "tests/device/TestFiles.h"
 #include "tests/device/Threads.h"
+#include "tests/support/PumpedQueues.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <SQLiteCpp/SQLiteCpp.h>
@@ -13,7 +14,7 @@ namespace {
 
 class DeviceAccountStoreTest : public testing::Test {
 protected:
-    DeviceAccountStoreTest() : _store(madeDatabase(), _log) {}
+    DeviceAccountStoreTest() : _store(madeDatabase(), _queues, _log) {}
 
     [[nodiscard]] std::filesystem::path path() const { return _directory.path() / "accounts.db"; }
     [[nodiscard]] DeviceAccountStore& store() { return _store; }
@@ -32,6 +33,7 @@ private:
 
     test::TemporaryDirectory _directory;
     test::RecordingLog _log;
+    test::PumpedQueues _queues;
     DeviceAccountStore _store;
 };
 

@@ -67,7 +67,7 @@ TEST(RowLookup, SaysWhyARowCannotBeSet) {
     EXPECT_EQ(refusalToSet(*Specifier::groupSpecifierWithID("a"))->reason, Reason::notASwitch);
     EXPECT_EQ(refusalToSet(*row(nullptr, "a"))->reason, Reason::noSetter);
     EXPECT_EQ(refusalToSet(*row(nullptr, nullptr))->explanation,
-              "the row without a name cannot be changed in this version");
+              "the row without a name cannot be changed");
 }
 
 TEST(RowLookup, SaysWhyARowCannotBeTapped) {

@@ -49,7 +49,8 @@ TEST(Completion, OffersTheRowsOfTheDeviceAskedForInBash) {
     const std::string device = program.path("a device").string();
     ASSERT_EQ(program.run({"init", device}).status, 0);
 
-    EXPECT_EQ(bashOffers(program, {"--root", "'" + device + "'", "get", ""}), "Nimbra\\ Drive\n");
+    EXPECT_EQ(bashOffers(program, {"--root", "'" + device + "'", "get", ""}),
+              "Nimbra\\ Drive\nUse\\ Cellular\\ Data\n");
     EXPECT_EQ(bashOffers(program, {"--root", "'" + device + "'", "get", "\"Nim"}),
               "Nimbra Drive\n");
     EXPECT_EQ(bashOffers(program, {"--root", "'" + device + "'", "set", "Nimbra\\ D"}),

@@ -1,5 +1,6 @@
 #include "tests/host/program/Program.h"
 
+#include <SQLiteCpp/SQLiteCpp.h>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <string>
@@ -37,7 +38,13 @@ TEST(DefaultDevice, IsMadeFromTheSampleOnFirstUse) {
               "        on\n"
               "    Apps can keep their documents and data in Nimbra Drive, so you can "
               "get\n"
-              "    to them on all your devices.\n");
+              "    to them on all your devices.\n"
+              "\n"
+              "  Use Cellular Data                                                   "
+              "       off\n"
+              "    When you’re not connected to Wi-Fi, Nimbra Drive uses cellular data "
+              "to\n"
+              "    transfer documents and data.\n");
     EXPECT_EQ(second.messages, "");
     EXPECT_EQ(second.output, first.output);
 }
@@ -136,7 +143,7 @@ TEST(Get, SaysWhyThereIsNothingToPrint) {
                   "\"Twin\" stands for 2 rows (name one by its identifier: \"twin.one\", "
                   "\"twin.two\")");
     expectRefused(program.run({"--root", program.path("device").string(), "get", "Foo"}),
-                  "no row \"Foo\" (rows: \"Nimbra Drive\")");
+                  "no row \"Foo\" (rows: \"Nimbra Drive\", \"Use Cellular Data\")");
 }
 
 TEST(Set, TurnsASwitchAndPrintsWhatChanges) {
@@ -158,9 +165,70 @@ TEST(Set, RefusesWhatCannotBeSet) {
                   "\"Later\" is a button, not a switch");
     expectRefused(runOnRows(program, {"set", "Storage", "on"}),
                   "\"Storage\" is a link, not a switch");
-    expectRefused(
-        program.run({"--root", program.path("device").string(), "set", "Nimbra Drive", "off"}),
-        "\"Nimbra Drive\" cannot be changed in this version");
+}
+
+TEST(Set, TurnsTheMasterSwitchAndSaysWhatItIsDoing) {
+    const Program program;
+    const std::string device = program.path("device").string();
+    ASSERT_EQ(program.run({"init", device}).status, 0);
+
+    const auto off = program.run({"--root", device, "set", "Nimbra Drive", "off"});
+
+    EXPECT_EQ(off.status, 0);
+    EXPECT_EQ(off.messages, "Turning Off Nimbra Drive…\n");
+    EXPECT_EQ(off.output,
+              "- Use Cellular Data\n"
+              "~ Nimbra Drive                                                               off\n");
+    EXPECT_EQ(program.run({"--root", device, "get", "Nimbra Drive"}).output, "off\n");
+
+    const auto on = program.run({"--root", device, "set", "Nimbra Drive", "on"});
+
+    EXPECT_EQ(on.messages, "Turning On Nimbra Drive…\n");
+    EXPECT_EQ(on.output,
+              "~ Nimbra Drive                                                                on\n"
+              "+ Use Cellular Data                                                          off\n");
+}
+
+TEST(Set, TurnsCellularDataForGood) {
+    const Program program;
+    const std::string device = program.path("device").string();
+    ASSERT_EQ(program.run({"init", device}).status, 0);
+
+    const auto result = program.run({"--root", device, "set", "Use Cellular Data", "on"});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.messages, "");
+    EXPECT_EQ(program.run({"--root", device, "get", "Use Cellular Data"}).output, "on\n");
+}
+
+TEST(Set, SaysWhenAChangeCouldNotBeSavedAndLeavesEverythingAsItWas) {
+    const Program program;
+    const auto device = program.path("device");
+    ASSERT_EQ(program.run({"init", device.string()}).status, 0);
+    // A table that refuses every change, as a database that is damaged in places would.
+    SQLite::Database(device / "var/lib/nimbra/accounts.db", SQLite::OPEN_READWRITE)
+        .exec("CREATE TRIGGER refusal BEFORE UPDATE ON account_dataclasses "
+              "BEGIN SELECT RAISE(ABORT, 'refused'); END");
+
+    const auto result = program.run({"--root", device.string(), "set", "Nimbra Drive", "off"});
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.output, "");
+    EXPECT_TRUE(result.messages.ends_with(
+        "settingsctl: \"Nimbra Drive\" is still on: the change could not be saved\n"))
+        << result.messages;
+    EXPECT_EQ(program.run({"--root", device.string(), "get", "Nimbra Drive"}).output, "on\n");
+}
+
+TEST(Set, RefusesALockedCellularSwitch) {
+    const Program program;
+    const auto device = program.path("device");
+    ASSERT_EQ(program.run({"init", device.string()}).status, 0);
+    program.write("device/var/lib/nimbra/restrictions.json",
+                  R"({"appCellularDataModificationAllowed": false})");
+
+    expectRefused(program.run({"--root", device.string(), "set", "Use Cellular Data", "on"}),
+                  "\"Use Cellular Data\" is locked");
 }
 
 TEST(Set, TakesNothingButOnAndOff) {

@@ -86,16 +86,32 @@ TEST(Play, AFailingStepEndsWithOneAndLeavesTheTraceUpToThere) {
     EXPECT_TRUE(program.leftNothingBehind());
 }
 
-TEST(Play, ASwitchWithoutASetterCannotBeSet) {
+TEST(Play, ALockedSwitchCannotBeSet) {
     const Program program;
 
-    const auto result = program.run(
-        {"play", "-"},
-        R"({"steps": [{"do": "open"}, {"do": "set", "row": "Nimbra Drive", "value": true}]})");
+    const auto result = program.run({"play", "-"}, R"({
+        "device": {"restrictions": {"appCellularDataModificationAllowed": false},
+                   "accounts": [{"identifier": "a", "enabled": ["kAccountDataclassTidewater"]}]},
+        "steps": [{"do": "open"}, {"do": "set", "row": "Use Cellular Data", "value": true}]})");
 
     EXPECT_EQ(result.status, 1);
-    EXPECT_EQ(result.messages,
-              "settingsctl: step 1 (set): \"Nimbra Drive\" cannot be changed in this version\n");
+    EXPECT_EQ(result.messages, "settingsctl: step 1 (set): \"Use Cellular Data\" is locked\n");
+}
+
+TEST(Play, AFailedSaveCallsTheDatabaseByItsPathOnTheDevice) {
+    const Program program;
+
+    const auto result = program.run({"play", "-"}, R"({"steps": [
+        {"do": "open"}, {"do": "change", "device": {"accounts": []}},
+        {"do": "set", "row": "Nimbra Drive", "value": true}]})");
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_NE(result.output.find(
+                  R"("description":"/var/lib/nimbra/accounts.db: holds no such account any more")"),
+              std::string::npos)
+        << result.output;
+    EXPECT_EQ(result.messages, "nimbra-settings: error: Can't save account primary: "
+                               "/var/lib/nimbra/accounts.db: holds no such account any more\n");
 }
 
 TEST(Play, AStepThatNeedsAPaneFailsWithoutOne) {

@@ -1,0 +1,56 @@
+#include "host/core/trace/TracingAccount.h"
+
+#include "host/core/trace/Trace.h"
+
+#include <utility>
+
+namespace nimbra::host {
+
+TracingAccount::TracingAccount(std::shared_ptr<Account> account, Trace& trace)
+    : _account(std::move(account)), _trace(trace) {}
+
+std::shared_ptr<Account> TracingAccount::original(const std::shared_ptr<Account>& account) {
+    const auto traced = std::dynamic_pointer_cast<TracingAccount>(account);
+    return traced ? traced->_account : account;
+}
+
+const AccountIdentifier& TracingAccount::identifier() const {
+    return _account->identifier();
+}
+
+bool TracingAccount::isEnabledForDataclass(const Dataclass& dataclass) const {
+    return _account->isEnabledForDataclass(dataclass);
+}
+
+void TracingAccount::setEnabledForDataclass(bool enabled, const Dataclass& dataclass) {
+    traceFlag("setEnabled:forDataclass:", enabled, dataclass);
+    _account->setEnabledForDataclass(enabled, dataclass);
+}
+
+bool TracingAccount::vt_isUsingStratafile() const {
+    return _account->vt_isUsingStratafile();
+}
+
+bool TracingAccount::vt_useCellularForDataclass(const Dataclass& dataclass) const {
+    return _account->vt_useCellularForDataclass(dataclass);
+}
+
+void TracingAccount::vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) {
+    traceFlag("vt_setUseCellular:forDataclass:", useCellular, dataclass);
+    _account->vt_setUseCellularForDataclass(useCellular, dataclass);
+}
+
+void TracingAccount::reload() {
+    _trace.write("account", {{"op", "reload"}, {"account", identifier().string()}});
+    _account->reload();
+}
+
+void TracingAccount::traceFlag(const char* operation, bool value,
+                               const Dataclass& dataclass) const {
+    _trace.write("account", {{"op", operation},
+                             {"account", identifier().string()},
+                             {"dataclass", dataclass.string()},
+                             {"value", value}});
+}
+
+} // namespace nimbra::host

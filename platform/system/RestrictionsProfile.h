@@ -1,0 +1,14 @@
+#pragma once
+
+namespace nimbra {
+
+/// What whoever manages the device allows its user. Any queue; answers what holds now.
+class RestrictionsProfile {
+public:
+    virtual ~RestrictionsProfile() = default;
+
+    /// Whether the user may change which applications use cellular data.
+    [[nodiscard]] virtual bool isAppCellularDataModificationAllowed() const = 0;
+};
+
+} // namespace nimbra

@@ -1,0 +1,83 @@
+#include "device/system/DeviceAbilities.h"
+
+#include "device/DeviceDirectory.h"
+#include "device/system/DeviceRestrictions.h"
+#include "device/system/DeviceSettings.h"
+#include "tests/device/RecordingLog.h"
+#include "tests/device/TestFiles.h"
+#include "tests/support/TemporaryDirectory.h"
+
+#include <gtest/gtest.h>
+
+namespace nimbra::device {
+namespace {
+
+struct DeviceAbilitiesTest : testing::Test {
+    test::TemporaryDirectory directory;
+    test::RecordingLog log;
+    DeviceDescription description;
+
+    [[nodiscard]] std::filesystem::path root() const { return directory.path() / "device"; }
+
+    [[nodiscard]] DeviceSettings settings() {
+        EXPECT_TRUE(createDeviceDirectory(root(), description));
+        auto opened = DeviceSettings::open(root());
+        EXPECT_TRUE(opened);
+        return *opened;
+    }
+};
+
+TEST_F(DeviceAbilitiesTest, CellularDataIsAnsweredFromTheDevicesFile) {
+    description.cellularData = false;
+    const DeviceSettings without = settings();
+    EXPECT_FALSE(DeviceAbilities(without).boolAnswerForQuestion("cellular-data"));
+
+    description.cellularData = true;
+    ASSERT_TRUE(changeDeviceDirectory(root(), {description, {"cellularData"}}));
+    auto with = DeviceSettings::open(root());
+    ASSERT_TRUE(with);
+    EXPECT_TRUE(DeviceAbilities(*with).boolAnswerForQuestion("cellular-data"));
+}
+
+TEST_F(DeviceAbilitiesTest, AQuestionThatIsNotKnownIsAnsweredWithNo) {
+    const DeviceSettings made = settings();
+
+    EXPECT_FALSE(DeviceAbilities(made).boolAnswerForQuestion("time-travel"));
+}
+
+TEST_F(DeviceAbilitiesTest, AKeyStaysAsItIsOnADeviceWithTheUsualWording) {
+    const DeviceSettings made = settings();
+
+    EXPECT_EQ(DeviceAbilities(made).VariantStringKeyForKey("KEY"), Text("KEY"));
+}
+
+TEST_F(DeviceAbilitiesTest, AVariantsNameIsPutBehindTheKey) {
+    description.wirelessVariant = "WLAN";
+    const DeviceSettings made = settings();
+
+    EXPECT_EQ(DeviceAbilities(made).VariantStringKeyForKey("KEY"), Text("KEY_WLAN"));
+}
+
+TEST_F(DeviceAbilitiesTest, RestrictionsAreReadAtEachQuestion) {
+    static_cast<void>(settings());
+    const DeviceRestrictions restrictions(DevicePaths(root()), log);
+    EXPECT_TRUE(restrictions.isAppCellularDataModificationAllowed());
+
+    description.appCellularDataModificationAllowed = false;
+    ASSERT_TRUE(changeDeviceDirectory(root(), {description, {"restrictions"}}));
+
+    EXPECT_FALSE(restrictions.isAppCellularDataModificationAllowed());
+    EXPECT_TRUE(log.lines().empty());
+}
+
+TEST_F(DeviceAbilitiesTest, RestrictionsThatCannotBeReadAllowNothingAndSaySo) {
+    static_cast<void>(settings());
+    const DeviceRestrictions restrictions(DevicePaths(root()), log);
+    test::writeTestFile(root() / "var/lib/nimbra/restrictions.json", "{");
+
+    EXPECT_FALSE(restrictions.isAppCellularDataModificationAllowed());
+    EXPECT_EQ(log.lines().size(), 1U);
+}
+
+} // namespace
+} // namespace nimbra::device
