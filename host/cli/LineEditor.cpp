@@ -69,7 +69,8 @@ public:
         ::el_set(_editor, EL_SIGNAL, 1);
         ::el_set(_editor, EL_EDITOR, "emacs");
         ::el_set(_editor, EL_GETCFN, readCharacterFor);
-        ::el_set(_editor, EL_ADDFN, "complete", "Completes a word", completeFor);
+        // The wide form keeps these very texts; the other one would copy them and lose the copies.
+        ::el_wset(_editor, EL_ADDFN, L"complete", L"Completes a word", completeFor);
         ::el_set(_editor, EL_BIND, "^I", "complete", nullptr);
         ::el_set(_editor, EL_HIST, ::history, _history);
         constexpr int remembered = 1000;
@@ -87,6 +88,9 @@ public:
     std::optional<std::string> readLine() {
         const InterruptionScope scope;
         int length = 0;
+        // Before the prompt is shown, which the library would do first: what is typed as soon as
+        // it is there is for the editor.
+        ::el_set(_editor, EL_PREP_TERM, 1);
         const char* read = ::el_gets(_editor, &length);
         if (read == nullptr || length <= 0) {
             std::fputs(wasInterrupted != 0 ? "^C\n" : "\n", stdout);
