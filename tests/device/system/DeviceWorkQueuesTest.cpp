@@ -90,9 +90,9 @@ TEST_F(DeviceWorkQueuesTest, CapturesAreDestroyedOnTheQueueBeforeTheNextWorkStar
 }
 
 TEST_F(DeviceWorkQueuesTest, AQueueThatWaitsForAnotherKeepsNoneFromRunning) {
-    std::vector<std::shared_ptr<WorkQueue>> chain;
-    for (int index = 0; index < 20; ++index) {
-        chain.push_back(queues().serialQueueWithLabel("queue " + std::to_string(index)));
+    std::vector<std::shared_ptr<WorkQueue>> chain(20);
+    for (auto& queue : chain) {
+        queue = queues().serialQueueWithLabel("link");
     }
     bool reachedTheEnd = false;
     const std::function<void(std::size_t)> descend = [&](std::size_t index) {
