@@ -47,10 +47,9 @@ std::string hostName(const std::filesystem::path& root) {
 bool hasModem(const std::filesystem::path& root) {
     std::error_code failure;
     const std::filesystem::directory_iterator interfaces(root / "sys/class/net", failure);
-    return !failure &&
-           std::any_of(begin(interfaces), end(interfaces), [](const auto& interface) {
-               return std::ranges::count(linesOf(interface.path() / "uevent"), "DEVTYPE=wwan") > 0;
-           });
+    return !failure && std::any_of(begin(interfaces), end(interfaces), [](const auto& interface) {
+        return std::ranges::count(linesOf(interface.path() / "uevent"), "DEVTYPE=wwan") > 0;
+    });
 }
 
 std::string processLocale() {
