@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <array>
+#include <atomic>
 #include <cerrno>
 #include <climits>
 #include <csignal>
@@ -11,6 +12,7 @@
 #include <cwchar>
 #include <histedit.h>
 #include <poll.h>
+#include <sys/eventfd.h>
 #include <system_error>
 #include <unistd.h>
 #include <utility>
@@ -19,17 +21,27 @@ namespace nimbra::cli {
 
 namespace {
 
-volatile std::sig_atomic_t wasInterrupted = 0;
+// A signal handler can reach nothing but what is global. It may run on any thread, so that no call
+// of the main thread is sure to be interrupted by it.
+std::atomic<int> interruptionDescriptor = -1;
+static_assert(std::atomic<int>::is_always_lock_free, "a signal handler may wait for nobody");
 
 extern "C" void noteInterruption(int /*signal*/) {
-    wasInterrupted = 1;
+    const int error = errno;
+    static_cast<void>(::eventfd_write(interruptionDescriptor, 1));
+    errno = error;
 }
 
-/// While it lives, ^C is only noted.
+/// While it lives, ^C only makes `interruptionDescriptor` readable.
 class InterruptionScope {
 public:
     InterruptionScope() {
-        wasInterrupted = 0;
+        // Never closed: a handler that another thread has begun may write to it late.
+        if (interruptionDescriptor < 0) {
+            interruptionDescriptor = ::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK);
+        }
+        eventfd_t earlier = 0;
+        static_cast<void>(::eventfd_read(interruptionDescriptor, &earlier));
         struct sigaction action{};
         action.sa_handler = noteInterruption;
         ::sigaction(SIGINT, &action, &_earlier);
@@ -87,14 +99,15 @@ public:
 
     std::optional<std::string> readLine() {
         const InterruptionScope scope;
+        _isInterrupted = false;
         int length = 0;
         // Before the prompt is shown, which the library would do first: what is typed as soon as
         // it is there is for the editor.
         ::el_set(_editor, EL_PREP_TERM, 1);
         const char* read = ::el_gets(_editor, &length);
         if (read == nullptr || length <= 0) {
-            std::fputs(wasInterrupted != 0 ? "^C\n" : "\n", stdout);
-            return wasInterrupted != 0 ? std::optional(std::string()) : std::nullopt;
+            std::fputs(_isInterrupted ? "^C\n" : "\n", stdout);
+            return _isInterrupted ? std::optional(std::string()) : std::nullopt;
         }
         std::string line(read, static_cast<std::size_t>(length));
         line.erase(line.find_last_not_of("\r\n") + 1);
@@ -134,7 +147,7 @@ private:
             }
             char byte = '\0';
             const ssize_t count = ::read(STDIN_FILENO, &byte, 1);
-            if (count < 0 && errno == EINTR && wasInterrupted == 0) {
+            if (count < 0 && errno == EINTR) {
                 continue;
             }
             if (count <= 0) {
@@ -155,22 +168,27 @@ private:
 
     /// Waits for the terminal and, meanwhile, shows what happens elsewhere; false on ^C.
     bool waitForInput() {
-        std::array<pollfd, 2> descriptors{
+        std::array descriptors{
             pollfd{.fd = STDIN_FILENO, .events = POLLIN, .revents = 0},
-            pollfd{.fd = _configuration.wakeUpDescriptor, .events = POLLIN, .revents = 0}};
-        while (wasInterrupted == 0) {
+            pollfd{.fd = _configuration.wakeUpDescriptor, .events = POLLIN, .revents = 0},
+            pollfd{.fd = interruptionDescriptor, .events = POLLIN, .revents = 0}};
+        auto& [input, wakeUp, interruption] = descriptors;
+        while (true) {
             if (::poll(descriptors.data(), descriptors.size(), -1) < 0) {
                 continue;
             }
-            if (descriptors[1].revents != 0) {
+            if (interruption.revents != 0) {
+                _isInterrupted = true;
+                errno = EINTR;
+                return false;
+            }
+            if (wakeUp.revents != 0) {
                 show(_configuration.whenWoken());
             }
-            if (descriptors[0].revents != 0) {
+            if (input.revents != 0) {
                 return true;
             }
         }
-        errno = EINTR;
-        return false;
     }
 
     /// Puts `text` in the place of the line, and the line below it.
@@ -216,6 +234,7 @@ private:
     }
 
     Configuration _configuration;
+    bool _isInterrupted = false;
     HistEvent _event{};
     History* _history;
     EditLine* _editor;

@@ -37,7 +37,10 @@ void endWithSignal(int number) {
 
 TerminationGuard::TerminationGuard(std::function<void()> putInOrder) {
     arrivedSignal = 0;
-    wakeUpDescriptor = ::eventfd(0, EFD_CLOEXEC);
+    // Never closed: a handler that another thread has begun may write to it late.
+    if (wakeUpDescriptor < 0) {
+        wakeUpDescriptor = ::eventfd(0, EFD_CLOEXEC);
+    }
     _thread = std::thread([putInOrder = std::move(putInOrder)] {
         waitForWakeUp();
         if (const int number = arrivedSignal; number != 0) {
@@ -63,7 +66,6 @@ TerminationGuard::~TerminationGuard() {
     }
     static_cast<void>(::eventfd_write(wakeUpDescriptor, 1));
     _thread.join();
-    ::close(wakeUpDescriptor.exchange(-1));
 }
 
 } // namespace nimbra::host
