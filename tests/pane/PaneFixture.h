@@ -51,7 +51,10 @@ protected:
         asked.emplace_back("tessary");
         return tessary;
     }
-    std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override { return diagnostics; }
+    std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override {
+        asked.emplace_back("diagnostics");
+        return diagnostics;
+    }
 };
 
 /// A pane on the account "primary", whose row travels with the account's identifier.
