@@ -54,7 +54,7 @@ bool hasModem(const std::filesystem::path& root) {
 
 std::string processLocale() {
     UErrorCode status = U_ZERO_ERROR;
-    std::string tag = icu::Locale::getDefault().toLanguageTag<std::string>(status);
+    const auto tag = icu::Locale::getDefault().toLanguageTag<std::string>(status);
     return U_FAILURE(status) != 0 ? std::string() : tag;
 }
 
