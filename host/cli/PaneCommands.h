@@ -25,11 +25,11 @@ public:
 
     using Outcome = std::expected<void, Failure>;
 
-    Outcome list() const;
-    Outcome listAsJson() const;
-    Outcome get(std::string_view row) const;
-    Outcome set(std::string_view row, std::string_view value);
-    Outcome tap(std::string_view row);
+    [[nodiscard]] Outcome list() const;
+    [[nodiscard]] Outcome listAsJson() const;
+    [[nodiscard]] Outcome get(std::string_view row) const;
+    [[nodiscard]] Outcome set(std::string_view row, std::string_view value);
+    [[nodiscard]] Outcome tap(std::string_view row);
 
     /// How the rows differ now from how they were when the commands were made, or when this was
     /// asked last: a row a line, empty where nothing is different. The page may have closed.

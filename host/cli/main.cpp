@@ -69,7 +69,7 @@ SessionOutcome openPane(const Arguments& arguments) {
 void showActivity(host::PaneSession& session, std::ostream& messages) {
     session.setActivityObserver([&session, &messages] {
         if (const std::string& activity = session.activity().string(); !activity.empty()) {
-            messages << printable(activity) << std::endl;
+            messages << printable(activity) + '\n' << std::flush;
         }
     });
 }
