@@ -38,7 +38,7 @@ std::string checkLocale(const std::string& tag) {
     UErrorCode status = U_ZERO_ERROR;
     const auto length =
         uloc_forLanguageTag(tag.c_str(), locale.data(), ULOC_FULLNAME_CAPACITY, &parsed, &status);
-    const bool isTag = U_SUCCESS(status) && length > 0 && std::cmp_equal(parsed, tag.size());
+    const bool isTag = U_SUCCESS(status) != 0 && length > 0 && std::cmp_equal(parsed, tag.size());
     return isTag ? std::string() : '"' + tag + "\" is not a language tag such as \"de-DE\"";
 }
 

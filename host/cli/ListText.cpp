@@ -27,7 +27,7 @@ std::string shownName(const RowDescription& row) {
 }
 
 std::string shownValue(const RowDescription& row) {
-    const std::string value = printable(host::displayedValue(row.value));
+    std::string value = printable(host::displayedValue(row.value));
     if (row.kind == RowKind::link) {
         return value.empty() ? "›" : value + " ›";
     }
@@ -106,7 +106,7 @@ std::string ListText::footer(const RowDescription& group) const {
     const std::string margin(2 * indent, ' ');
     std::string text;
     for (const std::string& line :
-         wrapped(group.footer.string(), _terminal.width - 2 * margin.size())) {
+         wrapped(group.footer.string(), _terminal.width - (2 * margin.size()))) {
         text += margin + styled(dim, line) + '\n';
     }
     return text;

@@ -38,7 +38,7 @@ std::expected<void, Failure> playOn(const std::filesystem::path& root,
     if (const auto made = device::createDeviceDirectory(root, scenario.device.description); !made) {
         return badInput(made.error());
     }
-    host::Trace trace([&out](const std::string& line) { out << line << std::endl; });
+    host::Trace trace([&out](const std::string& line) { out << line << '\n' << std::flush; });
     const auto session = host::PaneSession::start(
         {.root = root, .bundle = options.bundle, .locale = options.locale, .trace = &trace});
     if (!session) {

@@ -118,7 +118,7 @@ std::string Shell::takeChanges() {
 
 int Shell::perform(const std::string& line) {
     if (const Outcome outcome = dispatch(line); !outcome) {
-        _messages << "settingsctl: " << outcome.error().message << std::endl;
+        _messages << "settingsctl: " << outcome.error().message << '\n' << std::flush;
         return outcome.error().exitStatus;
     }
     return exitDone;

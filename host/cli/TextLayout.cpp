@@ -68,7 +68,7 @@ std::vector<std::int32_t> breaks(const icu::UnicodeString& text) {
 }
 
 bool endsLine(const icu::UnicodeString& piece) {
-    return piece.endsWith(u'\n') || piece.endsWith(u'\r');
+    return piece.endsWith(u'\n') != 0 || piece.endsWith(u'\r') != 0;
 }
 
 } // namespace

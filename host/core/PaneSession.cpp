@@ -239,7 +239,7 @@ std::expected<UserInfo, Error> PaneSession::userInfoFor(const PaneEntry& entry) 
         identifier = known->front().string();
     }
     if (entry.firstSetup.value_or(false)) {
-        std::shared_ptr<Account> account =
+        const std::shared_ptr<Account> account =
             _services->accountStore.accountWithIdentifier(AccountIdentifier(*identifier));
         userInfo.emplace(AccountKey, _tracer ? _tracer->traced(account) : account);
     } else {

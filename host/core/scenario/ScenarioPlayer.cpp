@@ -23,7 +23,7 @@ struct ScenarioPlayer::Handler {
     std::string_view name;
     Outcome (ScenarioPlayer::*perform)(const ScenarioStep& step) = nullptr;
     bool needsPane = false;
-    std::string_view missing = {};
+    std::string_view missing;
 };
 
 const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& name) {
@@ -53,8 +53,8 @@ const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& nam
         Handler{.name = "share", .missing = "no share sheet"},
         Handler{.name = "advance", .missing = "no timers that a moved clock could fire"},
     };
-    const auto handler = std::ranges::find(handlers, name, &Handler::name);
-    return handler != handlers.end() ? &*handler : nullptr;
+    const auto* const handler = std::ranges::find(handlers, name, &Handler::name);
+    return handler != handlers.end() ? handler : nullptr;
 }
 
 ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session, Trace& trace)

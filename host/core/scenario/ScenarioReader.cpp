@@ -4,6 +4,7 @@
 #include "host/core/scenario/StepReader.h"
 
 #include <algorithm>
+#include <utility>
 #include <variant>
 
 namespace nimbra::host {
@@ -39,7 +40,9 @@ PaneEntry readEntry(const JsonReader& reader, const device::DeviceDescription& d
 
 void addNotes(const GivenDescription& given, const std::string& pointer, Scenario& scenario) {
     for (const std::string& key : device::keysWithoutEffect(given)) {
-        scenario.notes.push_back(pointer + '/' + key + " has no effect in this version");
+        std::string note = pointer;
+        note.append("/").append(key).append(" has no effect in this version");
+        scenario.notes.push_back(std::move(note));
     }
 }
 

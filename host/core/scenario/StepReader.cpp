@@ -187,7 +187,7 @@ std::string formNames() {
 ScenarioStep readStep(const JsonReader& reader) {
     const JsonReader name = required(reader, "do", "what the step does");
     ScenarioStep step{.name = name.string(), .arguments = {}};
-    const auto form = std::ranges::find(forms, step.name, &StepForm::name);
+    const auto* const form = std::ranges::find(forms, step.name, &StepForm::name);
     if (form == forms.end()) {
         name.expected("one of " + formNames());
     } else {

@@ -19,7 +19,7 @@ struct DeviceAbilitiesTest : testing::Test {
 
     [[nodiscard]] std::filesystem::path root() const { return directory.path() / "device"; }
 
-    [[nodiscard]] DeviceSettings settings() {
+    [[nodiscard]] DeviceSettings settings() const {
         EXPECT_TRUE(createDeviceDirectory(root(), description));
         auto opened = DeviceSettings::open(root());
         EXPECT_TRUE(opened);
