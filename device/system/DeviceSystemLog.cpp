@@ -21,19 +21,6 @@ namespace {
 
 constexpr auto programName = "nimbra-settings";
 
-/// The level as the lines name it.
-const char* nameOf(LogLevel level) {
-    switch (level) {
-    case LogLevel::debug:
-        return "debug";
-    case LogLevel::standard:
-        return "default";
-    case LogLevel::error:
-        return "error";
-    }
-    return "";
-}
-
 int priorityOf(LogLevel level) {
     switch (level) {
     case LogLevel::debug:

@@ -6,6 +6,19 @@ namespace nimbra {
 
 enum class LogLevel { debug, standard, error };
 
+/// The level as logs and traces call it: "debug", "default" or "error".
+[[nodiscard]] constexpr const char* nameOf(LogLevel level) {
+    switch (level) {
+    case LogLevel::debug:
+        return "debug";
+    case LogLevel::standard:
+        return "default";
+    case LogLevel::error:
+        return "error";
+    }
+    return "";
+}
+
 /// The platform's unified log, through its default handle. Any thread.
 class SystemLog {
 public:
