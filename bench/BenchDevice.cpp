@@ -1,7 +1,9 @@
 #include "bench/BenchDevice.h"
 
+#include "bench/MemoryServices.h"
 #include "device/DeviceDirectory.h"
 #include "platform/accounts/Dataclass.h"
+#include "platform/privacy/PrivacyConsentStore.h"
 #include "platform/system/ClassRegistry.h"
 
 #include <stdexcept>
@@ -11,8 +13,6 @@
 namespace nimbra::bench {
 
 namespace {
-
-constexpr const char* deviceFolder = "device";
 
 template <class T>
 T valueOf(std::expected<T, Error> result) {
@@ -26,46 +26,52 @@ T valueOf(std::expected<T, Error> result) {
 
 } // namespace
 
-BenchDevice::BenchDevice() : _directory(valueOf(host::TemporaryDirectory::make())) {
-    const std::filesystem::path root = _directory.path() / deviceFolder;
+BenchDevice::BenchDevice(std::size_t applications)
+    : _directory(valueOf(host::TemporaryDirectory::make())) {
     device::DeviceDescription description;
     description.accounts.at(0).enabled = {kAccountDataclassTidewater.string()};
-    valueOf(device::createDeviceDirectory(root, description));
-    _platform = valueOf(device::DevicePlatform::open(root, _loop));
+    for (std::size_t index = 0; index < applications; ++index) {
+        const std::string identifier = applicationIdentifier(index);
+        description.apps.push_back({.identifier = identifier, .name = applicationName(index)});
+        description.consent.push_back(
+            {.service = kPRVServiceTidewater.string(), .bundle = identifier, .granted = true});
+        if (index % 2 == 0) {
+            description.consent.push_back({.service = kPRVServiceBrackwater.string(),
+                                           .bundle = identifier,
+                                           .granted = false});
+        }
+    }
+    valueOf(device::createDeviceDirectory(root(), description));
+    reopen();
+}
+
+void BenchDevice::reopen() {
+    _platform.reset();
+    _platform = valueOf(device::DevicePlatform::open(root(), _loop));
 }
 
 PlatformServices BenchDevice::servicesWith(Bundles& bundles) {
-    const PlatformServices own = services();
-    return {.presenter = own.presenter,
-            .accountStore = own.accountStore,
-            .documentContainers = own.documentContainers,
-            .notificationCenter = own.notificationCenter,
-            .workQueues = own.workQueues,
-            .fileManager = own.fileManager,
-            .bundles = bundles,
-            .localization = own.localization,
-            .deviceInfo = own.deviceInfo,
-            .restrictions = own.restrictions,
-            .systemLog = own.systemLog};
+    PlatformServices services = this->services();
+    services.bundles = bundles;
+    return services;
 }
 
 std::filesystem::path BenchDevice::builtBundle() {
     return NIMBRA_BUNDLE;
 }
 
-std::filesystem::path BenchDevice::accountsDatabase() const {
-    return _directory.path() / deviceFolder / "var/lib/nimbra/accounts.db";
-}
-
 std::size_t BenchDevice::rowsOfNewPane(const ControllerClass& paneClass,
                                        const PlatformServices& services) {
+    return rowsOf(*paneClass.create(services));
+}
+
+std::size_t BenchDevice::rowsOf(SettingsListController& pane) {
     const auto entry =
         Specifier::preferenceSpecifierNamed("Nimbra Drive", {.cell = CellType::LinkListCell});
     entry->setUserInfo({{FirstSetupKey, false}, {AccountIdentifierKey, Text("primary")}});
-    const std::shared_ptr<SettingsListController> pane = paneClass.create(services);
-    pane->setSpecifier(entry);
-    pane->viewDidLoad();
-    return pane->specifiers().size();
+    pane.setSpecifier(entry);
+    pane.viewDidLoad();
+    return pane.specifiers().size();
 }
 
 } // namespace nimbra::bench

@@ -20,7 +20,12 @@ namespace nimbra::bench {
 /// queues. Throws `std::runtime_error` when it cannot be made.
 class BenchDevice final : private Presenter {
 public:
-    BenchDevice();
+    /// With so many applications, of which every second has consent records of both services and
+    /// the others of cloud documents alone.
+    explicit BenchDevice(std::size_t applications = 0);
+
+    /// Ends the platform and opens it again: it knows nothing that it has read before.
+    void reopen();
 
     [[nodiscard]] device::DevicePlatform& platform() { return *_platform; }
     [[nodiscard]] PlatformServices services() { return _platform->servicesFor(*this); }
@@ -29,15 +34,21 @@ public:
 
     /// The folder of the pane's bundle as it was built.
     [[nodiscard]] static std::filesystem::path builtBundle();
-    [[nodiscard]] std::filesystem::path accountsDatabase() const;
+    [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }
     /// An empty place for a benchmark's own files.
     [[nodiscard]] std::filesystem::path scratch() const { return _directory.path(); }
 
     /// The rows of a pane of this class, opened on the device's account.
     [[nodiscard]] static std::size_t rowsOfNewPane(const ControllerClass& paneClass,
                                                    const PlatformServices& services);
+    template <class Pane>
+    [[nodiscard]] static std::size_t rowsOfNewPane(const PlatformServices& services) {
+        return rowsOf(*std::make_shared<Pane>(services));
+    }
 
 private:
+    [[nodiscard]] static std::size_t rowsOf(SettingsListController& pane);
+
     void showActivityInProgress(const Text& /*message*/) override {}
     void hideActivityInProgress() override {}
     void reloadParentSpecifier() override {}

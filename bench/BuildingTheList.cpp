@@ -26,7 +26,7 @@ void buildingTheList(benchmark::State& state) {
 
 void buildingTheListBare(benchmark::State& state) {
     const BenchDevice device;
-    BareAccount account(device.accountsDatabase());
+    BareAccount account(device.root() / "var/lib/nimbra/accounts.db");
     for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(account.countDataclasses());
     }

@@ -49,7 +49,7 @@ void openingTheBundle(benchmark::State& state) {
 
 void openingTheBundleBare(benchmark::State& state) {
     const BenchDevice device;
-    BareAccount account(device.accountsDatabase());
+    BareAccount account(device.root() / "var/lib/nimbra/accounts.db");
     int turn = 0;
     for ([[maybe_unused]] auto _ : state) {
         state.PauseTiming();

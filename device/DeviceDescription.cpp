@@ -20,8 +20,6 @@ struct LaterPart {
 };
 
 constexpr std::array laterParts{
-    LaterPart{"apps", checkApplications},
-    LaterPart{"consent", checkConsent},
     LaterPart{"deviceList", checkDeviceList},
     LaterPart{"databaseSettings", checkDatabaseSettings},
     LaterPart{"tool", checkTool},
@@ -34,7 +32,8 @@ struct Part {
 
 constexpr std::array parts{
     Part{"preferences", readPreferences}, Part{"restrictions", readRestrictions},
-    Part{"accounts", readAccounts},       Part{"documents", readDocuments},
+    Part{"accounts", readAccounts},       Part{"apps", readApplications},
+    Part{"consent", readConsent},         Part{"documents", readDocuments},
     Part{"strings", readStrings},         Part{"faults", readFaults},
 };
 
@@ -44,6 +43,16 @@ DeviceDescription::DeviceDescription()
     : now(std::chrono::sys_days(std::chrono::March / 5 / 2024) + std::chrono::hours(14) +
           std::chrono::minutes(7) + std::chrono::seconds(9)),
       accounts{{.identifier = "primary", .primary = true, .usesStratafile = true}} {}
+
+std::set<std::string> DeviceDescription::runningApplications() const {
+    std::set<std::string> identifiers;
+    for (const Application& application : apps) {
+        if (application.running) {
+            identifiers.insert(application.identifier);
+        }
+    }
+    return identifiers;
+}
 
 GivenDescription readDeviceDescription(const JsonReader& reader) {
     reader.allowOnly({"name",
@@ -100,7 +109,7 @@ std::vector<std::string> keysWithoutEffect(const GivenDescription& given) {
         }
     }
     std::ranges::copy_if(given.keys, std::back_inserter(keys), [](const std::string& key) {
-        return key.starts_with("faults/") && key != "faults/save";
+        return key.starts_with("faults/") && key != "faults/save" && key != "faults/consentSet";
     });
     return keys;
 }

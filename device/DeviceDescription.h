@@ -33,6 +33,22 @@ struct DeviceDescription {
         std::set<std::string> cellular;
         std::optional<std::string> tessaryAccount;
     };
+    /// An installed application; one whose name is left out goes by its identifier.
+    struct Application {
+        std::string identifier;
+        std::string name;
+        bool removedSystemApp = false;
+        nlohmann::json entitlements = nlohmann::json::object();
+        bool running = false;
+    };
+    /// What the user said of one application's use of one service.
+    struct ConsentRecord {
+        std::string service;
+        /// Absent for an application without an identifier.
+        std::optional<std::string> bundle;
+        /// Absent where the user has said nothing yet.
+        std::optional<bool> granted;
+    };
     struct Container {
         std::string identifier;
         bool isPublic = false;
@@ -51,6 +67,9 @@ struct DeviceDescription {
     std::set<std::string> cloudSyncDenied;
     bool appCellularDataModificationAllowed = true;
     std::vector<AccountDescription> accounts;
+    std::vector<Application> apps;
+    /// In the order in which they came to be.
+    std::vector<ConsentRecord> consent;
     std::optional<std::string> identity;
     std::vector<Container> containers;
     /// The last sync as it was given: an instant or a sentence, null, or an object with an error.
@@ -61,8 +80,13 @@ struct DeviceDescription {
     bool paneBundleRegistered = true;
     /// The outcomes of the next saves of an account, in order: an error for one that fails.
     std::vector<std::optional<Error>> saveFaults;
+    /// The outcomes of the next changes of consent, in order: false for one that is refused.
+    std::vector<std::optional<bool>> consentSetFaults;
 
     DeviceDescription();
+
+    /// The identifiers of the applications that run.
+    [[nodiscard]] std::set<std::string> runningApplications() const;
 };
 
 /// A description with the keys that were given in it; the other members have their defaults.

@@ -1,11 +1,13 @@
 #include "device/DeviceDirectory.h"
 
 #include "device/DeviceError.h"
+#include "device/description/ApplicationEntries.h"
 #include "device/description/DescriptionFiles.h"
 #include "device/files/DevicePaths.h"
 #include "device/files/Files.h"
 #include "device/files/StagedDirectory.h"
 #include "device/store/AccountDatabase.h"
+#include "device/store/ConsentDatabase.h"
 
 #include <algorithm>
 #include <array>
@@ -97,6 +99,39 @@ std::expected<AccountDatabase, Error> openAccounts(const DevicePaths& paths) {
     return AccountDatabase::open(*path);
 }
 
+/// The database of consent where the device has one already.
+std::expected<std::optional<ConsentDatabase>, Error> openConsent(const DevicePaths& paths) {
+    const auto path = paths.resolve(kConsentDatabase);
+    if (!path) {
+        return std::unexpected(path.error());
+    }
+    return ConsentDatabase::open(*path);
+}
+
+std::expected<void, Error> replaceConsent(const DevicePaths& paths,
+                                          std::optional<ConsentDatabase> database,
+                                          const DeviceDescription& description) {
+    if (!database) {
+        const auto path = paths.resolve(kConsentDatabase);
+        if (!path) {
+            return std::unexpected(path.error());
+        }
+        auto created = ConsentDatabase::create(*path);
+        if (!created) {
+            return std::unexpected(created.error());
+        }
+        database = std::move(*created);
+    }
+    return database->replaceRecords(description.consent);
+}
+
+std::expected<void, Error> replaceApplications(const DevicePaths& paths,
+                                               const DeviceDescription& description) {
+    const auto directory = paths.resolve(kApplicationsDirectory);
+    return directory ? replaceApplicationEntries(*directory, description.apps)
+                     : std::unexpected(directory.error());
+}
+
 /// Makes everything of a device in the empty directory `root`.
 std::expected<void, Error> buildDevice(const std::filesystem::path& root,
                                        const DeviceDescription& description) {
@@ -104,10 +139,12 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
     const auto below = [&root](std::string_view devicePath) {
         return root / std::filesystem::path(devicePath).relative_path();
     };
-    std::error_code failure;
-    std::filesystem::create_directories(below(kPreferencesDirectory), failure);
-    if (failure) {
-        return std::unexpected(fileError(root, "cannot be made", failure.value()));
+    for (const std::string_view directory : {kPreferencesDirectory, kApplicationsDirectory}) {
+        std::error_code failure;
+        std::filesystem::create_directories(below(directory), failure);
+        if (failure) {
+            return std::unexpected(fileError(root, "cannot be made", failure.value()));
+        }
     }
     for (const DescriptionFile* file : {&deviceFile, &restrictionsFile, &documentsFile}) {
         if (auto written = writeDescriptionFile(paths, *file, description); !written) {
@@ -117,9 +154,14 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
     if (auto written = writePreferences(below(kPreferencesDirectory), description); !written) {
         return written;
     }
+    if (auto written = writeApplicationEntries(below(kApplicationsDirectory), description.apps);
+        !written) {
+        return written;
+    }
     auto accounts = AccountDatabase::create(below(kAccountsDatabase));
-    return accounts ? accounts->replaceAccounts(description.accounts)
-                    : std::unexpected(accounts.error());
+    auto written = accounts ? accounts->replaceAccounts(description.accounts)
+                            : std::unexpected(accounts.error());
+    return written ? replaceConsent(paths, std::nullopt, description) : written;
 }
 
 } // namespace
@@ -132,12 +174,7 @@ std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& ro
     }
     if (auto built = buildDevice(staged->path(), description); !built) {
         // The place where it was built goes with the failure and says nothing to anybody.
-        Error error = built.error();
-        const std::string place = staged->path().string();
-        if (error.description.starts_with(place)) {
-            error.description.replace(0, place.size(), root.string());
-        }
-        return std::unexpected(error);
+        return std::unexpected(withPath(built.error(), staged->path(), root.string()));
     }
     return staged->putInPlace();
 }
@@ -157,6 +194,10 @@ std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& ro
     if (!accounts) {
         return std::unexpected(accounts.error());
     }
+    auto consent = openConsent(paths);
+    if (!consent) {
+        return std::unexpected(consent.error());
+    }
 
     std::expected<void, Error> changed;
     if (changesFacts(change)) {
@@ -174,6 +215,12 @@ std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& ro
     }
     if (changed && isGiven("accounts")) {
         changed = accounts->replaceAccounts(description.accounts);
+    }
+    if (changed && isGiven("apps")) {
+        changed = replaceApplications(paths, description);
+    }
+    if (changed && isGiven("consent")) {
+        changed = replaceConsent(paths, std::move(*consent), description);
     }
     return changed;
 }

@@ -17,6 +17,14 @@ Error fileError(const std::filesystem::path& path, const std::string& what, int 
             .description = oneLine(path.string() + ": " + what + ": " + reason)};
 }
 
+Error withPath(Error error, const std::filesystem::path& path, std::string_view name) {
+    const std::string& start = path.native();
+    if (error.description.starts_with(start)) {
+        error.description.replace(0, start.size(), name);
+    }
+    return error;
+}
+
 std::string oneLine(std::string_view text) {
     std::string line;
     icu::UnicodeString::fromUTF8(icu::StringPiece(text.data(), static_cast<int>(text.size())))

@@ -1,11 +1,15 @@
 #include "device/DevicePlatform.h"
 
 #include "device/DeviceError.h"
+#include "device/apps/ApplicationFolders.h"
+#include "device/apps/DeviceAppTerminator.h"
+#include "device/apps/DeviceApplications.h"
 #include "device/bundles/DeviceBundles.h"
 #include "device/description/DescriptionFiles.h"
 #include "device/documents/DeviceDocumentContainers.h"
 #include "device/documents/DeviceFileManager.h"
 #include "device/store/DeviceAccountStore.h"
+#include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceAbilities.h"
 #include "device/system/DeviceLocalization.h"
 #include "device/system/DeviceNotificationCenter.h"
@@ -21,14 +25,50 @@
 
 namespace nimbra::device {
 
+struct DevicePlatform::Databases {
+    AccountDatabase accounts;
+    std::filesystem::path consentPath;
+    std::optional<ConsentDatabase> consent;
+
+    [[nodiscard]] static std::expected<Databases, Error> open(const DevicePaths& paths);
+};
+
+std::expected<DevicePlatform::Databases, Error>
+DevicePlatform::Databases::open(const DevicePaths& paths) {
+    const auto accountsPath = paths.resolve(kAccountsDatabase);
+    if (!accountsPath) {
+        return std::unexpected(accountsPath.error());
+    }
+    auto accounts = AccountDatabase::open(*accountsPath);
+    if (!accounts) {
+        return std::unexpected(accounts.error());
+    }
+    auto consentPath = paths.resolve(kConsentDatabase);
+    if (!consentPath) {
+        return std::unexpected(consentPath.error());
+    }
+    auto consent = ConsentDatabase::open(*consentPath);
+    if (!consent) {
+        return std::unexpected(consent.error());
+    }
+    return Databases{.accounts = std::move(*accounts),
+                     .consentPath = std::move(*consentPath),
+                     .consent = std::move(*consent)};
+}
+
 /// The services, each behind those that it uses. The threads end before the first of them goes.
 struct DevicePlatform::Parts {
-    Parts(const DevicePaths& paths, DeviceSettings deviceSettings, AccountDatabase accounts,
+    Parts(const DevicePaths& paths, DeviceSettings deviceSettings, Databases databases,
           WorkQueue& mainQueue)
         : systemLog(paths, DeviceSystemLog::usualDestination()),
           settings(std::move(deviceSettings)), preferences(paths, systemLog), workQueues(mainQueue),
-          accountStore(std::move(accounts), workQueues, systemLog), bundles(settings, classes),
-          localization(settings, systemLog), abilities(settings), restrictions(paths, systemLog),
+          accountStore(std::move(databases.accounts), workQueues, systemLog),
+          bundles(settings, classes), localization(settings, systemLog), abilities(settings),
+          restrictions(paths, systemLog),
+          privacyConsentStore(std::move(databases.consentPath), std::move(databases.consent),
+                              systemLog),
+          applications(paths, applicationFolders(paths, processEnvironment), settings, systemLog),
+          appTerminator(DeviceAppTerminator::waysOn(paths, systemLog), workQueues, systemLog),
           fileManager(DocumentsFile(paths, systemLog)),
           documentContainers(paths, workQueues.serialQueueWithLabel("document-refresh"),
                              systemLog) {}
@@ -43,6 +83,9 @@ struct DevicePlatform::Parts {
     DeviceLocalization localization;
     DeviceAbilities abilities;
     DeviceRestrictions restrictions;
+    DevicePrivacyConsentStore privacyConsentStore;
+    DeviceApplications applications;
+    DeviceAppTerminator appTerminator;
     DeviceNotificationCenter notificationCenter;
     DeviceFileManager fileManager;
     DeviceDocumentContainers documentContainers;
@@ -84,16 +127,12 @@ DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue) {
     if (const auto checked = checkPreferences(paths); !checked) {
         return std::unexpected(checked.error());
     }
-    const auto database = paths.resolve(kAccountsDatabase);
-    if (!database) {
-        return std::unexpected(database.error());
-    }
-    auto accounts = AccountDatabase::open(*database);
-    if (!accounts) {
-        return std::unexpected(accounts.error());
+    auto databases = Databases::open(paths);
+    if (!databases) {
+        return std::unexpected(databases.error());
     }
     return std::unique_ptr<DevicePlatform>(new DevicePlatform(
-        std::make_unique<Parts>(paths, std::move(*settings), std::move(*accounts), mainQueue)));
+        std::make_unique<Parts>(paths, std::move(*settings), std::move(*databases), mainQueue)));
 }
 
 DevicePlatform::DevicePlatform(std::unique_ptr<Parts> parts) : _parts(std::move(parts)) {}
@@ -113,6 +152,9 @@ PlatformServices DevicePlatform::servicesFor(Presenter& presenter) {
             .localization = _parts->localization,
             .deviceInfo = _parts->abilities,
             .restrictions = _parts->restrictions,
+            .privacyConsentStore = _parts->privacyConsentStore,
+            .applications = _parts->applications,
+            .appTerminator = _parts->appTerminator,
             .systemLog = _parts->systemLog};
 }
 
@@ -122,6 +164,10 @@ DeviceAccountStore& DevicePlatform::accountStore() {
 
 DeviceBundles& DevicePlatform::bundles() {
     return _parts->bundles;
+}
+
+DevicePrivacyConsentStore& DevicePlatform::privacyConsentStore() {
+    return _parts->privacyConsentStore;
 }
 
 const DevicePreferences& DevicePlatform::preferences() const {

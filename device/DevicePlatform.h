@@ -19,6 +19,7 @@ namespace nimbra::device {
 class DeviceAccountStore;
 class DeviceBundles;
 class DevicePreferences;
+class DevicePrivacyConsentStore;
 class DeviceSettings;
 class DeviceWorkQueues;
 
@@ -46,6 +47,7 @@ public:
 
     [[nodiscard]] DeviceAccountStore& accountStore();
     [[nodiscard]] DeviceBundles& bundles();
+    [[nodiscard]] DevicePrivacyConsentStore& privacyConsentStore();
     [[nodiscard]] const DevicePreferences& preferences() const;
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();
@@ -53,6 +55,7 @@ public:
     [[nodiscard]] SystemLog& systemLog();
 
 private:
+    struct Databases;
     struct Parts;
     explicit DevicePlatform(std::unique_ptr<Parts> parts);
 

@@ -25,7 +25,7 @@ RSPNimbraDriveViewController::_createSpecifiersForCellularSwitchCell() {
                        const auto& specifier) { _setUseCellularForSpecifier(value, specifier); },
          .get = [this](const Specifier& specifier) { return _useCellular(specifier); },
          .cell = SwitchCell});
-    row->setPropertyForKey(services().restrictions.isAppCellularDataModificationAllowed(),
+    row->setPropertyForKey(services().restrictions->isAppCellularDataModificationAllowed(),
                            EnabledKey);
     return SpecifierArray{group, row};
 }
@@ -61,7 +61,7 @@ void RSPNimbraDriveViewController::_setUseCellularForSpecifier(
             }
             writeLogMessage(log, log_messages::failedToUpdateCellularFlag, saved.error().line());
             account->reload();
-            pane->services().workQueues.mainQueue().async(
+            pane->services().workQueues->mainQueue().async(
                 [pane, row] { pane->reloadSpecifierAnimated(row, false); });
         });
 }

@@ -10,10 +10,10 @@ namespace {
 /// Makes this process a priority client of every container whose documents people see. Runs on the
 /// hinting queue.
 void registerAsPriorityClient(const PlatformServices& services) {
-    if (!services.fileManager.tidewaterIdentityToken()) {
+    if (!services.fileManager->tidewaterIdentityToken()) {
         return;
     }
-    for (const auto& container : services.documentContainers.allContainers()) {
+    for (const auto& container : services.documentContainers->allContainers()) {
         if (container->isDocumentScopePublic()) {
             // A hint that fails costs only speed, and the next change asks again: the error is
             // dropped and the other containers go on.
@@ -44,8 +44,8 @@ void RSPNimbraDriveViewController::_registerContainerPriorityHinting() {
 /// nothing to take back.
 void RSPNimbraDriveViewController::_unregisterContainerPriorityHinting() {
     if (_containerPriorityHintingQueue) {
-        _containerPriorityHintingQueue->async([&containers = services().documentContainers] {
-            containers.unregisterCurrentProcessAsPriorityHint();
+        _containerPriorityHintingQueue->async([containers = services().documentContainers] {
+            containers->unregisterCurrentProcessAsPriorityHint();
         });
     }
 }

@@ -10,7 +10,7 @@ namespace nimbra {
 Text RSPNimbraDriveViewController::_localizedString(const Text& key) const {
     const BundleIdentifier paneBundle("com.vantrel.NimbraDriveSettings");
     return RSPLocalizedString(key, "Localizable",
-                              services().bundles.bundleWithIdentifier(paneBundle));
+                              services().bundles->bundleWithIdentifier(paneBundle));
 }
 
 std::shared_ptr<Account> RSPNimbraDriveViewController::_vantrelAccount() {
@@ -52,8 +52,8 @@ void RSPNimbraDriveViewController::viewDidLoad() {
 }
 
 void RSPNimbraDriveViewController::_refresh(const std::shared_ptr<RefreshControl>& sender) {
-    services().documentContainers.forceRefreshAllContainersWithCompletion(
-        [&mainQueue = services().workQueues.mainQueue(), sender] {
+    services().documentContainers->forceRefreshAllContainersWithCompletion(
+        [&mainQueue = services().workQueues->mainQueue(), sender] {
             mainQueue.async([sender] { sender->endRefreshing(); });
         });
 }
@@ -76,7 +76,7 @@ void RSPNimbraDriveViewController::viewDidAppear(bool animated) {
 std::shared_ptr<ObserverToken>
 RSPNimbraDriveViewController::_observe(const NotificationName& name,
                                        void (RSPNimbraDriveViewController::*handle)()) {
-    return services().notificationCenter.addObserverForName(
+    return services().notificationCenter->addObserverForName(
         name, {.usingBlock = [weakPane = weak_from_this(), handle](const Notification&) {
             if (const auto pane =
                     std::static_pointer_cast<RSPNimbraDriveViewController>(weakPane.lock())) {

@@ -49,7 +49,7 @@ void RSPNimbraDriveViewController::_setDocumentsAndDataEnabled(bool enabled) {
 void RSPNimbraDriveViewController::operationsHelperWillSaveAccount(
     AccountOperationsHelper& helper, const std::shared_ptr<Account>& account) {
     const bool turnsOn = account->isEnabledForDataclass(kAccountDataclassTidewater);
-    services().workQueues.mainQueue().sync([this, turnsOn] {
+    services().workQueues->mainQueue().sync([this, turnsOn] {
         showActivityInProgressUIWithMessage(
             _localizedString(turnsOn ? "TURNING_ON_CLOUD_DRIVE" : "TURNING_OFF_CLOUD_DRIVE"));
     });
@@ -62,7 +62,7 @@ void RSPNimbraDriveViewController::operationsHelperWillSaveAccount(
 void RSPNimbraDriveViewController::operationsHelperDidSaveAccountWithSuccessError(
     AccountOperationsHelper& helper, const std::shared_ptr<Account>& account,
     const std::expected<void, Error>& saved) {
-    WorkQueue& mainQueue = services().workQueues.mainQueue();
+    WorkQueue& mainQueue = services().workQueues->mainQueue();
     const auto pane = std::static_pointer_cast<RSPNimbraDriveViewController>(shared_from_this());
     if (saved) {
         mainQueue.async(

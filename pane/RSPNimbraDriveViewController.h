@@ -1,5 +1,6 @@
 #pragma once
 
+#include "pane/RSPServiceAccessCache.h"
 #include "platform/host/AccountSettingsPane.h"
 #include "platform/system/NotificationCenter.h"
 #include "platform/values/RowValue.h"
@@ -60,6 +61,13 @@ protected:
     /// The group and the button of diagnostics; nothing while diagnostics are off.
     [[nodiscard]] virtual std::optional<SpecifierArray> _createSpecifiersForDiagnostics();
 
+    /// The row of one application; null for one that is not installed or not to be shown.
+    [[nodiscard]] std::shared_ptr<Specifier>
+    _appSpecifierWithBundleID(const BundleIdentifier& bundleID);
+    void _setAppAccessGrantedForBundleID(const RowValue& value, const BundleIdentifier& bundleID);
+    /// Whether the application may use the cloud; always a boolean.
+    [[nodiscard]] RowValue _appAccessGrantedForBundleID(const BundleIdentifier& bundleID);
+
     /// Shows the rows that depend on the master switch, or hides them, as one animated batch.
     void _reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
 
@@ -74,6 +82,9 @@ protected:
     /// Any queue, from the first `viewDidAppear` on; before that the main queue.
     void _registerContainerPriorityHinting();
 
+    /// What the rows of the applications show and change, read when they were built last.
+    std::optional<RSPServiceAccessCache> _accessCache;
+
 private:
     [[nodiscard]] Text _localizedString(const Text& key) const;
     [[nodiscard]] std::shared_ptr<Specifier> _masterSwitch();
@@ -84,6 +95,10 @@ private:
     void _setDocumentsAndDataEnabledForSpecifier(const RowValue& value,
                                                  const std::shared_ptr<Specifier>& row);
     void _setDocumentsAndDataEnabled(bool enabled);
+
+    [[nodiscard]] RowValue _appAccessGrantedForSpecifier(const Specifier& row);
+    void _setAppAccessGrantedForSpecifier(const RowValue& value,
+                                          const std::shared_ptr<Specifier>& row);
 
     [[nodiscard]] RowValue _useCellular(const Specifier& row);
     void _setUseCellularForSpecifier(const RowValue& value, const std::shared_ptr<Specifier>& row);

@@ -75,10 +75,10 @@ SpecifierArray RSPNimbraDriveViewController::_sortedAppSpecifiers(SpecifierArray
     }
     // The group has no name, and an absent name comes before every other: it stays at the head.
     rows.insert(rows.begin(), Specifier::groupSpecifierWithID("RSPUIApps"));
-    std::ranges::stable_sort(
-        rows, [&localization = services().localization](const auto& left, const auto& right) {
-            return localization.localizedStandardCompare(left->name(), right->name()) < 0;
-        });
+    const Localization& localization = services().localization;
+    std::ranges::stable_sort(rows, [&localization](const auto& left, const auto& right) {
+        return localization.localizedStandardCompare(left->name(), right->name()) < 0;
+    });
     return rows;
 }
 
@@ -110,15 +110,11 @@ void RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndData
     }
 }
 
-// Until the applications, the diagnostics, the upgrade and the cloud database have rows of their
+// Until the diagnostics, the upgrade and the cloud database have rows of their
 // own, these answer with nothing.
 
 std::shared_ptr<Specifier> RSPNimbraDriveViewController::_createSpecifierForUpgradeButton() {
     return nullptr;
-}
-
-SpecifierArray RSPNimbraDriveViewController::_appSpecifiersForPRVServices() {
-    return {};
 }
 
 std::shared_ptr<Specifier> RSPNimbraDriveViewController::_specifierForTessary() {

@@ -1,8 +1,12 @@
 #pragma once
 
+#include "platform/values/ServiceReference.h"
+
 namespace nimbra {
 
 class AccountStore;
+class AppTerminator;
+class Applications;
 class Bundles;
 class DeviceInfo;
 class DocumentContainers;
@@ -10,24 +14,29 @@ class FileManager;
 class Localization;
 class NotificationCenter;
 class Presenter;
+class PrivacyConsentStore;
 class RestrictionsProfile;
 class SystemLog;
 class WorkQueues;
 
 /// Everything that a pane reaches the platform through: handed to it when it is created. The host
-/// and the device own the services, which outlive every controller made over them.
+/// and the device own the services, which outlive every controller made over them. A copy may be
+/// given other services in the place of some.
 struct PlatformServices {
-    Presenter& presenter;
-    AccountStore& accountStore;
-    DocumentContainers& documentContainers;
-    NotificationCenter& notificationCenter;
-    WorkQueues& workQueues;
-    FileManager& fileManager;
-    Bundles& bundles;
-    Localization& localization;
-    DeviceInfo& deviceInfo;
-    RestrictionsProfile& restrictions;
-    SystemLog& systemLog;
+    ServiceReference<Presenter> presenter;
+    ServiceReference<AccountStore> accountStore;
+    ServiceReference<DocumentContainers> documentContainers;
+    ServiceReference<NotificationCenter> notificationCenter;
+    ServiceReference<WorkQueues> workQueues;
+    ServiceReference<FileManager> fileManager;
+    ServiceReference<Bundles> bundles;
+    ServiceReference<Localization> localization;
+    ServiceReference<DeviceInfo> deviceInfo;
+    ServiceReference<RestrictionsProfile> restrictions;
+    ServiceReference<PrivacyConsentStore> privacyConsentStore;
+    ServiceReference<Applications> applications;
+    ServiceReference<AppTerminator> appTerminator;
+    ServiceReference<SystemLog> systemLog;
 };
 
 } // namespace nimbra

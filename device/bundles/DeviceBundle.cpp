@@ -1,7 +1,7 @@
 #include "device/bundles/DeviceBundle.h"
 
-#include "device/bundles/LanguageChain.h"
 #include "device/system/DeviceSettings.h"
+#include "device/system/LanguageChain.h"
 
 #include <utility>
 
@@ -9,7 +9,7 @@ namespace nimbra::device {
 
 DeviceBundle::DeviceBundle(Parts parts) : _parts(std::move(parts)) {}
 
-const BundleIdentifier& DeviceBundle::identifier() const {
+const std::optional<BundleIdentifier>& DeviceBundle::identifier() const {
     return _parts.identifier;
 }
 

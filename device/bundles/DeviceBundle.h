@@ -6,6 +6,7 @@
 #include <map>
 #include <memory>
 #include <mutex>
+#include <optional>
 #include <string>
 
 namespace nimbra {
@@ -21,7 +22,7 @@ class DeviceBundle final : public Bundle {
 public:
     /// What a bundle is made of. The settings and the class are not owned and outlive it.
     struct Parts {
-        BundleIdentifier identifier;
+        std::optional<BundleIdentifier> identifier;
         /// The language whose tables have every key.
         std::string developmentLanguage;
         LanguageTables tables;
@@ -31,7 +32,7 @@ public:
 
     explicit DeviceBundle(Parts parts);
 
-    [[nodiscard]] const BundleIdentifier& identifier() const override;
+    [[nodiscard]] const std::optional<BundleIdentifier>& identifier() const override;
     [[nodiscard]] Text localizedStringForKeyValueTable(const Text& key, const Text& value,
                                                        const Text& table) const override;
 

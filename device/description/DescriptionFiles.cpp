@@ -77,7 +77,16 @@ std::expected<DeviceDescription, Error> readDescriptionFile(const DevicePaths& p
         paths.isThisMachine() && !std::filesystem::exists(*path, failure) && !failure) {
         return describeMachine(paths.root());
     }
-    const auto reader = JsonReader::readFile(*path);
+    const auto text = readFile(*path);
+    if (!text) {
+        return std::unexpected(text.error());
+    }
+    return readDescription(*text, path->string(), file);
+}
+
+std::expected<DeviceDescription, Error>
+readDescription(std::string_view text, const std::string& name, const DescriptionFile& file) {
+    const auto reader = JsonReader::parse(text, name);
     if (!reader) {
         return std::unexpected(reader.error());
     }

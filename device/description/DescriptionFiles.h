@@ -6,6 +6,7 @@
 
 #include <expected>
 #include <nlohmann/json.hpp>
+#include <string>
 #include <string_view>
 
 namespace nimbra::device {
@@ -30,6 +31,10 @@ extern const DescriptionFile documentsFile;
 /// On a real device a file may be missing: what Linux tells of the machine then stands for it.
 [[nodiscard]] std::expected<DeviceDescription, Error>
 readDescriptionFile(const DevicePaths& paths, const DescriptionFile& file);
+
+/// The same for a file that was read already: `text` is what it holds, and messages call it `name`.
+[[nodiscard]] std::expected<DeviceDescription, Error>
+readDescription(std::string_view text, const std::string& name, const DescriptionFile& file);
 
 /// Writes the part of `description` that belongs to `file`, whose directory exists.
 [[nodiscard]] std::expected<void, Error> writeDescriptionFile(const DevicePaths& paths,

@@ -2,8 +2,10 @@
 
 #include "device/description/DescriptionValues.h"
 #include "device/description/LaterParts.h"
+#include "device/files/ApplicationFileName.h"
 #include "device/json/JsonReader.h"
 
+#include <climits>
 #include <utility>
 
 namespace nimbra::device {
@@ -46,6 +48,45 @@ DeviceDescription::AccountDescription readAccount(const JsonReader& reader) {
             .provisioned = readDataclasses(reader.member("provisioned")),
             .cellular = readDataclasses(reader.member("cellular")),
             .tessaryAccount = readNameOrNull(reader.member("tessaryAccount"))};
+}
+
+DeviceDescription::Application readApplication(const JsonReader& reader) {
+    reader.allowOnly({"identifier", "name", "removedSystemApp", "entitlements", "running"});
+    DeviceDescription::Application application;
+    application.identifier = readName(reader.member("identifier"));
+    application.name = reader.member("name").string();
+    // A row that nobody can read helps nobody.
+    if (application.name.find_first_not_of(' ') == std::string::npos) {
+        application.name = application.identifier;
+    }
+    application.removedSystemApp = reader.member("removedSystemApp").boolean();
+    if (const JsonReader entitlements = reader.member("entitlements"); entitlements.isObject()) {
+        application.entitlements = entitlements.value();
+    } else if (!entitlements.isAbsent()) {
+        entitlements.expected("an object");
+    }
+    application.running = reader.member("running").boolean();
+    return application;
+}
+
+std::optional<bool> readGranted(const JsonReader& reader) {
+    if (reader.isBoolean()) {
+        return reader.boolean();
+    }
+    if (!reader.isNull()) {
+        reader.expected("true, false or null");
+    }
+    return std::nullopt;
+}
+
+std::optional<bool> readRefusal(const JsonReader& reader) {
+    if (reader.isNull()) {
+        return std::nullopt;
+    }
+    if (!reader.isBoolean() || reader.boolean()) {
+        reader.expected("false or null");
+    }
+    return false;
 }
 
 } // namespace
@@ -95,6 +136,30 @@ void readAccounts(const JsonReader& reader, DeviceDescription& description) {
     }
 }
 
+void readApplications(const JsonReader& reader, DeviceDescription& description) {
+    description.apps.clear();
+    std::set<std::string> identifiers;
+    for (const JsonReader& element : reader.elements()) {
+        auto application = readApplication(element);
+        if (!identifiers.insert(application.identifier).second) {
+            element.member("identifier").expected("an identifier that no other application has");
+        } else if (applicationFileName(application.identifier, ".desktop").size() > NAME_MAX) {
+            element.member("identifier").expected("an identifier short enough to name a file");
+        }
+        description.apps.push_back(std::move(application));
+    }
+}
+
+void readConsent(const JsonReader& reader, DeviceDescription& description) {
+    description.consent.clear();
+    for (const JsonReader& record : reader.elements()) {
+        record.allowOnly({"service", "bundle", "granted"});
+        description.consent.push_back({.service = readName(record.member("service")),
+                                       .bundle = readNameOrNull(record.member("bundle")),
+                                       .granted = readGranted(record.member("granted"))});
+    }
+}
+
 void readDocuments(const JsonReader& reader, DeviceDescription& description) {
     reader.allowOnly({"identity", "containers", "lastSyncDate", "lastSyncText"});
     description.identity = readNameOrNull(reader.member("identity"));
@@ -127,6 +192,10 @@ void readFaults(const JsonReader& reader, DeviceDescription& description) {
     for (const JsonReader& outcome : reader.member("save").elements()) {
         description.saveFaults.push_back(outcome.isNull() ? std::nullopt
                                                           : std::optional(readError(outcome)));
+    }
+    description.consentSetFaults.clear();
+    for (const JsonReader& outcome : reader.member("consentSet").elements()) {
+        description.consentSetFaults.push_back(readRefusal(outcome));
     }
 }
 

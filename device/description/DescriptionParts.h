@@ -13,6 +13,8 @@ void readScreen(const JsonReader& reader, DeviceDescription& description);
 void readPreferences(const JsonReader& reader, DeviceDescription& description);
 void readRestrictions(const JsonReader& reader, DeviceDescription& description);
 void readAccounts(const JsonReader& reader, DeviceDescription& description);
+void readApplications(const JsonReader& reader, DeviceDescription& description);
+void readConsent(const JsonReader& reader, DeviceDescription& description);
 void readDocuments(const JsonReader& reader, DeviceDescription& description);
 void readStrings(const JsonReader& reader, DeviceDescription& description);
 void readFaults(const JsonReader& reader, DeviceDescription& description);

@@ -43,31 +43,6 @@ constexpr int highestErrno = 4095;
 
 } // namespace
 
-void checkApplications(const JsonReader& reader) {
-    for (const JsonReader& application : reader.elements()) {
-        application.allowOnly(
-            {"identifier", "name", "removedSystemApp", "entitlements", "running"});
-        static_cast<void>(readName(application.member("identifier")));
-        checkString(application.member("name"));
-        checkBoolean(application.member("removedSystemApp"));
-        static_cast<void>(application.member("entitlements").keys());
-        checkBoolean(application.member("running"));
-    }
-}
-
-void checkConsent(const JsonReader& reader) {
-    for (const JsonReader& record : reader.elements()) {
-        record.allowOnly({"service", "bundle", "granted"});
-        static_cast<void>(
-            readOneOf(record.member("service"), {"kPRVServiceTidewater", "kPRVServiceBrackwater"}));
-        static_cast<void>(readNameOrNull(record.member("bundle")));
-        const JsonReader granted = record.member("granted");
-        if (!granted.isNull() && !granted.isBoolean()) {
-            granted.expected("true, false or null");
-        }
-    }
-}
-
 void checkDeviceList(const JsonReader& reader) {
     if (reader.isNull() || (reader.isString() && reader.string() == "never")) {
         return;
@@ -118,11 +93,6 @@ void checkFaults(const JsonReader& reader) {
         checkOutcomes(reader.member(key),
                       [](const JsonReader& outcome) { static_cast<void>(readError(outcome)); });
     }
-    checkOutcomes(reader.member("consentSet"), [](const JsonReader& outcome) {
-        if (!outcome.isBoolean() || outcome.boolean()) {
-            outcome.expected("false or null");
-        }
-    });
     checkOutcomes(reader.member("spawn"),
                   [](const JsonReader& outcome) { checkIntegerBetween(outcome, 1, highestErrno); });
 }

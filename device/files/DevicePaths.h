@@ -12,11 +12,14 @@ namespace nimbra::device {
 
 inline constexpr std::string_view kStateDirectory = "/var/lib/nimbra";
 inline constexpr std::string_view kAccountsDatabase = "/var/lib/nimbra/accounts.db";
+inline constexpr std::string_view kConsentDatabase = "/var/lib/nimbra/consent.db";
 inline constexpr std::string_view kDeviceFile = "/var/lib/nimbra/device.json";
 inline constexpr std::string_view kRestrictionsFile = "/var/lib/nimbra/restrictions.json";
 inline constexpr std::string_view kDocumentsFile = "/var/lib/nimbra/documents.json";
 inline constexpr std::string_view kPreferencesDirectory = "/var/lib/nimbra/preferences";
+inline constexpr std::string_view kRunningApplicationsDirectory = "/run/nimbra";
 inline constexpr std::string_view kPriorityHintsDirectory = "/run/nimbra/priority-hints";
+inline constexpr std::string_view kApplicationsDirectory = "/usr/share/applications";
 inline constexpr std::string_view kLogFile = "/var/log/nimbra/settings.log";
 
 /// Turns a path on the device into one of this machine: the last step before the file system.

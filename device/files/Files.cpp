@@ -1,6 +1,7 @@
 #include "device/files/Files.h"
 
 #include "device/DeviceError.h"
+#include "device/files/Descriptor.h"
 
 #include <algorithm>
 #include <array>
@@ -14,25 +15,6 @@
 namespace nimbra::device {
 
 namespace {
-
-/// An open file, closed with it.
-class Descriptor {
-public:
-    explicit Descriptor(int number) : _number(number) {}
-    Descriptor(const Descriptor&) = delete;
-    Descriptor& operator=(const Descriptor&) = delete;
-    ~Descriptor() {
-        if (_number >= 0) {
-            ::close(_number);
-        }
-    }
-
-    [[nodiscard]] bool isOpen() const { return _number >= 0; }
-    [[nodiscard]] int number() const { return _number; }
-
-private:
-    int _number;
-};
 
 /// A file that is removed again, unless `keep` is called.
 class TemporaryFile {
@@ -69,10 +51,24 @@ bool writeAll(int descriptor, std::string_view content) {
     return true;
 }
 
-/// The permissions of the file at `path`, or those of a new file that everybody may read.
+constexpr mode_t readableByEverybody = 0644;
+
+/// The permissions of the file at `path`, or those of a new file.
 mode_t permissionsFor(const std::filesystem::path& path) {
     struct stat status{};
-    return ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777U : 0644U;
+    return ::stat(path.c_str(), &status) == 0 ? status.st_mode & 07777U : readableByEverybody;
+}
+
+std::expected<void, Error> writeNewFile(const std::filesystem::path& path, std::string_view content,
+                                        bool isFlushed) {
+    const Descriptor file(
+        ::open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, readableByEverybody));
+    if (!file.isOpen() || !writeAll(file.number(), content) ||
+        ::fchmod(file.number(), readableByEverybody) != 0 ||
+        (isFlushed && ::fsync(file.number()) != 0)) {
+        return std::unexpected(fileError(path, "cannot be written", errno));
+    }
+    return {};
 }
 
 } // namespace
@@ -108,6 +104,27 @@ std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path
     }
     file.keep();
     return synchronizeDirectory(path.parent_path());
+}
+
+std::expected<void, Error> writeNewFiles(const std::filesystem::path& directory,
+                                         const std::map<std::string, std::string>& files) {
+    // A file that is flushed alone costs a turn of the disk. All at once cost one, and whatever
+    // other programs have left to write.
+    constexpr std::size_t fewFiles = 64;
+    const bool areFew = files.size() <= fewFiles;
+    const Descriptor descriptor(::open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
+    if (!descriptor.isOpen()) {
+        return std::unexpected(fileError(directory, "cannot be written", errno));
+    }
+    for (const auto& [name, content] : files) {
+        if (auto written = writeNewFile(directory / name, content, areFew); !written) {
+            return written;
+        }
+    }
+    if (!areFew && ::syncfs(descriptor.number()) != 0) {
+        return std::unexpected(fileError(directory, "cannot be flushed", errno));
+    }
+    return {};
 }
 
 std::expected<std::vector<std::filesystem::path>, Error>

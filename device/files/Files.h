@@ -4,6 +4,7 @@
 
 #include <expected>
 #include <filesystem>
+#include <map>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -19,6 +20,13 @@ namespace nimbra::device {
 /// beside it.
 [[nodiscard]] std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,
                                                              std::string_view content);
+
+/// Makes files in `directory` that do not stand there yet, each with the content that `files` has
+/// under its name, and flushes them, where there are many together. On an error some may be left:
+/// for directories that are built out of sight. The directory itself is not flushed.
+[[nodiscard]] std::expected<void, Error>
+writeNewFiles(const std::filesystem::path& directory,
+              const std::map<std::string, std::string>& files);
 
 /// What stands in `directory`, sorted by name: of several mistakes always the same is met first.
 [[nodiscard]] std::expected<std::vector<std::filesystem::path>, Error>

@@ -1,8 +1,8 @@
 #include "device/store/AccountDatabase.h"
 
 #include "device/DeviceError.h"
+#include "device/store/Schema.h"
 
-#include <algorithm>
 #include <array>
 #include <set>
 #include <string>
@@ -12,7 +12,6 @@ namespace nimbra::device {
 
 namespace {
 
-/// The scripts that bring a database from one version to the next; the first makes a new one.
 constexpr std::array migrations{
     R"(CREATE TABLE accounts (
            identifier TEXT NOT NULL PRIMARY KEY,
@@ -30,7 +29,6 @@ constexpr std::array migrations{
            PRIMARY KEY (account, dataclass)
        ) STRICT, WITHOUT ROWID;)",
 };
-constexpr auto currentVersion = static_cast<std::int64_t>(migrations.size());
 
 constexpr auto selectIdentifiers = "SELECT identifier FROM accounts ORDER BY position";
 // One statement sees one state, whatever another process writes meanwhile.
@@ -53,19 +51,12 @@ constexpr auto insertDataclassRow =
     "INSERT INTO account_dataclasses (account, dataclass, enabled, provisioned, cellular) "
     "VALUES (?, ?, ?, ?, ?)";
 
+constexpr std::array readings{selectIdentifiers, selectAccount};
+constexpr Schema schema{
+    .kind = "an account database", .migrations = migrations, .readings = readings};
+
 Database::Value orNull(const std::optional<std::string>& text) {
     return text ? Database::Value(*text) : Database::Value(nullptr);
-}
-
-Error notADatabase(const std::filesystem::path& path, const std::string& reason) {
-    return deviceError(path.string() + ": not an account database: " + reason);
-}
-
-/// `error` of the database at `path`, told as the reason why it is none.
-Error notADatabase(const std::filesystem::path& path, const Error& error) {
-    const std::string start = path.string() + ": ";
-    const bool namesPath = error.description.starts_with(start);
-    return notADatabase(path, error.description.substr(namesPath ? start.size() : 0));
 }
 
 } // namespace
@@ -74,99 +65,20 @@ AccountDatabase::AccountDatabase(std::unique_ptr<Database> database)
     : _database(std::move(database)) {}
 
 std::expected<AccountDatabase, Error> AccountDatabase::create(const std::filesystem::path& path) {
-    auto opened = Database::open(path, Database::Access::create);
-    if (!opened) {
-        return std::unexpected(opened.error());
+    auto database = schema.create(path);
+    if (!database) {
+        return std::unexpected(database.error());
     }
-    AccountDatabase database(std::move(*opened));
-    if (auto set = database._database->executeScript("PRAGMA journal_mode = WAL"); !set) {
-        return std::unexpected(set.error());
-    }
-    if (auto migrated = database.migrate(); !migrated) {
-        return std::unexpected(migrated.error());
-    }
-    return database;
+    return AccountDatabase(std::move(*database));
 }
 
 std::expected<AccountDatabase, Error> AccountDatabase::open(const std::filesystem::path& path,
                                                             std::chrono::milliseconds patience) {
-    auto opened = Database::open(path, Database::Access::existing, patience);
-    if (!opened) {
-        return std::unexpected(notADatabase(path, opened.error()));
+    auto database = schema.open(path, patience);
+    if (!database) {
+        return std::unexpected(database.error());
     }
-    AccountDatabase database(std::move(*opened));
-    if (const auto checked = database.check(); !checked) {
-        database._database->leaveAsFound();
-        return std::unexpected(notADatabase(path, checked.error()));
-    }
-    if (auto migrated = database.migrate(); !migrated) {
-        return std::unexpected(migrated.error());
-    }
-    return database;
-}
-
-std::expected<std::int64_t, Error> AccountDatabase::version() {
-    std::int64_t version = 0;
-    const auto read =
-        _database->query("PRAGMA user_version", {},
-                         [&version](const Database::Row& row) { version = row.integer(0); });
-    if (!read) {
-        return std::unexpected(read.error());
-    }
-    return version;
-}
-
-std::expected<void, Error> AccountDatabase::check() {
-    const auto found = version();
-    if (!found) {
-        return std::unexpected(found.error());
-    }
-    if (*found < 1) {
-        return std::unexpected(deviceError("it has no version"));
-    }
-    if (*found > currentVersion) {
-        return std::unexpected(deviceError("it has version " + std::to_string(*found) +
-                                           ", this program knows up to " +
-                                           std::to_string(currentVersion)));
-    }
-    std::string verdict;
-    const auto checked =
-        _database->query("PRAGMA quick_check(1)", {},
-                         [&verdict](const Database::Row& row) { verdict = row.text(0); });
-    if (!checked) {
-        return std::unexpected(checked.error());
-    }
-    if (verdict != "ok") {
-        return std::unexpected(deviceError("it is damaged: " + verdict));
-    }
-    // Preparing the statements shows whether the tables are there.
-    if (const auto read = accountIdentifiers(); !read) {
-        return std::unexpected(read.error());
-    }
-    if (const auto read = account(AccountIdentifier("")); !read) {
-        return std::unexpected(read.error());
-    }
-    return {};
-}
-
-std::expected<void, Error> AccountDatabase::migrate() {
-    const auto found = version();
-    if (!found) {
-        return std::unexpected(found.error());
-    }
-    if (*found == currentVersion) {
-        return {};
-    }
-    return _database->transaction([this, version = *found]() -> std::expected<void, Error> {
-        for (auto step = version; step < currentVersion; ++step) {
-            if (auto migrated =
-                    _database->executeScript(migrations.at(static_cast<std::size_t>(step)));
-                !migrated) {
-                return migrated;
-            }
-        }
-        return _database->executeScript("PRAGMA user_version = " + std::to_string(currentVersion));
-    });
+    return AccountDatabase(std::move(*database));
 }
 
 std::expected<std::vector<AccountIdentifier>, Error> AccountDatabase::accountIdentifiers() {

@@ -52,9 +52,6 @@ public:
 private:
     explicit AccountDatabase(std::unique_ptr<Database> database);
 
-    [[nodiscard]] std::expected<void, Error> check();
-    [[nodiscard]] std::expected<void, Error> migrate();
-    [[nodiscard]] std::expected<std::int64_t, Error> version();
     [[nodiscard]] std::expected<void, Error>
     insertAccount(const DeviceDescription::AccountDescription& account, std::int64_t position);
 

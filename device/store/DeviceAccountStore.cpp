@@ -85,11 +85,7 @@ std::optional<Error> DeviceAccountStore::takePlannedFailure() {
 
 /// Where the device's directory stands on this machine concerns no page and no log of the device.
 Error DeviceAccountStore::asTheDeviceSaysIt(Error error) const {
-    const std::string here = _database.path().string();
-    if (error.description.starts_with(here)) {
-        error.description.replace(0, here.size(), kAccountsDatabase);
-    }
-    return error;
+    return withPath(std::move(error), _database.path(), kAccountsDatabase);
 }
 
 std::expected<void, Error> DeviceAccountStore::write(const std::shared_ptr<Account>& account) {

@@ -4,6 +4,7 @@
 #include "device/system/MessageFormatter.h"
 #include "platform/system/SystemLog.h"
 
+#include <algorithm>
 #include <unicode/coll.h>
 #include <utility>
 
@@ -64,16 +65,28 @@ int DeviceLocalization::localizedStandardCompare(const Text& left, const Text& r
     if (!left || !right) {
         return static_cast<int>(left.isPresent()) - static_cast<int>(right.isPresent());
     }
-    return orderOfUser()->compare(left.string(), right.string());
+    return orderOfUser().compare(left.string(), right.string());
 }
 
-std::shared_ptr<const DeviceLocalization::Order> DeviceLocalization::orderOfUser() const {
-    std::string locale = _settings.localeIdentifier();
-    const std::scoped_lock lock(_mutex);
-    if (!_order || _order->locale() != locale) {
-        _order = std::make_shared<Order>(std::move(locale));
+const DeviceLocalization::Order& DeviceLocalization::orderOfUser() const {
+    if (_revision.load(std::memory_order_acquire) == _settings.localeRevision()) {
+        return *_order.load(std::memory_order_relaxed);
     }
-    return _order;
+    return findOrder();
+}
+
+const DeviceLocalization::Order& DeviceLocalization::findOrder() const {
+    const std::scoped_lock lock(_mutex);
+    // Asked before the locale: where that changes in between, the next comparison comes back here.
+    const std::uint64_t revision = _settings.localeRevision();
+    std::string locale = _settings.localeIdentifier();
+    auto order = std::ranges::find(_orders, locale, &Order::locale);
+    if (order == _orders.end()) {
+        order = _orders.insert(order, std::make_unique<const Order>(std::move(locale)));
+    }
+    _order.store(order->get(), std::memory_order_relaxed);
+    _revision.store(revision, std::memory_order_release);
+    return **order;
 }
 
 } // namespace nimbra::device

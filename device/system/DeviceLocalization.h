@@ -2,9 +2,11 @@
 
 #include "platform/system/Localization.h"
 
+#include <atomic>
+#include <cstdint>
 #include <memory>
 #include <mutex>
-#include <string>
+#include <vector>
 
 namespace nimbra {
 class SystemLog;
@@ -32,14 +34,18 @@ public:
 
 private:
     class Order;
-    [[nodiscard]] std::shared_ptr<const Order> orderOfUser() const;
+    [[nodiscard]] const Order& orderOfUser() const;
+    [[nodiscard]] const Order& findOrder() const;
 
     const DeviceSettings& _settings;
     SystemLog& _log;
+    /// The order of the user's locale as of the revision of the settings behind it, so that a
+    /// comparison takes no lock. The revision is set last and asked for first.
+    mutable std::atomic<const Order*> _order = nullptr;
+    mutable std::atomic<std::uint64_t> _revision = 0;
     mutable std::mutex _mutex;
-    /// The order of the locale that was asked for last: making one costs more than many
-    /// comparisons.
-    mutable std::shared_ptr<const Order> _order;
+    /// The orders of all locales so far: another thread may still compare by an earlier one.
+    mutable std::vector<std::unique_ptr<const Order>> _orders;
 };
 
 } // namespace nimbra::device

@@ -1,23 +1,99 @@
 #include "device/system/DeviceRestrictions.h"
 
 #include "device/description/DescriptionFiles.h"
+#include "device/files/PlainFile.h"
 #include "platform/system/SystemLog.h"
 
+#include <cstddef>
+#include <set>
+#include <system_error>
 #include <utility>
 
 namespace nimbra::device {
 
+namespace {
+
+// A profile that forbids the cloud to every application of a device comes nowhere near it.
+constexpr std::size_t largestFile = 16'000'000;
+
+} // namespace
+
+struct DeviceRestrictions::Restrictions {
+    std::set<std::string> cloudSyncDenied;
+    bool appCellularDataModificationAllowed = true;
+};
+
 DeviceRestrictions::DeviceRestrictions(DevicePaths paths, SystemLog& log)
-    : _paths(std::move(paths)), _log(log) {}
+    : _paths(std::move(paths)), _path((_paths.root() / kRestrictionsFile.substr(1)).string()),
+      _log(log) {}
+
+DeviceRestrictions::~DeviceRestrictions() = default;
 
 bool DeviceRestrictions::isAppCellularDataModificationAllowed() const {
-    const auto description = readDescriptionFile(_paths, restrictionsFile);
-    if (!description) {
-        _log.write(LogLevel::error,
-                   "Can't read the restrictions: " + description.error().description);
-        return false;
+    const std::scoped_lock lock(_mutex);
+    const Restrictions* restrictions = current();
+    return restrictions != nullptr && restrictions->appCellularDataModificationAllowed;
+}
+
+bool DeviceRestrictions::isCloudSyncAllowed(const BundleIdentifier& bundle) const {
+    const std::scoped_lock lock(_mutex);
+    const Restrictions* restrictions = current();
+    return restrictions != nullptr && !restrictions->cloudSyncDenied.contains(bundle.string());
+}
+
+const DeviceRestrictions::Restrictions* DeviceRestrictions::current() const {
+    const auto isUnchanged = [this](const std::string& path) {
+        const auto stamp = stampOfPlainFile(path);
+        return stamp && _version.stillHolds(*stamp);
+    };
+    // The same stamp is the same file, whichever way leads to it.
+    if (isUnchanged(_path)) {
+        return _restrictions.get();
     }
-    return description->appCellularDataModificationAllowed;
+    const auto path = _paths.resolve(kRestrictionsFile);
+    if (!path) {
+        fail(std::nullopt, path.error().description);
+    } else if (!isUnchanged(*path)) {
+        read(*path);
+    }
+    return _restrictions.get();
+}
+
+void DeviceRestrictions::read(const std::filesystem::path& path) const {
+    std::error_code failure;
+    if (_paths.isThisMachine() && !std::filesystem::exists(path, failure) && !failure) {
+        // A machine that nobody manages.
+        _restrictions = std::make_unique<const Restrictions>();
+        _version = FileVersion();
+        _problem.clear();
+        return;
+    }
+    const auto stamp = stampOfPlainFile(path);
+    const auto file = PlainFile::read(path, largestFile, path.string());
+    if (!file) {
+        fail(stamp, file.error().description);
+        return;
+    }
+    auto description = readDescription(file->content, path.string(), restrictionsFile);
+    if (!description) {
+        fail(file->version.stamp(), description.error().description);
+        return;
+    }
+    _restrictions = std::make_unique<const Restrictions>(Restrictions{
+        .cloudSyncDenied = std::move(description->cloudSyncDenied),
+        .appCellularDataModificationAllowed = description->appCellularDataModificationAllowed});
+    _version = file->version;
+    _problem.clear();
+}
+
+void DeviceRestrictions::fail(const std::optional<FileStamp>& stamp,
+                              const std::string& problem) const {
+    if (problem != _problem || stamp != _version.stamp()) {
+        _log.write(LogLevel::error, "Can't read the restrictions: " + problem);
+    }
+    _restrictions.reset();
+    _version = stamp ? FileVersion::unread(*stamp) : FileVersion();
+    _problem = problem;
 }
 
 } // namespace nimbra::device

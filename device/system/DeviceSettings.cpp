@@ -3,6 +3,7 @@
 #include "device/description/DescriptionFiles.h"
 #include "device/files/DevicePaths.h"
 
+#include <atomic>
 #include <mutex>
 #include <optional>
 #include <utility>
@@ -17,6 +18,7 @@ struct DeviceSettings::State {
     bool hasCellularData = false;
     std::optional<std::string> wirelessVariant;
     std::optional<std::string> overridingLocale;
+    std::atomic<std::uint64_t> localeRevision = 1;
 };
 
 DeviceSettings::DeviceSettings(std::shared_ptr<State> state) : _state(std::move(state)) {}
@@ -32,6 +34,10 @@ std::expected<DeviceSettings, Error> DeviceSettings::open(const std::filesystem:
 std::string DeviceSettings::localeIdentifier() const {
     const std::scoped_lock lock(_state->mutex);
     return _state->overridingLocale.value_or(_state->locale);
+}
+
+std::uint64_t DeviceSettings::localeRevision() const {
+    return _state->localeRevision.load(std::memory_order_acquire);
 }
 
 std::string DeviceSettings::timeZone() const {
@@ -52,6 +58,7 @@ std::optional<std::string> DeviceSettings::wirelessVariant() const {
 void DeviceSettings::overrideLocale(const std::string& identifier) {
     const std::scoped_lock lock(_state->mutex);
     _state->overridingLocale = identifier;
+    ++_state->localeRevision;
 }
 
 std::expected<void, Error> DeviceSettings::reload() {
@@ -61,6 +68,7 @@ std::expected<void, Error> DeviceSettings::reload() {
     }
     const std::scoped_lock lock(_state->mutex);
     _state->locale = std::move(description->locale);
+    ++_state->localeRevision;
     _state->timeZone = std::move(description->timeZone);
     _state->hasCellularData = description->cellularData;
     _state->wirelessVariant = std::move(description->wirelessVariant);

@@ -2,6 +2,7 @@
 
 #include "platform/values/Error.h"
 
+#include <cstdint>
 #include <expected>
 #include <filesystem>
 #include <memory>
@@ -19,6 +20,9 @@ public:
 
     /// The BCP 47 tag of the user's locale.
     [[nodiscard]] std::string localeIdentifier() const;
+    /// A number that is another one after each change of the locale: to know cheaply that it is
+    /// still the same.
+    [[nodiscard]] std::uint64_t localeRevision() const;
     /// The IANA name of the time zone.
     [[nodiscard]] std::string timeZone() const;
 

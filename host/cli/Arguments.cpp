@@ -170,8 +170,11 @@ private:
                                                          : "bash or zsh expected, not " + shell;
             });
         completion->footer("For example: source <(settingsctl completion bash)");
-        // For the completion scripts; nobody types it.
+        // For the completion scripts; nobody types them.
         add(Command::completeRows, "complete-rows", "Print the names of the rows")->group("");
+        add(Command::completeIdentifiers, "complete-identifiers",
+            "Print the identifiers of the rows")
+            ->group("");
     }
 
     Arguments& _arguments;

@@ -7,7 +7,18 @@
 
 namespace nimbra::cli {
 
-enum class Command { list, get, set, tap, init, play, shell, completion, completeRows };
+enum class Command {
+    list,
+    get,
+    set,
+    tap,
+    init,
+    play,
+    shell,
+    completion,
+    completeRows,
+    completeIdentifiers
+};
 
 /// What the user asked for on the command line.
 struct Arguments {

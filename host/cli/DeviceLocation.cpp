@@ -93,6 +93,10 @@ std::expected<void, Failure> initializeDevice(const std::filesystem::path& root,
     for (const std::string& key : device::keysWithoutEffect(*given)) {
         messages << "settingsctl: note: /" << key << " has no effect in this version\n";
     }
+    if (!given->description.runningApplications().empty()) {
+        messages << "settingsctl: note: /apps: \"running\" has no effect here, applications run "
+                    "only while a scenario plays\n";
+    }
     out << "Made the device \"" << given->description.name << "\" in " << root.string() << ".\n";
     return {};
 }

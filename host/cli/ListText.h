@@ -9,7 +9,7 @@
 namespace nimbra::cli {
 
 /// Rows as a person reads them: groups apart from each other, switches with on and off at the
-/// right edge, footers below.
+/// right edge, footers below. Of rows that have the same name each shows its identifier, too.
 class ListText {
 public:
     explicit ListText(Terminal terminal) : _terminal(terminal) {}
@@ -24,7 +24,8 @@ public:
                                       const std::vector<host::RowDescription>& after) const;
 
 private:
-    [[nodiscard]] std::string rowLine(const host::RowDescription& row) const;
+    [[nodiscard]] std::string rowLine(const std::string& name,
+                                      const host::RowDescription& row) const;
     [[nodiscard]] std::string footer(const host::RowDescription& group) const;
     [[nodiscard]] std::string styled(const char* style, const std::string& text) const;
 

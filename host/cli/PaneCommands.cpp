@@ -3,9 +3,10 @@
 #include "host/cli/TextLayout.h"
 #include "host/core/PaneSession.h"
 
-#include <algorithm>
+#include <cstddef>
 #include <nlohmann/json.hpp>
 #include <ostream>
+#include <unordered_map>
 #include <utility>
 
 namespace nimbra::cli {
@@ -17,6 +18,11 @@ using host::RowKind;
 
 std::unexpected<Failure> refused(const host::RowRefusal& refusal) {
     return std::unexpected(Failure{exitRefused, refusal.explanation});
+}
+
+/// Whether `name` is there and is one line of characters that can be typed.
+bool isTypeable(const Text& name) {
+    return name && !name.string().empty() && printable(name.string()) == name.string();
 }
 
 } // namespace
@@ -89,20 +95,32 @@ std::string PaneCommands::takeChanges() {
 
 std::vector<std::string> PaneCommands::rowNames() const {
     const std::vector<RowDescription> all = rows();
-    const auto isCalled = [](const RowDescription& row, const Text& name) {
-        return row.name == name || row.id == name;
-    };
+    std::unordered_map<std::string_view, std::size_t> bearers;
+    for (const RowDescription& row : all) {
+        ++bearers[row.name.string()];
+        if (row.id != row.name) {
+            ++bearers[row.id.string()];
+        }
+    }
     std::vector<std::string> names;
     for (const RowDescription& row : all) {
-        const bool isUnique = std::ranges::count_if(all, [&](const RowDescription& other) {
-                                  return isCalled(other, row.name);
-                              }) == 1;
-        const Text& name = row.name && (isUnique || !row.id) ? row.name : row.id;
-        if (row.kind != RowKind::group && name) {
+        const bool isUnique = isTypeable(row.name) && bearers[row.name.string()] == 1;
+        const Text& name = isUnique || !row.id ? row.name : row.id;
+        if (row.kind != RowKind::group && isTypeable(name)) {
             names.push_back(name.string());
         }
     }
     return names;
+}
+
+std::vector<std::string> PaneCommands::rowIdentifiers() const {
+    std::vector<std::string> identifiers;
+    for (const auto& row : _session.rows()) {
+        if (row->cellType() != GroupCell && isTypeable(row->identifier())) {
+            identifiers.push_back(row->identifier().string());
+        }
+    }
+    return identifiers;
 }
 
 std::vector<RowDescription> PaneCommands::rows() const {

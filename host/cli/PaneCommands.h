@@ -36,8 +36,10 @@ public:
     [[nodiscard]] std::string takeChanges();
 
     /// What each row can be called by, headings left out: its name, or its identifier where
-    /// another row has the same name.
+    /// another row has the same name. Names that cannot be typed are left out.
     [[nodiscard]] std::vector<std::string> rowNames() const;
+    /// The identifiers of the rows that have one, headings left out.
+    [[nodiscard]] std::vector<std::string> rowIdentifiers() const;
 
 private:
     [[nodiscard]] std::vector<host::RowDescription> rows() const;

@@ -3,6 +3,7 @@
 #include "device/DeviceDirectory.h"
 #include "device/files/Files.h"
 #include "host/core/PaneSession.h"
+#include "host/core/scenario/RunningApplications.h"
 #include "host/core/scenario/ScenarioPlayer.h"
 #include "host/core/scenario/ScenarioReader.h"
 #include "host/core/scenario/TemporaryDirectory.h"
@@ -33,10 +34,15 @@ std::expected<host::Scenario, Error> readScenario(const std::string& file) {
 }
 
 std::expected<void, Failure> playOn(const std::filesystem::path& root,
+                                    host::RunningApplications& applications,
                                     const host::Scenario& scenario, const PlayOptions& options,
                                     std::ostream& out) {
     if (const auto made = device::createDeviceDirectory(root, scenario.device.description); !made) {
         return badInput(made.error());
+    }
+    const auto running = applications.setRunning(scenario.device.description.runningApplications());
+    if (!running) {
+        return badInput(running.error());
     }
     host::Trace trace([&out](const std::string& line) { out << line << '\n' << std::flush; });
     const auto session = host::PaneSession::start(
@@ -44,7 +50,8 @@ std::expected<void, Failure> playOn(const std::filesystem::path& root,
     if (!session) {
         return badInput(session.error());
     }
-    if (const auto played = host::ScenarioPlayer(scenario, **session, trace).play(); !played) {
+    if (const auto played = host::ScenarioPlayer(scenario, **session, applications, trace).play();
+        !played) {
         const host::StepFailure& failure = played.error();
         return std::unexpected(Failure{exitRefused, "step " + std::to_string(failure.index) + " (" +
                                                         failure.name + "): " + failure.reason});
@@ -64,14 +71,21 @@ std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out,
         messages << "settingsctl: note: " << note << '\n';
     }
     if (options.keep) {
-        return playOn(*options.keep, *scenario, options, out);
+        host::RunningApplications applications(*options.keep);
+        const host::TerminationGuard guard([&applications] { applications.end(); });
+        return playOn(*options.keep, applications, *scenario, options, out);
     }
     const auto temporary = host::TemporaryDirectory::make();
     if (!temporary) {
         return badInput(temporary.error());
     }
-    const host::TerminationGuard guard([&temporary] { temporary->remove(); });
-    return playOn(temporary->path() / "device", *scenario, options, out);
+    const std::filesystem::path root = temporary->path() / "device";
+    host::RunningApplications applications(root);
+    const host::TerminationGuard guard([&applications, &temporary] {
+        applications.end();
+        temporary->remove();
+    });
+    return playOn(root, applications, *scenario, options, out);
 }
 
 } // namespace nimbra::cli

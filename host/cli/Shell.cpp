@@ -2,6 +2,7 @@
 
 #include "host/cli/DeviceLocation.h"
 #include "host/cli/ShellWords.h"
+#include "host/cli/TextLayout.h"
 #include "host/core/PaneSession.h"
 
 #include <algorithm>
@@ -118,7 +119,7 @@ std::string Shell::takeChanges() {
 
 int Shell::perform(const std::string& line) {
     if (const Outcome outcome = dispatch(line); !outcome) {
-        _messages << "settingsctl: " << outcome.error().message << '\n' << std::flush;
+        _messages << "settingsctl: " << printable(outcome.error().message) << '\n' << std::flush;
         return outcome.error().exitStatus;
     }
     return exitDone;
@@ -151,6 +152,10 @@ LineEditor::Completion Shell::completionsFor(std::string_view line) const {
     const std::string typed = startsWord ? std::string() : split.words.back();
     const std::size_t place = split.words.size() - (startsWord ? 0 : 1);
 
+    const auto startsAsTyped = [&typed](const std::string& choice) {
+        return choice.starts_with(typed);
+    };
+
     std::vector<std::string> choices;
     if (place == 0) {
         std::ranges::transform(commands(), std::back_inserter(choices),
@@ -162,13 +167,16 @@ LineEditor::Completion Shell::completionsFor(std::string_view line) const {
             choices = {"--json"};
         } else if (place == 1 && command->arguments != Arguments::none) {
             choices = _commands.rowNames();
+            if (std::ranges::none_of(choices, startsAsTyped)) {
+                choices = _commands.rowIdentifiers();
+            }
         } else if (place == 2 && command->arguments == Arguments::rowAndValue) {
             choices = {"on", "off"};
         }
     }
     LineEditor::Completion completion{.replaced = line.size() - split.lastStart, .candidates = {}};
     for (const std::string& choice : choices) {
-        if (choice.starts_with(typed)) {
+        if (startsAsTyped(choice)) {
             completion.candidates.push_back(quotedWord(choice));
         }
     }

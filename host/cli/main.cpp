@@ -100,15 +100,17 @@ Outcome runOnPane(const Arguments& arguments) {
     }
 }
 
-/// The rows' names, where that makes no device and says nothing of what is wrong: whoever presses
-/// the tabulator did not ask for either.
-void printRowNames(const Arguments& arguments) {
+/// What rows can be called by, where that makes no device and says nothing of what is wrong:
+/// whoever presses the tabulator did not ask for either.
+void printRows(const Arguments& arguments,
+               std::vector<std::string> (PaneCommands::*names)() const) {
     std::error_code ignored;
     if (!std::filesystem::exists(arguments.root.value_or(defaultDeviceDirectory()), ignored)) {
         return;
     }
     if (const auto session = openPane(arguments)) {
-        for (const std::string& name : PaneCommands(**session, std::cout).rowNames()) {
+        const PaneCommands commands(**session, std::cout);
+        for (const std::string& name : (commands.*names)()) {
             std::cout << name << '\n';
         }
     }
@@ -117,7 +119,7 @@ void printRowNames(const Arguments& arguments) {
 int runShell(const Arguments& arguments) {
     const auto session = openPane(arguments);
     if (!session) {
-        std::cerr << "settingsctl: " << session.error().message << '\n';
+        std::cerr << "settingsctl: " << printable(session.error().message) << '\n';
         return session.error().exitStatus;
     }
     showActivity(**session, std::cerr);
@@ -139,7 +141,10 @@ Outcome run(const Arguments& arguments) {
         std::cout << (arguments.shellName == "bash" ? bashCompletion() : zshCompletion());
         return {};
     case Command::completeRows:
-        printRowNames(arguments);
+        printRows(arguments, &PaneCommands::rowNames);
+        return {};
+    case Command::completeIdentifiers:
+        printRows(arguments, &PaneCommands::rowIdentifiers);
         return {};
     default:
         return runOnPane(arguments);
@@ -155,7 +160,7 @@ int runProgram(int count, char** words) {
         return runShell(*arguments);
     }
     if (const Outcome outcome = run(*arguments); !outcome) {
-        std::cerr << "settingsctl: " << outcome.error().message << '\n';
+        std::cerr << "settingsctl: " << printable(outcome.error().message) << '\n';
         return outcome.error().exitStatus;
     }
     return exitDone;

@@ -159,7 +159,7 @@ void PaneSession::becomeActive() {
 }
 
 void PaneSession::post(const Notification& notification) {
-    _services->notificationCenter.postNotification(notification);
+    _services->notificationCenter->postNotification(notification);
 }
 
 void PaneSession::setActivityObserver(std::function<void()> observer) {
@@ -240,7 +240,7 @@ std::expected<UserInfo, Error> PaneSession::userInfoFor(const PaneEntry& entry) 
     }
     if (entry.firstSetup.value_or(false)) {
         const std::shared_ptr<Account> account =
-            _services->accountStore.accountWithIdentifier(AccountIdentifier(*identifier));
+            _services->accountStore->accountWithIdentifier(AccountIdentifier(*identifier));
         userInfo.emplace(AccountKey, _tracer ? _tracer->traced(account) : account);
     } else {
         userInfo.emplace(AccountIdentifierKey, Text(*identifier));

@@ -24,6 +24,13 @@ RowKind kindOf(CellType cell) {
     return RowKind::group;
 }
 
+/// A row may name an application without wanting its icon.
+Text iconOf(const Specifier& row) {
+    return boolValue(row.propertyForKey(LazyIconLoading))
+               ? textValue(row.propertyForKey(LazyIconAppID))
+               : Text();
+}
+
 } // namespace
 
 std::string kindName(RowKind kind) {
@@ -49,7 +56,7 @@ RowDescription RowDescription::of(const Specifier& row) {
             .value = row.value(),
             .footer = textValue(row.propertyForKey(FooterTextGroupKey)),
             .footerClass = textValue(row.propertyForKey(FooterCellClassGroupKey)),
-            .icon = Text(),
+            .icon = iconOf(row),
             .detail = detail != nullptr ? std::optional(detail->name) : std::nullopt};
 }
 

@@ -3,6 +3,7 @@
 #include "host/core/RowDescription.h"
 
 #include <algorithm>
+#include <utility>
 #include <vector>
 
 namespace nimbra::host {
@@ -29,6 +30,28 @@ std::string joined(const std::vector<std::string>& pieces) {
     return list;
 }
 
+// More than these would be read by nobody.
+constexpr std::size_t mostNamed = 8;
+
+/// The first of `pieces`, each once, and how many more there are.
+std::string firstOf(std::vector<std::string> pieces) {
+    // In a list sorted by name the same ones stand together.
+    pieces.erase(std::ranges::unique(pieces).begin(), pieces.end());
+    const std::size_t more = pieces.size() > mostNamed ? pieces.size() - mostNamed : 0;
+    pieces.resize(pieces.size() - more);
+    return joined(pieces) + (more > 0 ? " and " + std::to_string(more) + " more" : "");
+}
+
+/// Whether `part` stands in `text`, whatever the case of the letters of English: who mistypes an
+/// identifier or a name mistypes these.
+bool contains(std::string_view text, std::string_view part) {
+    const auto lower = [](char character) {
+        return character >= 'A' && character <= 'Z' ? static_cast<char>(character - 'A' + 'a')
+                                                    : character;
+    };
+    return !std::ranges::search(text, part, {}, lower, lower).empty();
+}
+
 std::string withArticle(const Specifier& row) {
     switch (row.cellType()) {
     case GroupCell:
@@ -45,14 +68,25 @@ std::string withArticle(const Specifier& row) {
 
 RowRefusal noSuchRow(const SpecifierArray& rows, std::string_view name) {
     std::vector<std::string> known;
+    std::vector<std::string> alike;
     for (const auto& row : rows) {
-        if (row->cellType() != GroupCell && row->label()) {
-            known.push_back(quoted(*row));
+        if (row->cellType() == GroupCell || !row->label()) {
+            continue;
+        }
+        known.push_back(quoted(*row));
+        if (contains(row->name().string(), name) || contains(row->identifier().string(), name)) {
+            alike.push_back(known.back());
         }
     }
-    return {Reason::noSuchRow,
-            "no row " + quoted(name) +
-                (known.empty() ? " (the list has no rows)" : " (rows: " + joined(known) + ')')};
+    if (known.empty()) {
+        return {Reason::noSuchRow, "no row " + quoted(name) + " (the list has no rows)"};
+    }
+    const bool isNarrower =
+        known.size() > mostNamed && !alike.empty() && alike.size() < known.size();
+    return {Reason::noSuchRow, "no row " + quoted(name) +
+                                   (isNarrower ? " (rows like it: " + firstOf(std::move(alike))
+                                               : " (rows: " + firstOf(std::move(known))) +
+                                   ')'};
 }
 
 RowRefusal ambiguous(const SpecifierArray& matches, std::string_view name) {
@@ -66,7 +100,7 @@ RowRefusal ambiguous(const SpecifierArray& matches, std::string_view name) {
             quoted(name) + " stands for " + std::to_string(matches.size()) + " rows" +
                 (identifiers.empty()
                      ? ", and none has an identifier"
-                     : " (name one by its identifier: " + joined(identifiers) + ')')};
+                     : " (name one by its identifier: " + firstOf(std::move(identifiers)) + ')')};
 }
 
 RowRefusal locked(const Specifier& row) {

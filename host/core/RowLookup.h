@@ -37,7 +37,7 @@ struct RowRefusal {
 };
 
 /// The row of `rows` that `name` stands for: the one with that identifier, or else the one with
-/// that name as shown.
+/// that name as shown. A refusal names the rows that may have been meant, but never hundreds.
 [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
 findRow(const SpecifierArray& rows, std::string_view name);
 

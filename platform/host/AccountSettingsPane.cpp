@@ -23,11 +23,11 @@ AccountOperationsHelper& AccountSettingsPane::accountOperationsHelper() {
 }
 
 void AccountSettingsPane::showActivityInProgressUIWithMessage(const Text& message) {
-    services().presenter.showActivityInProgress(message);
+    services().presenter->showActivityInProgress(message);
 }
 
 void AccountSettingsPane::hideActivityInProgressUI() {
-    services().presenter.hideActivityInProgress();
+    services().presenter->hideActivityInProgress();
 }
 
 } // namespace nimbra

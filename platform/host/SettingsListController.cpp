@@ -113,20 +113,20 @@ void SettingsListController::setObserver(SettingsListObserver* observer) {
     _observer = observer;
 }
 
-void SettingsListController::reloadParentSpecifier() {
-    _services.presenter.reloadParentSpecifier();
+void SettingsListController::reloadParentSpecifier() const {
+    _services.presenter->reloadParentSpecifier();
 }
 
-void SettingsListController::reloadAllParentSpecifiers() {
-    _services.presenter.reloadAllParentSpecifiers();
+void SettingsListController::reloadAllParentSpecifiers() const {
+    _services.presenter->reloadAllParentSpecifiers();
 }
 
-void SettingsListController::dismissViewControllerAnimated(bool animated) {
-    _services.presenter.dismissPresentedController(animated);
+void SettingsListController::dismissViewControllerAnimated(bool animated) const {
+    _services.presenter->dismissPresentedController(animated);
 }
 
-void SettingsListController::dismissAnimated(bool animated) {
-    _services.presenter.dismissPane(animated);
+void SettingsListController::dismissAnimated(bool animated) const {
+    _services.presenter->dismissPane(animated);
 }
 
 std::optional<std::size_t>

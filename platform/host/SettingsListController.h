@@ -73,12 +73,12 @@ protected:
     [[nodiscard]] const PlatformServices& services() const { return _services; }
 
     /// Draws the row anew that opened this page, or the rows on every page above it.
-    void reloadParentSpecifier();
-    void reloadAllParentSpecifiers();
+    void reloadParentSpecifier() const;
+    void reloadAllParentSpecifiers() const;
 
     /// Takes away the screen presented over this page, or this page itself.
-    void dismissViewControllerAnimated(bool animated);
-    void dismissAnimated(bool animated);
+    void dismissViewControllerAnimated(bool animated) const;
+    void dismissAnimated(bool animated) const;
 
     /// Where `row` stands in the list; nothing when it is not in it.
     [[nodiscard]] std::optional<std::size_t>

@@ -1,5 +1,6 @@
 #include "platform/host/Specifier.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace nimbra {
@@ -25,12 +26,19 @@ const Text& Specifier::label() const {
 }
 
 RowValue Specifier::propertyForKey(const PropertyKey& key) const {
-    const auto entry = _properties.find(key);
+    const auto entry =
+        std::ranges::find(_properties, key, &decltype(_properties)::value_type::first);
     return entry != _properties.end() ? entry->second : RowValue();
 }
 
 void Specifier::setPropertyForKey(RowValue value, const PropertyKey& key) {
-    _properties.insert_or_assign(key, std::move(value));
+    const auto entry =
+        std::ranges::find(_properties, key, &decltype(_properties)::value_type::first);
+    if (entry != _properties.end()) {
+        entry->second = std::move(value);
+    } else {
+        _properties.emplace_back(key, std::move(value));
+    }
 }
 
 void Specifier::setUserInfo(UserInfo userInfo) {

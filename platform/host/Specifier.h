@@ -5,8 +5,8 @@
 #include "platform/values/UserInfo.h"
 
 #include <functional>
-#include <map>
 #include <memory>
+#include <utility>
 #include <vector>
 
 namespace nimbra {
@@ -27,6 +27,10 @@ inline const PropertyKey FooterTextGroupKey{"FooterTextGroupKey"};
 inline const PropertyKey FooterCellClassGroupKey{"FooterCellClassGroupKey"};
 /// Boolean: false for a row that is shown but cannot be changed. Absent means true.
 inline const PropertyKey EnabledKey{"EnabledKey"};
+/// Text: the application whose icon stands beside the row; the host fetches it when it is needed.
+inline const PropertyKey LazyIconAppID{"LazyIconAppID"};
+/// Boolean: whether the host is to fetch an icon for the row.
+inline const PropertyKey LazyIconLoading{"LazyIconLoading"};
 
 /// User info, account object: the account that a pane is opened on.
 inline const UserInfoKey AccountKey{"AccountKey"};
@@ -105,7 +109,8 @@ private:
     Text _name;
     Row _row;
     Action _buttonAction;
-    std::map<PropertyKey, RowValue> _properties;
+    /// A row has few of them, and a list may have many rows.
+    std::vector<std::pair<PropertyKey, RowValue>> _properties;
     UserInfo _userInfo;
 };
 

@@ -3,6 +3,8 @@
 #include "platform/values/Identifier.h"
 #include "platform/values/Text.h"
 
+#include <optional>
+
 namespace nimbra {
 
 /// A folder of code and resources that belong together. Any queue.
@@ -13,7 +15,8 @@ public:
     Bundle& operator=(const Bundle&) = delete;
     virtual ~Bundle() = default;
 
-    [[nodiscard]] virtual const BundleIdentifier& identifier() const = 0;
+    /// Absent for a folder that does not say what it is called.
+    [[nodiscard]] virtual const std::optional<BundleIdentifier>& identifier() const = 0;
 
     /// The text under `key` in the string table `table`, in the best language that the bundle has
     /// for the user. Where no table has the key, `value` comes back: the very object passed in.

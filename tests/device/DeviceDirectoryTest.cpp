@@ -101,8 +101,10 @@ TEST_F(DeviceDirectoryTest, NothingButTheDeviceIsLeft) {
         names.insert(name);
     }
     const std::string base = "device/var/lib/nimbra";
-    EXPECT_EQ(names, (std::set<std::string>{"device", "device/var", "device/var/lib", base,
-                                            base + "/accounts.db", base + "/device.json",
+    EXPECT_EQ(names, (std::set<std::string>{"device", "device/usr", "device/usr/share",
+                                            "device/usr/share/applications", "device/var",
+                                            "device/var/lib", base, base + "/accounts.db",
+                                            base + "/consent.db", base + "/device.json",
                                             base + "/documents.json", base + "/preferences",
                                             base + "/restrictions.json"}));
 }
@@ -125,7 +127,7 @@ TEST_F(DeviceDirectoryTest, AnEmptyDirectoryIsFilledAndStaysTheSame) {
 
     ASSERT_TRUE(created) << created.error();
     EXPECT_TRUE(std::filesystem::is_symlink(link));
-    EXPECT_EQ(std::distance(std::filesystem::directory_iterator(root()), {}), 1);
+    EXPECT_EQ(std::distance(std::filesystem::directory_iterator(root()), {}), 2);
     EXPECT_TRUE(std::filesystem::exists(state("accounts.db")));
 }
 

@@ -1,11 +1,14 @@
 #include "device/DevicePlatform.h"
 
 #include "device/DeviceDirectory.h"
+#include "device/store/ConsentBundle.h"
 #include "device/store/DeviceAccountStore.h"
+#include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DevicePreferences.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/DeviceWorkQueues.h"
 #include "platform/accounts/AccountStore.h"
+#include "platform/apps/Applications.h"
 #include "platform/documents/DocumentContainers.h"
 #include "platform/system/FileManager.h"
 #include "platform/system/Localization.h"
@@ -69,17 +72,48 @@ TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
 
     const PlatformServices services = platform->servicesFor(presenter);
 
-    EXPECT_EQ(&services.presenter, &presenter);
-    EXPECT_TRUE(services.accountStore.accountWithIdentifier(AccountIdentifier("primary")));
-    EXPECT_EQ(services.fileManager.tidewaterIdentityToken(), Text("token"));
-    EXPECT_EQ(services.documentContainers.allContainers().size(), 1U);
-    EXPECT_EQ(services.localization.currentLocale(), Locale{"fr"});
-    EXPECT_EQ(&services.workQueues.mainQueue(), &mainQueue());
+    EXPECT_EQ(services.presenter.operator->(), &presenter);
+    EXPECT_TRUE(services.accountStore->accountWithIdentifier(AccountIdentifier("primary")));
+    EXPECT_EQ(services.fileManager->tidewaterIdentityToken(), Text("token"));
+    EXPECT_EQ(services.documentContainers->allContainers().size(), 1U);
+    EXPECT_EQ(services.localization->currentLocale(), Locale{"fr"});
+    EXPECT_EQ(&services.workQueues->mainQueue(), &mainQueue());
     EXPECT_EQ(platform->accountStore().accountIdentifiers(),
               std::vector{AccountIdentifier("primary")});
     EXPECT_EQ(platform->preferences().integer("domain", "level"), 4);
     EXPECT_EQ(platform->settings().localeIdentifier(), "fr");
     EXPECT_TRUE(platform->systemLog().isEnabled(LogLevel::error));
+}
+
+TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
+    const std::string odd = " \n😀 \\ دفتر ";
+    DeviceDescription description;
+    description.apps = {{.identifier = "com/a", .name = odd, .entitlements = {{"key", odd}}},
+                        {.identifier = "com.b", .name = "B", .removedSystemApp = true}};
+    description.consent = {{.service = kPRVServiceTidewater.string(), .bundle = "com/a"}};
+    const auto place = root() / "other";
+    ASSERT_TRUE(createDeviceDirectory(place, description));
+    const auto platform = DevicePlatform::open(place, mainQueue());
+    ASSERT_TRUE(platform) << platform.error();
+    std::vector<std::string> calls;
+    test::RecordingPresenter presenter(calls);
+
+    const PlatformServices services = (*platform)->servicesFor(presenter);
+    const auto first =
+        services.applications->applicationProxyForIdentifier(BundleIdentifier("com/a"));
+    const auto second =
+        services.applications->applicationProxyForIdentifier(BundleIdentifier("com.b"));
+    const auto records =
+        services.privacyConsentStore->PRVAccessCopyInformation(kPRVServiceTidewater);
+
+    ASSERT_TRUE(first && second);
+    EXPECT_EQ(first->localizedName(), Text(odd));
+    EXPECT_FALSE(first->isRemovedSystemApp());
+    EXPECT_EQ(first->entitlements(), (Entitlements{{"key", {odd}}}));
+    EXPECT_TRUE(second->isRemovedSystemApp());
+    ASSERT_TRUE(records && records->size() == 1);
+    EXPECT_EQ(records->front().kPRVInfoBundle->identifier(), BundleIdentifier("com/a"));
+    EXPECT_EQ(records->front().kPRVInfoGranted, std::nullopt);
 }
 
 TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
@@ -88,7 +122,7 @@ TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
     test::RecordingPresenter presenter(calls);
     std::promise<void> completed;
 
-    platform->servicesFor(presenter).documentContainers.forceRefreshAllContainersWithCompletion(
+    platform->servicesFor(presenter).documentContainers->forceRefreshAllContainersWithCompletion(
         [&completed] { completed.set_value(); });
 
     completed.get_future().wait();
@@ -99,12 +133,12 @@ TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
     test::RecordingPresenter presenter(calls);
     auto platform = open();
     const PlatformServices services = platform->servicesFor(presenter);
-    const auto queue = services.workQueues.serialQueueWithLabel("late");
+    const auto queue = services.workQueues->serialQueueWithLabel("late");
     std::promise<void> start;
     std::size_t found = 0;
     queue->async([&] {
         start.get_future().wait();
-        found = services.documentContainers.allContainers().size();
+        found = services.documentContainers->allContainers().size();
     });
     start.set_value();
 
@@ -119,6 +153,32 @@ TEST_F(DevicePlatformTest, OpeningAndReadingLeavesTheDirectoryAsItWas) {
     EXPECT_TRUE(open()->accountStore().accountIdentifiers());
 
     EXPECT_EQ(test::treeOf(root()), before);
+}
+
+TEST_F(DevicePlatformTest, ADeviceOfAnEarlierVersionHasNoConsentUntilSomeIsGiven) {
+    std::filesystem::remove(state("consent.db"));
+    const auto platform = open();
+    std::vector<std::string> calls;
+    test::RecordingPresenter presenter(calls);
+    PrivacyConsentStore& store = platform->servicesFor(presenter).privacyConsentStore;
+    const ConsentBundle bundle{BundleIdentifier("a")};
+
+    const auto before = store.PRVAccessCopyInformation(kPRVServiceTidewater);
+    EXPECT_TRUE(store.PRVAccessSetForBundle(kPRVServiceTidewater, &bundle, true));
+    const auto after = store.PRVAccessCopyInformation(kPRVServiceTidewater);
+
+    ASSERT_TRUE(before);
+    EXPECT_TRUE(before->empty());
+    ASSERT_TRUE(after);
+    EXPECT_EQ(after->size(), 1U);
+    EXPECT_EQ(&store, &platform->privacyConsentStore());
+    EXPECT_TRUE(std::filesystem::exists(state("consent.db")));
+}
+
+TEST_F(DevicePlatformTest, ADamagedConsentDatabaseIsReportedAndLeftAsItWas) {
+    test::writeTestFile(state("consent.db"), std::string(4096, '?'));
+
+    expectRefusal("consent.db", "not a consent database: file is not a database");
 }
 
 TEST_F(DevicePlatformTest, ADirectoryThatIsNoDeviceIsReported) {

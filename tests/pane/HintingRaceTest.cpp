@@ -48,18 +48,9 @@ struct HintingRaceTest : PaneFixture {
     PumpedQueue mainQueue{"main"};
 
     [[nodiscard]] PlatformServices servicesOver(WorkQueues& queues) {
-        const PlatformServices fakes = platform.services();
-        return {.presenter = fakes.presenter,
-                .accountStore = fakes.accountStore,
-                .documentContainers = fakes.documentContainers,
-                .notificationCenter = fakes.notificationCenter,
-                .workQueues = queues,
-                .fileManager = fakes.fileManager,
-                .bundles = fakes.bundles,
-                .localization = fakes.localization,
-                .deviceInfo = fakes.deviceInfo,
-                .restrictions = fakes.restrictions,
-                .systemLog = fakes.systemLog};
+        PlatformServices services = platform.services();
+        services.workQueues = queues;
+        return services;
     }
 
     void postChange() {

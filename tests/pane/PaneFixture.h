@@ -17,10 +17,13 @@ namespace nimbra::test {
 /// The pane with rows around the master switch, which a test lists.
 class PaneWithRows final : public RSPNimbraDriveViewController {
 public:
+    using RSPNimbraDriveViewController::_accessCache;
+    using RSPNimbraDriveViewController::_appAccessGrantedForBundleID;
     using RSPNimbraDriveViewController::_createSpecifiersForCellularSwitchCell;
     using RSPNimbraDriveViewController::_registerContainerPriorityHinting;
     using RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState;
     using RSPNimbraDriveViewController::_reloadVantrelAccount;
+    using RSPNimbraDriveViewController::_setAppAccessGrantedForBundleID;
     using RSPNimbraDriveViewController::_vantrelAccount;
     using RSPNimbraDriveViewController::RSPNimbraDriveViewController;
 
@@ -29,8 +32,15 @@ public:
         _vantrelAccount()->setEnabledForDataclass(on, kAccountDataclassTidewater);
     }
 
+    SpecifierArray _appSpecifiersForPRVServices() override {
+        ++appQueries;
+        asked.emplace_back("apps");
+        return apps ? *apps : RSPNimbraDriveViewController::_appSpecifiersForPRVServices();
+    }
+
     std::shared_ptr<Specifier> upgrade;
-    SpecifierArray apps;
+    /// Absent: the rows that the page itself makes of the consent records.
+    std::optional<SpecifierArray> apps = SpecifierArray();
     std::shared_ptr<Specifier> tessary;
     std::optional<SpecifierArray> diagnostics;
     int appQueries = 0;
@@ -41,11 +51,6 @@ protected:
     std::shared_ptr<Specifier> _createSpecifierForUpgradeButton() override {
         asked.emplace_back("upgrade");
         return upgrade;
-    }
-    SpecifierArray _appSpecifiersForPRVServices() override {
-        ++appQueries;
-        asked.emplace_back("apps");
-        return apps;
     }
     std::shared_ptr<Specifier> _specifierForTessary() override {
         asked.emplace_back("tessary");

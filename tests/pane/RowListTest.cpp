@@ -55,13 +55,18 @@ TEST_F(RowListTest, AppsStandBehindTheirGroupByNameWithoutCaseAndWithNumbersByVa
 
 TEST_F(RowListTest, AppsWithEqualNamesKeepTheOrderInWhichTheyCame) {
     storeTidewater(true);
-    const auto first = row("Notes");
-    const auto second = row("notes");
-    first->setIdentifier("first");
-    second->setIdentifier("second");
-    pane->apps = {first, second};
+    // More than a sort would keep in order by chance.
+    constexpr int count = 40;
+    pane->apps.emplace();
+    std::string expected = "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPUIApps";
+    for (int index = count; index > 0; --index) {
+        const auto app = row(index % 2 == 0 ? "Notes" : "notes");
+        app->setIdentifier("app-" + std::to_string(index));
+        pane->apps->push_back(app);
+        expected += " app-" + std::to_string(index);
+    }
 
-    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPUIApps first second");
+    EXPECT_EQ(rows(), expected);
 }
 
 TEST_F(RowListTest, WithoutAppsThereIsNoGroupOfApps) {

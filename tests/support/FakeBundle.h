@@ -3,17 +3,25 @@
 #include "platform/system/Bundle.h"
 
 #include <map>
+#include <optional>
 #include <string>
 #include <utility>
 
 namespace nimbra::test {
 
-/// The pane's bundle, with the one string table "Localizable" that a test gives it.
+/// A bundle with the one string table "Localizable" that a test gives it.
 class FakeBundle final : public Bundle {
 public:
-    explicit FakeBundle(std::map<std::string, Text> texts) : _texts(std::move(texts)) {}
+    /// The pane's bundle.
+    explicit FakeBundle(std::map<std::string, Text> texts)
+        : FakeBundle(BundleIdentifier("com.vantrel.NimbraDriveSettings"), std::move(texts)) {}
+    explicit FakeBundle(std::optional<BundleIdentifier> identifier,
+                        std::map<std::string, Text> texts = {})
+        : _identifier(std::move(identifier)), _texts(std::move(texts)) {}
 
-    [[nodiscard]] const BundleIdentifier& identifier() const override { return _identifier; }
+    [[nodiscard]] const std::optional<BundleIdentifier>& identifier() const override {
+        return _identifier;
+    }
     [[nodiscard]] Text localizedStringForKeyValueTable(const Text& key, const Text& value,
                                                        const Text& table) const override {
         const auto entry = _texts.find(key.string());
@@ -21,7 +29,7 @@ public:
     }
 
 private:
-    BundleIdentifier _identifier{"com.vantrel.NimbraDriveSettings"};
+    std::optional<BundleIdentifier> _identifier;
     std::map<std::string, Text> _texts;
 };
 

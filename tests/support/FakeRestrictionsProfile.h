@@ -2,6 +2,8 @@
 
 #include "platform/system/RestrictionsProfile.h"
 
+#include <set>
+
 namespace nimbra::test {
 
 class FakeRestrictionsProfile final : public RestrictionsProfile {
@@ -10,7 +12,12 @@ public:
         return allowsCellularModification;
     }
 
+    [[nodiscard]] bool isCloudSyncAllowed(const BundleIdentifier& bundle) const override {
+        return !cloudSyncDenied.contains(bundle);
+    }
+
     bool allowsCellularModification = true;
+    std::set<BundleIdentifier> cloudSyncDenied;
 };
 
 } // namespace nimbra::test

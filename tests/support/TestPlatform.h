@@ -3,11 +3,14 @@
 #include "device/system/DeviceNotificationCenter.h"
 #include "platform/PlatformServices.h"
 #include "tests/support/FakeAccountStore.h"
+#include "tests/support/FakeAppTerminator.h"
+#include "tests/support/FakeApplications.h"
 #include "tests/support/FakeBundles.h"
 #include "tests/support/FakeDeviceInfo.h"
 #include "tests/support/FakeDocumentContainers.h"
 #include "tests/support/FakeFileManager.h"
 #include "tests/support/FakeLocalization.h"
+#include "tests/support/FakePrivacyConsentStore.h"
 #include "tests/support/FakeRestrictionsProfile.h"
 #include "tests/support/FakeSystemLog.h"
 #include "tests/support/PumpedQueues.h"
@@ -32,6 +35,9 @@ struct TestPlatform {
     FakeLocalization localization;
     FakeDeviceInfo deviceInfo;
     FakeRestrictionsProfile restrictions;
+    FakePrivacyConsentStore privacyConsentStore{calls};
+    FakeApplications applications;
+    FakeAppTerminator appTerminator{calls};
     FakeSystemLog systemLog;
 
     [[nodiscard]] PlatformServices services() {
@@ -45,6 +51,9 @@ struct TestPlatform {
                 .localization = localization,
                 .deviceInfo = deviceInfo,
                 .restrictions = restrictions,
+                .privacyConsentStore = privacyConsentStore,
+                .applications = applications,
+                .appTerminator = appTerminator,
                 .systemLog = systemLog};
     }
 };

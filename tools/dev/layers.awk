@@ -25,7 +25,7 @@ BEGIN {
     library("unicode/", "device host/cli")
     library("archive", "device tools")
     library("spdlog/|fmt/", "device")
-    library("systemd/", "device")
+    library("systemd/|sdbus-c[+][+]/", "device")
     library("nlohmann/", "device host/core host/cli host/qt")
     library("CLI/", "host/cli tools")
     library("histedit|editline/", "host/cli")

@@ -11,6 +11,45 @@ _settingsctl_unquoted() {
     printf %s "$word"
 }
 
+# The text $1 without the backslashes that keep its characters from meaning something else.
+_settingsctl_unescaped() {
+    local text=$1 index
+    for ((index = 0; index < ${#text}; index++)); do
+        [[ ${text:index:1} != \\ ]] || ((index++))
+        printf %s "${text:index:1}"
+    done
+}
+
+# Completes the word $1 to the lines that the command behind it prints. A row's name may hold
+# anything: it is compared as it is meant, and completed as it has to be typed.
+_settingsctl_rows() {
+    local current=$1 typed row
+    shift
+    case $current in
+    \'*) typed=${current:1} ;;
+    \"*) typed=$(_settingsctl_unescaped "${current:1}") ;;
+    *) typed=$(_settingsctl_unescaped "$current") ;;
+    esac
+    while IFS= read -r row; do
+        [[ $row == "$typed"* ]] || continue
+        case $current in
+        \'*) row=${row//\'/\'\\\'\'} ;;
+        \"*)
+            row=${row//\\/\\\\}
+            row=${row//\"/\\\"}
+            row=${row//\$/\\\$}
+            row=${row//\`/\\\`}
+            ;;
+        *)
+            printf -v row %q "$row"
+            # These end a word of the line.
+            [[ $row == \$\'* ]] || { row=${row//:/\\:} && row=${row//=/\\=}; }
+            ;;
+        esac
+        COMPREPLY+=("$row")
+    done < <("$@" 2>/dev/null)
+}
+
 _settingsctl() {
     local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
     local commands="list get set tap init play shell completion"
@@ -66,17 +105,12 @@ _settingsctl() {
     case $command:$place in
     :0) mapfile -t COMPREPLY < <(compgen -W "$commands" -- "$current") ;;
     get:0 | set:0 | tap:0)
-        # A row's name may hold blanks: compared as it is meant, completed as it has to be typed.
-        local typed row
-        typed=${current#[\"\']}
-        typed=${typed//\\/}
-        while IFS= read -r row; do
-            [[ $row == "$typed"* ]] || continue
-            case $current in
-            [\"\']*) COMPREPLY+=("$row") ;;
-            *) COMPREPLY+=("$(printf %q "$row")") ;;
-            esac
-        done < <("${COMP_WORDS[0]}" "${page[@]}" complete-rows 2>/dev/null)
+        # By identifier where nothing is called like what was typed.
+        local names
+        for names in complete-rows complete-identifiers; do
+            _settingsctl_rows "$current" "${COMP_WORDS[0]}" "${page[@]}" "$names"
+            ((${#COMPREPLY[@]} == 0)) || break
+        done
         ;;
     set:1) mapfile -t COMPREPLY < <(compgen -W "on off" -- "$current") ;;
     init:0)

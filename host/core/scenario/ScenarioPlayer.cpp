@@ -4,9 +4,11 @@
 #include "device/DevicePlatform.h"
 #include "device/bundles/DeviceBundles.h"
 #include "device/store/DeviceAccountStore.h"
+#include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceSettings.h"
 #include "host/core/PaneSession.h"
 #include "host/core/RowDescription.h"
+#include "host/core/scenario/RunningApplications.h"
 #include "host/core/trace/Trace.h"
 
 #include <algorithm>
@@ -57,8 +59,9 @@ const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& nam
     return handler != handlers.end() ? handler : nullptr;
 }
 
-ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session, Trace& trace)
-    : _scenario(scenario), _session(session), _trace(trace) {}
+ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session,
+                               RunningApplications& applications, Trace& trace)
+    : _scenario(scenario), _session(session), _applications(applications), _trace(trace) {}
 
 std::expected<void, StepFailure> ScenarioPlayer::play() {
     applyToSession(_scenario.device);
@@ -87,6 +90,7 @@ void ScenarioPlayer::applyToSession(const device::GivenDescription& given) {
     }
     if (given.keys.contains("faults")) {
         _session.device().accountStore().planSaveOutcomes(given.description.saveFaults);
+        _session.device().privacyConsentStore().planSetOutcomes(given.description.consentSetFaults);
     }
 }
 
@@ -189,6 +193,12 @@ ScenarioPlayer::Outcome ScenarioPlayer::change(const ScenarioStep& step) {
     }
     if (const auto reloaded = _session.device().settings().reload(); !reloaded) {
         return std::unexpected(reloaded.error().description);
+    }
+    if (change.keys.contains("apps")) {
+        const auto running = _applications.setRunning(change.description.runningApplications());
+        if (!running) {
+            return std::unexpected(running.error().description);
+        }
     }
     applyToSession(change);
     return {};

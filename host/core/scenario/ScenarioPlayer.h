@@ -9,6 +9,7 @@
 namespace nimbra::host {
 
 class PaneSession;
+class RunningApplications;
 class Trace;
 
 /// The step that could not be done, and why.
@@ -23,9 +24,10 @@ struct StepFailure {
 /// each step it waits until nothing is left to do. Main queue.
 class ScenarioPlayer {
 public:
-    /// `session` uses the device that was made from the scenario's description, and traces to
-    /// `trace`. None is owned; all outlive the player.
-    ScenarioPlayer(const Scenario& scenario, PaneSession& session, Trace& trace);
+    /// `session` uses the device that was made from the scenario's description, on which
+    /// `applications` run, and traces to `trace`. None is owned; all outlive the player.
+    ScenarioPlayer(const Scenario& scenario, PaneSession& session,
+                   RunningApplications& applications, Trace& trace);
 
     /// Does all steps, or those up to the first that cannot be done, and ends the trace.
     [[nodiscard]] std::expected<void, StepFailure> play();
@@ -55,6 +57,7 @@ private:
 
     const Scenario& _scenario;
     PaneSession& _session;
+    RunningApplications& _applications;
     Trace& _trace;
 };
 

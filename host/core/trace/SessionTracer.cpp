@@ -12,8 +12,10 @@ SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
     : _services(services), _trace(trace), _presenter(services.presenter, trace),
       _accountStore(services.accountStore, trace),
       _documentContainers(services.documentContainers, trace),
-      _notificationCenter(services.notificationCenter, "local", trace), _systemLog(trace),
-      _table(trace), _parent(trace),
+      _notificationCenter(services.notificationCenter, "local", trace),
+      _privacyConsentStore(services.privacyConsentStore, trace),
+      _appTerminator(services.appTerminator, trace), _systemLog(trace), _table(trace),
+      _parent(trace),
       _earlierSyslogSink(replaceSyslogSink([&trace](int priority, const std::string& message) {
           trace.write("syslog", {{"priority", priority}, {"message", message}});
       })) {}
@@ -23,17 +25,15 @@ SessionTracer::~SessionTracer() {
 }
 
 PlatformServices SessionTracer::services() {
-    return {.presenter = _presenter,
-            .accountStore = _accountStore,
-            .documentContainers = _documentContainers,
-            .notificationCenter = _notificationCenter,
-            .workQueues = _services.workQueues,
-            .fileManager = _services.fileManager,
-            .bundles = _services.bundles,
-            .localization = _services.localization,
-            .deviceInfo = _services.deviceInfo,
-            .restrictions = _services.restrictions,
-            .systemLog = _systemLog};
+    PlatformServices services = _services;
+    services.presenter = _presenter;
+    services.accountStore = _accountStore;
+    services.documentContainers = _documentContainers;
+    services.notificationCenter = _notificationCenter;
+    services.privacyConsentStore = _privacyConsentStore;
+    services.appTerminator = _appTerminator;
+    services.systemLog = _systemLog;
+    return services;
 }
 
 std::shared_ptr<Account> SessionTracer::traced(std::shared_ptr<Account> account) const {

@@ -3,9 +3,11 @@
 #include "host/core/trace/ParentTracer.h"
 #include "host/core/trace/TableTracer.h"
 #include "host/core/trace/TracingAccountStore.h"
+#include "host/core/trace/TracingAppTerminator.h"
 #include "host/core/trace/TracingDocumentContainers.h"
 #include "host/core/trace/TracingNotificationCenter.h"
 #include "host/core/trace/TracingPresenter.h"
+#include "host/core/trace/TracingPrivacyConsentStore.h"
 #include "host/core/trace/TracingSystemLog.h"
 #include "platform/PlatformServices.h"
 #include "platform/system/Syslog.h"
@@ -51,6 +53,8 @@ private:
     TracingAccountStore _accountStore;
     TracingDocumentContainers _documentContainers;
     TracingNotificationCenter _notificationCenter;
+    TracingPrivacyConsentStore _privacyConsentStore;
+    TracingAppTerminator _appTerminator;
     TracingSystemLog _systemLog;
     TableTracer _table;
     ParentTracer _parent;

@@ -63,6 +63,53 @@ TEST(FilesTest, AWriteThatCannotEndLeavesNothingBeside) {
         (std::map<std::string, std::string>{{"place", "directory"}, {"place/taken", "directory"}}));
 }
 
+TEST(FilesTest, NewFilesAreReadableByEverybody) {
+    const test::TemporaryDirectory directory;
+    const std::map<std::string, std::string> files{{"a", "text"}, {"b", ""}};
+
+    ASSERT_TRUE(writeNewFiles(directory.path(), files));
+
+    EXPECT_EQ(test::treeOf(directory.path()), files);
+    using std::filesystem::perms;
+    EXPECT_EQ(std::filesystem::status(directory.path() / "a").permissions(),
+              perms::owner_read | perms::owner_write | perms::group_read | perms::others_read);
+}
+
+TEST(FilesTest, ManyNewFilesAreWrittenLikeFew) {
+    const test::TemporaryDirectory directory;
+    std::map<std::string, std::string> files;
+    for (int index = 0; index < 100; ++index) {
+        files.emplace(std::to_string(index), "content " + std::to_string(index));
+    }
+
+    ASSERT_TRUE(writeNewFiles(directory.path(), files));
+
+    EXPECT_EQ(test::treeOf(directory.path()), files);
+}
+
+TEST(FilesTest, ANewFileNeverTakesTheFileThatStandsThere) {
+    const test::TemporaryDirectory directory;
+    const auto path = directory.path() / "file";
+    test::writeTestFile(path, "mine");
+
+    const auto written = writeNewFiles(directory.path(), {{"file", "text"}});
+
+    ASSERT_FALSE(written);
+    EXPECT_EQ(written.error().description, path.string() + ": cannot be written: File exists");
+    EXPECT_EQ(test::contentOf(path), "mine");
+}
+
+TEST(FilesTest, NewFilesNeedTheirDirectory) {
+    const test::TemporaryDirectory directory;
+    const auto missing = directory.path() / "missing";
+
+    const auto written = writeNewFiles(missing, {});
+
+    ASSERT_FALSE(written);
+    EXPECT_EQ(written.error().description,
+              missing.string() + ": cannot be written: No such file or directory");
+}
+
 TEST(FilesTest, ADirectoryThatIsMissingCannotBeFlushed) {
     const test::TemporaryDirectory directory;
 

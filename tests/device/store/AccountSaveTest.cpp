@@ -1,10 +1,9 @@
 #include "device/store/DeviceAccount.h"
+#include "tests/device/FullDisk.h"
+#include "tests/device/ReadOnly.h"
 #include "tests/device/store/AccountStoreFixture.h"
 
 #include <SQLiteCpp/SQLiteCpp.h>
-#include <csignal>
-#include <sys/resource.h>
-#include <unistd.h>
 
 namespace nimbra::test {
 namespace {
@@ -12,62 +11,6 @@ namespace {
 const std::string kDatabase = "/var/lib/nimbra/accounts.db";
 
 struct AccountSaveTest : AccountStoreFixture {};
-
-/// While it lives, no file of this process can grow: the disk is full.
-class FullDisk {
-public:
-    FullDisk() : _handler(std::signal(SIGXFSZ, SIG_IGN)) {
-        ::getrlimit(RLIMIT_FSIZE, &_earlier);
-        rlimit none = _earlier;
-        none.rlim_cur = 0;
-        ::setrlimit(RLIMIT_FSIZE, &none);
-    }
-    FullDisk(const FullDisk&) = delete;
-    FullDisk& operator=(const FullDisk&) = delete;
-    ~FullDisk() {
-        ::setrlimit(RLIMIT_FSIZE, &_earlier);
-        static_cast<void>(std::signal(SIGXFSZ, _handler));
-    }
-
-private:
-    rlimit _earlier{};
-    void (*_handler)(int);
-};
-
-/// While it lives, `directory` and what is in it can only be read, also where the tests run as
-/// root.
-class ReadOnly {
-public:
-    explicit ReadOnly(std::filesystem::path directory) : _directory(std::move(directory)) {
-        permit(false);
-        if (::geteuid() == 0) {
-            constexpr uid_t nobody = 65534;
-            EXPECT_EQ(::seteuid(nobody), 0);
-        }
-    }
-    ReadOnly(const ReadOnly&) = delete;
-    ReadOnly& operator=(const ReadOnly&) = delete;
-    ~ReadOnly() {
-        if (::getuid() == 0) {
-            EXPECT_EQ(::seteuid(0), 0);
-        }
-        permit(true);
-    }
-
-private:
-    void permit(bool writing) const {
-        using std::filesystem::perms;
-        const perms write = writing ? perms::owner_write : perms::none;
-        const perms read = perms::owner_read | perms::group_read | perms::others_read;
-        const perms search = perms::owner_exec | perms::group_exec | perms::others_exec;
-        for (const auto& entry : std::filesystem::directory_iterator(_directory)) {
-            std::filesystem::permissions(entry.path(), read | write);
-        }
-        std::filesystem::permissions(_directory, read | search | write);
-    }
-
-    std::filesystem::path _directory;
-};
 
 TEST_F(AccountSaveTest, ASaveIsThereForANewConnection) {
     const auto store = openStore();

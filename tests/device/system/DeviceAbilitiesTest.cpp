@@ -58,7 +58,7 @@ TEST_F(DeviceAbilitiesTest, AVariantsNameIsPutBehindTheKey) {
     EXPECT_EQ(DeviceAbilities(made).VariantStringKeyForKey("KEY"), Text("KEY_WLAN"));
 }
 
-TEST_F(DeviceAbilitiesTest, RestrictionsAreReadAtEachQuestion) {
+TEST_F(DeviceAbilitiesTest, RestrictionsFollowAChangeOfTheDevice) {
     static_cast<void>(settings());
     const DeviceRestrictions restrictions(DevicePaths(root()), log);
     EXPECT_TRUE(restrictions.isAppCellularDataModificationAllowed());

@@ -3,9 +3,11 @@
 #include "device/system/DeviceSettings.h"
 #include "tests/device/RecordingLog.h"
 #include "tests/device/TestFiles.h"
+#include "tests/device/Threads.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <algorithm>
+#include <atomic>
 #include <gtest/gtest.h>
 #include <initializer_list>
 #include <string>
@@ -23,6 +25,12 @@ protected:
                             R"({"locale": "en-US", "timeZone": "Asia/Tokyo"})");
         _settings.emplace(DeviceSettings::open(_directory.path()).value());
         _localization.emplace(*_settings, _log);
+    }
+
+    void changeLocale(const std::string& locale) {
+        test::writeTestFile(_directory.path() / "var/lib/nimbra/device.json",
+                            R"({"locale": ")" + locale + R"("})");
+        ASSERT_TRUE(_settings->reload());
     }
 
     [[nodiscard]] DeviceSettings& settings() { return *_settings; }
@@ -70,6 +78,26 @@ TEST_F(DeviceLocalizationTest, LetterCaseIsIgnoredAndAccentsCount) {
     EXPECT_LT(compare("á", "b"), 0);
 }
 
+TEST_F(DeviceLocalizationTest, NamesThatCompareEqualKeepTheirOrder) {
+    EXPECT_EQ(sorted({"Notes", "App 1", "NOTES", "app 01", "notes", "APP 1"}),
+              (Names{"App 1", "app 01", "APP 1", "Notes", "NOTES", "notes"}));
+}
+
+TEST_F(DeviceLocalizationTest, RunsOfDigitsAreNumbersHoweverLong) {
+    EXPECT_EQ(sorted({"App 100", "App 20", "App " + std::string(40, '9'), "App 3", "App v1.10",
+                      "App v1.9", "10 Apps", "9 Apps"}),
+              (Names{"9 Apps", "10 Apps", "App 3", "App 20", "App 100",
+                     "App " + std::string(40, '9'), "App v1.9", "App v1.10"}));
+}
+
+TEST_F(DeviceLocalizationTest, EveryNameHasItsPlace) {
+    const Names names{"", " ", "!", "😀 Fun", "7", "Zoë", "ملاحظات", "備忘錄", "\xFF\xFE"};
+    const auto order = sorted(names);
+    EXPECT_EQ(order.size(), names.size());
+    EXPECT_EQ(order.front(), "");
+    EXPECT_EQ(sorted({order.rbegin(), order.rend()}), order);
+}
+
 TEST_F(DeviceLocalizationTest, TheOrderFollowsTheLocale) {
     settings().overrideLocale("de");
     EXPECT_EQ(sorted({"Zebra", "Öl", "Ofen", "Ärger", "Apfel"}),
@@ -78,6 +106,36 @@ TEST_F(DeviceLocalizationTest, TheOrderFollowsTheLocale) {
     settings().overrideLocale("sv");
     EXPECT_EQ(sorted({"Zebra", "Öl", "Ofen", "Ärger", "Apfel"}),
               (Names{"Apfel", "Ofen", "Zebra", "Ärger", "Öl"}));
+}
+
+TEST_F(DeviceLocalizationTest, TheOrderFollowsAFileThatWasReadAgain) {
+    const auto compare = [this] {
+        return localization().localizedStandardCompare(Text("Ärger"), Text("Zebra"));
+    };
+    EXPECT_LT(compare(), 0);
+    changeLocale("sv");
+    EXPECT_GT(compare(), 0);
+    changeLocale("en-US");
+    EXPECT_LT(compare(), 0);
+}
+
+TEST_F(DeviceLocalizationTest, NamesAreComparedWhileTheLocaleChanges) {
+    std::atomic<int> unexpected = 0;
+    const auto compare = [&] {
+        for (int time = 0; time < 2000; ++time) {
+            unexpected +=
+                localization().localizedStandardCompare(Text("App 10"), Text("app 9")) <= 0;
+        }
+    };
+    const auto change = [&] {
+        for (int time = 0; time < 200; ++time) {
+            settings().overrideLocale(time % 2 == 0 ? "sv" : "de");
+        }
+    };
+    test::runAtOnce({compare, compare, change});
+
+    EXPECT_EQ(unexpected, 0);
+    EXPECT_LT(localization().localizedStandardCompare(Text("Ärger"), Text("Zebra")), 0);
 }
 
 TEST_F(DeviceLocalizationTest, AnAbsentTextComesFirst) {

@@ -74,9 +74,9 @@ private:
 
     /// Brings a row when work on another queue has ended.
     void appendLater() {
-        _queue = services().workQueues.serialQueueWithLabel("later");
+        _queue = services().workQueues->serialQueueWithLabel("later");
         _queue->async([this, pane = shared_from_this()] {
-            services().workQueues.mainQueue().async([this, pane] {
+            services().workQueues->mainQueue().async([this, pane] {
                 addSpecifiersFromArrayAnimated({row("Arrived", {.cell = LinkListCell})}, true);
             });
         });

@@ -70,6 +70,33 @@ TEST(ListText, MarksLockedRowsAndRowsWithoutAName) {
     EXPECT_EQ(text.page("Page", {locked}), "Page\n\n  (no name) (locked)       off\n");
 }
 
+RowDescription named(Text identifier, Text name) {
+    RowDescription description = row(RowKind::switchRow, std::move(name), true);
+    description.id = std::move(identifier);
+    return description;
+}
+
+TEST(ListText, TellsRowsOfTheSameNameApartByTheirIdentifiers) {
+    RowDescription locked = named("d", "Notes");
+    locked.enabled = false;
+    RowDescription heading = group();
+    heading.name = "Clock";
+
+    EXPECT_EQ(text.page("Page", {heading, named("a", "Notes"), named("b", "Clock"), locked,
+                                 named(nullptr, "Notes")}),
+              "Page\n"
+              "\n"
+              "  Notes (a)                 on\n"
+              "  Clock                     on\n"
+              "  Notes (d) (locked)        on\n"
+              "  Notes                     on\n");
+}
+
+TEST(ListText, LetsNoIdentifierMoveTheCursor) {
+    EXPECT_EQ(text.page("Page", {named("a\x1b[2J", "Notes"), named("b", "Notes")}).find('\x1b'),
+              std::string::npos);
+}
+
 TEST(ListText, LetsNoNameMoveTheCursor) {
     EXPECT_EQ(text.page("P\x1b[1m", {row(RowKind::link, "a\nb", Text("c\r"))}).find('\x1b'),
               std::string::npos);
@@ -94,6 +121,37 @@ TEST(ListText, TellsWhatCameWentAndChanged) {
                                            "~ Notes                    off\n"
                                            "+ [New]\n");
     EXPECT_EQ(text.changes(after, after), "");
+}
+
+TEST(ListText, TellsWhichOfSeveralRowsOfTheSameNameHasChanged) {
+    RowDescription off = named("b", "Notes");
+    off.value = false;
+
+    EXPECT_EQ(text.changes({named("a", "Notes"), named("b", "Notes"), named("c", "Notes")},
+                           {named("a", "Notes"), off}),
+              "- Notes (c)\n"
+              "~ Notes (b)                off\n");
+    EXPECT_EQ(text.changes({named("a", "Notes")}, {named("a", "Notes"), named("b", "Notes")}),
+              "+ Notes (b)                 on\n");
+}
+
+TEST(ListText, TellsARowFromOneOfAnotherKindThatIsCalledTheSame) {
+    EXPECT_EQ(text.changes({row(RowKind::button, "Notes")}, {row(RowKind::link, "Notes")}),
+              "- [Notes]\n"
+              "+ Notes                      ›\n");
+}
+
+TEST(ListText, FindsAChangeAmongManyRows) {
+    std::vector<RowDescription> before;
+    for (int number = 0; number < 20'000; ++number) {
+        before.push_back(named("id." + std::to_string(number), "App " + std::to_string(number)));
+    }
+    std::vector<RowDescription> after = before;
+    after.at(10'000).value = false;
+    after.erase(after.begin());
+
+    EXPECT_EQ(text.changes(before, after), "- App 0\n"
+                                           "~ App 10000                off\n");
 }
 
 } // namespace

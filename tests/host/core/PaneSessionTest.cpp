@@ -1,13 +1,19 @@
 #include "host/core/PaneSession.h"
 
 #include "device/DeviceDirectory.h"
+#include "device/apps/Process.h"
+#include "device/apps/ProcessRecord.h"
+#include "device/files/Files.h"
 #include "device/json/JsonReader.h"
 #include "host/core/RowDescription.h"
+#include "host/core/scenario/RunningApplications.h"
 #include "host/core/trace/Trace.h"
 #include "platform/system/NotificationCenter.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <algorithm>
+#include <chrono>
+#include <filesystem>
 #include <gtest/gtest.h>
 #include <mutex>
 #include <string>
@@ -48,6 +54,36 @@ protected:
 
 constexpr const char* deviceWithContainer = R"({"documents": {
     "identity": "token", "containers": [{"identifier": "com.example.notes", "public": true}]}})";
+
+TEST_F(PaneSessionTest, TheSwitchOfAnApplicationEndsItsProcess) {
+    makeDevice(R"({"accounts": [{"identifier": "primary", "usesStratafile": true,
+                                 "enabled": ["kAccountDataclassTidewater"]}],
+        "apps": [{"identifier": "notes", "name": "Notes"}, {"identifier": "clock"}],
+        "consent": [{"service": "kPRVServiceTidewater", "bundle": "notes", "granted": true},
+                    {"service": "kPRVServiceBrackwater", "bundle": "clock", "granted": true}]})");
+    RunningApplications applications(root());
+    ASSERT_TRUE(applications.setRunning({"notes", "clock"}));
+    const auto processOf = [this](const std::string& name) {
+        const auto content = device::readFile(root() / "run/nimbra" / (name + ".pid"));
+        const auto record = device::ProcessRecord::parse(content.value());
+        return device::Process::withNumber(record.value().process).value();
+    };
+    const device::Process notes = processOf("notes");
+    const device::Process clock = processOf("clock");
+    const auto session = start();
+    ASSERT_TRUE(session->openPane({}));
+
+    ASSERT_TRUE(session->setRow("Notes", false));
+    ASSERT_TRUE(session->setRow("clock", false));
+    session->settle();
+
+    constexpr std::chrono::milliseconds atOnce(0);
+    EXPECT_TRUE(notes.awaitEnd(atOnce));
+    EXPECT_FALSE(std::filesystem::exists(root() / "run/nimbra/notes.pid"));
+    // The cloud's database is none of the documents' business.
+    EXPECT_FALSE(clock.awaitEnd(atOnce));
+    EXPECT_TRUE(std::filesystem::exists(root() / "run/nimbra/clock.pid"));
+}
 
 TEST_F(PaneSessionTest, OpensAndClosesThePane) {
     makeDevice("{}");

@@ -42,6 +42,19 @@ TEST(RowDescription, TellsOfASwitchWhetherItIsOn) {
     EXPECT_EQ(displayedValue(description.value), "on");
 }
 
+TEST(RowDescription, HasTheIconOfTheApplicationThatTheHostIsToFetch) {
+    const auto row = Specifier::preferenceSpecifierNamed("Notes", {.cell = SwitchCell});
+    row->setPropertyForKey(Text("com.example.notes"), LazyIconAppID);
+    EXPECT_EQ(RowDescription::of(*row).icon, Text());
+
+    row->setPropertyForKey(false, LazyIconLoading);
+    EXPECT_EQ(RowDescription::of(*row).icon, Text());
+
+    row->setPropertyForKey(true, LazyIconLoading);
+    EXPECT_EQ(RowDescription::of(*row).icon, Text("com.example.notes"));
+    EXPECT_EQ(RowDescription::of(*row).json()["icon"], "com.example.notes");
+}
+
 TEST(RowDescription, CallsARowByItsIdentifierOrElseItsName) {
     const auto row = Specifier::preferenceSpecifierNamed("Button", {.cell = ButtonCell});
     EXPECT_EQ(RowDescription::of(*row).label(), Text("Button"));

@@ -39,6 +39,38 @@ TEST(RowLookup, ListsTheRowsThereAreWhenThereIsNoneOfThatName) {
     EXPECT_EQ(findRow({}, "Four").error().explanation, R"(no row "Four" (the list has no rows))");
 }
 
+TEST(RowLookup, ListsTheRowsThatAreLikeTheTextWhereThereAreMany) {
+    SpecifierArray rows;
+    for (int number = 1; number <= 20; ++number) {
+        rows.push_back(row("app." + std::to_string(number), "App " + std::to_string(number)));
+    }
+    rows.push_back(row("com.example.notes", "Notes"));
+    rows.push_back(row("org.example.notes", "Notes"));
+    rows.push_back(row(nullptr, "My NOTEBOOK"));
+    rows.push_back(row("footnote", nullptr));
+    rows.push_back(row("heading.note", "Heading", GroupCell));
+
+    EXPECT_EQ(findRow(rows, "Note").error().explanation,
+              R"(no row "Note" (rows like it: "Notes", "My NOTEBOOK", "footnote"))");
+    EXPECT_EQ(findRow(rows, "EXAMPLE").error().explanation,
+              R"(no row "EXAMPLE" (rows like it: "Notes"))");
+    EXPECT_EQ(findRow(rows, "app").error().explanation,
+              R"(no row "app" (rows like it: "App 1", "App 2", "App 3", "App 4", "App 5", )"
+              R"("App 6", "App 7", "App 8" and 12 more))");
+}
+
+TEST(RowLookup, ListsTheFirstRowsWhereThereAreManyAndNoneIsLikeTheText) {
+    SpecifierArray rows;
+    for (int number = 1; number <= 10'000; ++number) {
+        rows.push_back(row(nullptr, "App " + std::to_string(number)));
+    }
+    const std::string first = R"((rows: "App 1", "App 2", "App 3", "App 4", "App 5", "App 6", )"
+                              R"("App 7", "App 8" and 9992 more))";
+
+    EXPECT_EQ(findRow(rows, "Notes").error().explanation, R"(no row "Notes" )" + first);
+    EXPECT_EQ(findRow(rows, "p").error().explanation, R"(no row "p" )" + first);
+}
+
 TEST(RowLookup, NeverTakesAnAbsentNameForAnEmptyOne) {
     EXPECT_FALSE(findRow({row(nullptr, nullptr)}, ""));
 }

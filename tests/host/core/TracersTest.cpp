@@ -38,7 +38,8 @@ protected:
 
 TEST_F(Tracers, TellWhichAccountIsFetchedAndWhatIsChangedOnIt) {
     _platform.accountStore.stored.usesStratafile = false;
-    const auto account = _services.accountStore.accountWithIdentifier(AccountIdentifier("primary"));
+    const auto account =
+        _services.accountStore->accountWithIdentifier(AccountIdentifier("primary"));
     ASSERT_TRUE(account);
     account->setEnabledForDataclass(true, kAccountDataclassTidewater);
 
@@ -52,20 +53,20 @@ TEST_F(Tracers, TellWhichAccountIsFetchedAndWhatIsChangedOnIt) {
 }
 
 TEST_F(Tracers, GiveNoAccountWhereThereIsNone) {
-    EXPECT_FALSE(_services.accountStore.accountWithIdentifier(AccountIdentifier("nobody")));
+    EXPECT_FALSE(_services.accountStore->accountWithIdentifier(AccountIdentifier("nobody")));
     EXPECT_FALSE(_tracer.traced(nullptr));
 }
 
 TEST_F(Tracers, TellOfObserversAsLongAsTheyAreRegistered) {
     const NotificationName name("Changed");
     int calls = 0;
-    const auto token = _services.notificationCenter.addObserverForName(
+    const auto token = _services.notificationCenter->addObserverForName(
         name, {.usingBlock = [&](const Notification&) { ++calls; }});
-    _services.notificationCenter.postNotification({.name = name});
-    _services.notificationCenter.removeObserver(token);
-    _services.notificationCenter.removeObserver(token);
-    _services.notificationCenter.removeObserver(nullptr);
-    _services.notificationCenter.postNotification({.name = name});
+    _services.notificationCenter->postNotification({.name = name});
+    _services.notificationCenter->removeObserver(token);
+    _services.notificationCenter->removeObserver(token);
+    _services.notificationCenter->removeObserver(nullptr);
+    _services.notificationCenter->postNotification({.name = name});
 
     EXPECT_EQ(calls, 1);
     EXPECT_EQ(takeLines(),
@@ -78,15 +79,15 @@ TEST_F(Tracers, TellWhatIsAskedOfTheContainers) {
         {.identifier = "one", .isPublic = false},
         {.identifier = "two", .isPublic = true, .registrationFails = true}};
 
-    const auto containers = _services.documentContainers.allContainers();
+    const auto containers = _services.documentContainers->allContainers();
     ASSERT_EQ(containers.size(), 2U);
     EXPECT_FALSE(containers[0]->isDocumentScopePublic());
     EXPECT_FALSE(containers[1]->registerCurrentProcessAsPriorityHintWithError().has_value());
     bool isRefreshed = false;
-    _services.documentContainers.forceRefreshAllContainersWithCompletion(
+    _services.documentContainers->forceRefreshAllContainersWithCompletion(
         [&] { isRefreshed = true; });
     _platform.documentContainers.refreshes.at(0)();
-    _services.documentContainers.unregisterCurrentProcessAsPriorityHint();
+    _services.documentContainers->unregisterCurrentProcessAsPriorityHint();
 
     EXPECT_TRUE(isRefreshed);
     EXPECT_EQ(_platform.documentContainers.calls, (Lines{"register two", "unregister"}));
@@ -98,9 +99,71 @@ TEST_F(Tracers, TellWhatIsAskedOfTheContainers) {
                R"({"event":"container","op":"unregisterCurrentProcessAsPriorityHint"})"}));
 }
 
+TEST_F(Tracers, TellWhatIsAskedOfTheConsentStore) {
+    const auto notes = std::make_shared<test::FakeBundle>(BundleIdentifier("com.example.notes"));
+    const test::FakeBundle nameless(std::nullopt);
+    _platform.privacyConsentStore.records[kPRVServiceBrackwater] = {
+        {.kPRVInfoBundle = notes, .kPRVInfoGranted = true}};
+
+    PrivacyConsentStore& store = _services.privacyConsentStore;
+    const auto records = store.PRVAccessCopyInformation(kPRVServiceBrackwater);
+    EXPECT_TRUE(store.PRVAccessSetForBundle(kPRVServiceTidewater, notes.get(), false));
+    EXPECT_TRUE(store.PRVAccessSetForBundle(kPRVServiceTidewater, &nameless, true));
+    _platform.privacyConsentStore.refuses = true;
+    EXPECT_FALSE(store.PRVAccessSetForBundle(kPRVServiceTidewater, nullptr, true));
+
+    ASSERT_TRUE(records);
+    ASSERT_EQ(records->size(), 1U);
+    EXPECT_EQ(records->front().kPRVInfoBundle, notes);
+    EXPECT_EQ(_platform.calls,
+              (Lines{"copy kPRVServiceBrackwater", "set kPRVServiceTidewater com.example.notes off",
+                     "set kPRVServiceTidewater nobody on", "set kPRVServiceTidewater nobody on"}));
+    const std::string set =
+        R"({"event":"consent","op":"PRVAccessSetForBundle","service":"kPRVServiceTidewater",)";
+    EXPECT_EQ(takeLines(), (Lines{R"({"event":"consent","op":"PRVAccessCopyInformation",)"
+                                  R"("service":"kPRVServiceBrackwater"})",
+                                  set + R"("bundle":"com.example.notes","granted":false})",
+                                  set + R"("bundle":null,"granted":true})",
+                                  set + R"("bundle":null,"granted":true})"}));
+}
+
+TEST_F(Tracers, LeaveAStoreThatCannotBeReadUnreadable) {
+    _platform.privacyConsentStore.isReadable = false;
+
+    EXPECT_FALSE(_services.privacyConsentStore->PRVAccessCopyInformation(kPRVServiceTidewater));
+}
+
+TEST_F(Tracers, TellWhichApplicationsAreToBeEnded) {
+    const BundleIdentifier notes("com.example.notes");
+    _services.appTerminator->terminateApplication(notes, {.reason = 3});
+    _services.appTerminator->terminateApplication(
+        notes, {.reason = 4, .report = true, .description = "why"});
+
+    EXPECT_EQ(_platform.calls, (Lines{"terminate com.example.notes for 3, not reported",
+                                      "terminate com.example.notes for 4, reported, described"}));
+    EXPECT_EQ(takeLines(), (Lines{R"({"event":"terminate","bundle":"com.example.notes","reason":3,)"
+                                  R"("report":false,"description":null})",
+                                  R"({"event":"terminate","bundle":"com.example.notes","reason":4,)"
+                                  R"("report":true,"description":"why"})"}));
+}
+
+TEST_F(Tracers, TellOfConsentAndTerminationBeforeTheyHappen) {
+    Trace trace([this](const std::string&) { _platform.calls.emplace_back("traced"); });
+    TracingPrivacyConsentStore store(_platform.privacyConsentStore, trace);
+    TracingAppTerminator terminator(_platform.appTerminator, trace);
+
+    EXPECT_TRUE(store.PRVAccessCopyInformation(kPRVServiceTidewater));
+    EXPECT_TRUE(store.PRVAccessSetForBundle(kPRVServiceTidewater, nullptr, true));
+    terminator.terminateApplication(BundleIdentifier("notes"), {.reason = 3});
+
+    EXPECT_EQ(_platform.calls, (Lines{"traced", "copy kPRVServiceTidewater", "traced",
+                                      "set kPRVServiceTidewater nobody on", "traced",
+                                      "terminate notes for 3, not reported"}));
+}
+
 TEST_F(Tracers, TellThatThePaneIsDismissedButNotWhereThereIsNothingToDismiss) {
-    _services.presenter.dismissPresentedController(true);
-    _services.presenter.dismissPane(false);
+    _services.presenter->dismissPresentedController(true);
+    _services.presenter->dismissPane(false);
 
     EXPECT_EQ(_platform.calls, (Lines{"dismiss presented, animated", "dismiss pane"}));
     EXPECT_EQ(takeLines(), Lines{R"({"event":"dismiss","what":"pane","animated":false})"});

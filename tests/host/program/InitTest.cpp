@@ -18,17 +18,35 @@ TEST(Init, MakesTheSampleDevice) {
 
 TEST(Init, MakesTheDeviceThatAFileDescribes) {
     const Program program;
-    const auto description =
-        program.write("phone.json", R"({"name": "Peter's Phone", "locale": "de-DE", "apps": []})");
+    const auto description = program.write(
+        "phone.json", R"({"name": "Peter's Phone", "locale": "de-DE", "tool": null})");
     const auto device = program.path("device");
 
     const auto result = program.run({"init", device.string(), "--from", description.string()});
 
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.output, "Made the device \"Peter's Phone\" in " + device.string() + ".\n");
-    EXPECT_EQ(result.messages, "settingsctl: note: /apps has no effect in this version\n");
+    EXPECT_EQ(result.messages, "settingsctl: note: /tool has no effect in this version\n");
     EXPECT_NE(program.run({"--root", device.string(), "list"}).output.find("Apps können"),
               std::string::npos);
+}
+
+TEST(Init, SaysOnceThatNoApplicationRunsOnIt) {
+    const Program program;
+    const auto description = program.write("phone.json", R"({"apps": [
+        {"identifier": "a", "running": true}, {"identifier": "b", "running": true}]})");
+    const auto quiet = program.write(
+        "quiet.json", R"({"apps": [{"identifier": "a", "running": false}, {"identifier": "b"}]})");
+
+    const auto result =
+        program.run({"init", program.path("device").string(), "--from", description.string()});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_EQ(result.messages, "settingsctl: note: /apps: \"running\" has no effect here, "
+                               "applications run only while a scenario plays\n");
+    EXPECT_EQ(
+        program.run({"init", program.path("other").string(), "--from", quiet.string()}).messages,
+        "");
 }
 
 TEST(Init, RefusesADescriptionWithItsPlaceAndMakesNothing) {

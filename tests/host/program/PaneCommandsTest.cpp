@@ -1,6 +1,7 @@
 #include "tests/host/program/Program.h"
 
 #include <SQLiteCpp/SQLiteCpp.h>
+#include <algorithm>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
 #include <string>
@@ -34,16 +35,31 @@ TEST(DefaultDevice, IsMadeFromTheSampleOnFirstUse) {
     EXPECT_EQ(first.output,
               "Nimbra Drive\n"
               "\n"
-              "  Nimbra Drive                                                        "
-              "        on\n"
-              "    Apps can keep their documents and data in Nimbra Drive, so you can "
-              "get\n"
+              "  Nimbra Drive                                                                on\n"
+              "    Apps can keep their documents and data in Nimbra Drive, so you can get\n"
               "    to them on all your devices.\n"
               "\n"
-              "  Use Cellular Data                                                   "
-              "       off\n"
-              "    When you’re not connected to Wi-Fi, Nimbra Drive uses cellular data "
-              "to\n"
+              "  2000 Songs                                                                 off\n"
+              "  Atlas                                                                      off\n"
+              "  Budget                                                                     off\n"
+              "  Camera 📷                                                                   on\n"
+              "  drafts                                                                     off\n"
+              "  Écrivain                                                                    on\n"
+              "  Notes                                                                       on\n"
+              "  Reader (com.example.reader)                                                 on\n"
+              "  Reader (org.example.reader)                                                 on\n"
+              "  Recipes                                                                     on\n"
+              "  Scanner 2                                                                   on\n"
+              "  Scanner 10                                                                  on\n"
+              "  Sketches                                                                    on\n"
+              "  Weather                                                                    off\n"
+              "  Work Files (locked)                                                        off\n"
+              "  מכתבים                                                                      on\n"
+              "  مكتبة                                                                       on\n"
+              "  日記                                                                        on\n"
+              "\n"
+              "  Use Cellular Data                                                          off\n"
+              "    When you’re not connected to Wi-Fi, Nimbra Drive uses cellular data to\n"
               "    transfer documents and data.\n");
     EXPECT_EQ(second.messages, "");
     EXPECT_EQ(second.output, first.output);
@@ -69,8 +85,8 @@ TEST(List, ShowsEveryKindOfRow) {
               "\n"
               "  Notes                                                                      off\n"
               "  Locked (locked)                                                            off\n"
-              "  Twin                                                                         ›\n"
-              "  Twin                                                                         ›\n"
+              "  Twin (twin.one)                                                              ›\n"
+              "  Twin (twin.two)                                                              ›\n"
               "  Storage                                                               3 apps ›\n"
               "    What the group is about.\n"
               "\n"
@@ -142,8 +158,77 @@ TEST(Get, SaysWhyThereIsNothingToPrint) {
     expectRefused(runOnRows(program, {"get", "Twin"}),
                   "\"Twin\" stands for 2 rows (name one by its identifier: \"twin.one\", "
                   "\"twin.two\")");
-    expectRefused(program.run({"--root", program.path("device").string(), "get", "Foo"}),
+    expectRefused(program.run({"--root", program.makePlainDevice("plain"), "get", "Foo"}),
                   "no row \"Foo\" (rows: \"Nimbra Drive\", \"Use Cellular Data\")");
+}
+
+/// Makes a device with three applications, two of which are called the same.
+std::string deviceWithNotes(const Program& program) {
+    const auto description = program.write("notes.json", R"({
+        "accounts": [{"identifier": "a", "usesStratafile": true,
+                      "enabled": ["kAccountDataclassTidewater"]}],
+        "apps": [{"identifier": "one.notes", "name": "Notes"},
+                 {"identifier": "two.notes", "name": "Notes"},
+                 {"identifier": "clock", "name": "Clock"}],
+        "consent": [{"service": "kPRVServiceTidewater", "bundle": "one.notes", "granted": true},
+                    {"service": "kPRVServiceTidewater", "bundle": "two.notes", "granted": false},
+                    {"service": "kPRVServiceBrackwater", "bundle": "clock", "granted": true}]})");
+    const std::string device = program.path("notes").string();
+    EXPECT_EQ(program.run({"init", device, "--from", description.string()}).status, 0);
+    return device;
+}
+
+TEST(Applications, AreReadAndSetByNameAndByIdentifier) {
+    const Program program;
+    const std::string device = deviceWithNotes(program);
+
+    EXPECT_EQ(program.run({"--root", device, "get", "Clock"}).output, "on\n");
+    EXPECT_EQ(program.run({"--root", device, "set", "clock", "off"}).output,
+              "~ Clock                                                                      off\n");
+    EXPECT_EQ(program.run({"--root", device, "get", "Clock"}).output, "off\n");
+    EXPECT_EQ(program.run({"--root", device, "set", "Clock", "on"}).status, 0);
+    EXPECT_EQ(program.run({"--root", device, "get", "clock"}).output, "on\n");
+}
+
+TEST(Applications, OfTheSameNameAreToldApart) {
+    const Program program;
+    const std::string device = deviceWithNotes(program);
+
+    EXPECT_NE(program.run({"--root", device, "list"})
+                  .output.find("  Clock                                                           "
+                               "            on\n"
+                               "  Notes (one.notes)                                               "
+                               "            on\n"
+                               "  Notes (two.notes)                                               "
+                               "           off\n"),
+              std::string::npos);
+    for (const std::string command : {"get", "set"}) {
+        std::vector<std::string> words{"--root", device, command, "Notes"};
+        if (command == "set") {
+            words.emplace_back("on");
+        }
+        expectRefused(program.run(words),
+                      "\"Notes\" stands for 2 rows (name one by its identifier: \"one.notes\", "
+                      "\"two.notes\")");
+    }
+    EXPECT_EQ(program.run({"--root", device, "get", "two.notes"}).output, "off\n");
+    EXPECT_EQ(program.run({"--root", device, "set", "two.notes", "on"}).output,
+              "~ Notes (two.notes)                                                           on\n");
+    EXPECT_EQ(program.run({"--root", device, "get", "two.notes"}).output, "on\n");
+    EXPECT_EQ(program.run({"--root", device, "get", "one.notes"}).output, "on\n");
+}
+
+TEST(Applications, HaveTheirIconsInTheListForPrograms) {
+    const Program program;
+
+    const auto rows = nlohmann::ordered_json::parse(
+        program.run({"--root", deviceWithNotes(program), "list", "--json"}).output);
+
+    const auto clock = std::ranges::find(rows, "clock", [](const auto& row) { return row["id"]; });
+    ASSERT_NE(clock, rows.end());
+    EXPECT_EQ(clock->dump(),
+              R"({"kind":"switch","id":"clock","name":"Clock","enabled":true,"value":true,)"
+              R"("footer":null,"footerClass":null,"icon":"clock","detail":null})");
 }
 
 TEST(Set, TurnsASwitchAndPrintsWhatChanges) {
@@ -169,8 +254,7 @@ TEST(Set, RefusesWhatCannotBeSet) {
 
 TEST(Set, TurnsTheMasterSwitchAndSaysWhatItIsDoing) {
     const Program program;
-    const std::string device = program.path("device").string();
-    ASSERT_EQ(program.run({"init", device}).status, 0);
+    const std::string device = program.makePlainDevice("device");
 
     const auto off = program.run({"--root", device, "set", "Nimbra Drive", "off"});
 

@@ -112,16 +112,17 @@ TEST(ScenarioInput, AFileThatIsNotThereIsRefused) {
 
 TEST(ScenarioInput, KeysWithoutEffectAreNamedOnceEach) {
     const Program program;
-    const std::string scenario = R"({"device": {"apps": [], "tool": null}, "steps": [
-        {"do": "open"}, {"do": "change", "device": {"consent": []}}]})";
+    const std::string scenario = R"({"device": {"deviceList": null, "tool": null}, "steps": [
+        {"do": "open"}, {"do": "change", "device": {"databaseSettings": null}}]})";
 
     const auto result = program.run({"play", "-"}, scenario);
 
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.messages,
-              "settingsctl: note: /device/apps has no effect in this version\n"
+              "settingsctl: note: /device/deviceList has no effect in this version\n"
               "settingsctl: note: /device/tool has no effect in this version\n"
-              "settingsctl: note: /steps/1/device/consent has no effect in this version\n");
+              "settingsctl: note: /steps/1/device/databaseSettings has no effect in this "
+              "version\n");
 }
 
 } // namespace

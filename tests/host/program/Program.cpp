@@ -130,6 +130,17 @@ std::filesystem::path Program::write(const std::string& name, const std::string&
     return file;
 }
 
+std::string Program::makePlainDevice(const std::string& name) const {
+    const auto description = write("plain.json", R"({"accounts": [
+        {"identifier": "primary", "primary": true, "usesStratafile": true,
+         "enabled": ["kAccountDataclassTidewater"]}]})");
+    const std::string device = path(name).string();
+    if (run({"init", device, "--from", description.string()}).status != 0) {
+        throw std::runtime_error("the device in " + device + " cannot be made");
+    }
+    return device;
+}
+
 bool Program::leftNothingBehind() const {
     return std::filesystem::is_empty(path("tmp"));
 }

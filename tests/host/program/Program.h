@@ -40,6 +40,10 @@ public:
     /// Makes the file `name` there.
     std::filesystem::path write(const std::string& name, const std::string& content) const;
 
+    /// Makes a device without applications whose account has cloud documents on, in the directory
+    /// `name` there; gives its path.
+    [[nodiscard]] std::string makePlainDevice(const std::string& name) const;
+
     /// Whether no file and no directory is left where temporary ones are made.
     [[nodiscard]] bool leftNothingBehind() const;
     /// The device directory that is used when none is named.

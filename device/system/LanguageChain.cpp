@@ -1,4 +1,4 @@
-#include "device/bundles/LanguageChain.h"
+#include "device/system/LanguageChain.h"
 
 #include <algorithm>
 #include <unicode/locid.h>
@@ -12,8 +12,11 @@ std::vector<std::string> languageChain(const std::string& locale) {
     const std::string language = full.getLanguage();
     const std::string script = full.getScript();
     const std::string region = full.getCountry();
-    icu::Locale usual(language.c_str());
-    usual.addLikelySubtags(status);
+    const auto usualScript = [&](const char* country) {
+        icu::Locale usual(language.c_str(), country);
+        usual.addLikelySubtags(status);
+        return std::string(usual.getScript());
+    };
 
     std::vector<std::string> chain{locale};
     const auto add = [&chain](const std::string& tag) {
@@ -25,9 +28,11 @@ std::vector<std::string> languageChain(const std::string& locale) {
         return chain;
     }
     add(language + '-' + script + '-' + region);
-    add(language + '-' + region);
+    if (script == usualScript(region.c_str())) {
+        add(language + '-' + region);
+    }
     add(language + '-' + script);
-    if (script == usual.getScript()) {
+    if (script == usualScript("")) {
         add(language);
     }
     return chain;

@@ -1,4 +1,4 @@
-#include "device/bundles/LanguageChain.h"
+#include "device/system/LanguageChain.h"
 
 #include <gtest/gtest.h>
 
@@ -17,6 +17,9 @@ TEST(LanguageChainTest, AScriptNeverFallsBackToAnother) {
     EXPECT_EQ(languageChain("zh-TW"), (Languages{"zh-TW", "zh-Hant-TW", "zh-Hant"}));
     EXPECT_EQ(languageChain("zh-Hant-HK"), (Languages{"zh-Hant-HK", "zh-HK", "zh-Hant"}));
     EXPECT_EQ(languageChain("zh-CN"), (Languages{"zh-CN", "zh-Hans-CN", "zh-Hans", "zh"}));
+    // Serbia writes Serbian in Cyrillic letters.
+    EXPECT_EQ(languageChain("sr-Latn"), (Languages{"sr-Latn", "sr-Latn-RS"}));
+    EXPECT_EQ(languageChain("sr"), (Languages{"sr", "sr-Cyrl-RS", "sr-RS", "sr-Cyrl"}));
 }
 
 TEST(LanguageChainTest, ExtensionsDoNotMatter) {

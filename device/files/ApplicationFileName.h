@@ -1,0 +1,13 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace nimbra::device {
+
+/// The name of the file that the device keeps of the application `identifier`, ending in `suffix`
+/// (".desktop"): the identifier itself, but for what no file name can hold, which is written as
+/// "%XX". Never a path.
+[[nodiscard]] std::string applicationFileName(std::string_view identifier, std::string_view suffix);
+
+} // namespace nimbra::device

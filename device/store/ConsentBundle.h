@@ -1,0 +1,29 @@
+#pragma once
+
+#include "platform/system/Bundle.h"
+
+#include <optional>
+#include <utility>
+
+namespace nimbra::device {
+
+/// An application as a consent record names it: by its identifier, if at all. What belongs to the
+/// application beyond that, string tables included, stands elsewhere. Any thread.
+class ConsentBundle final : public Bundle {
+public:
+    explicit ConsentBundle(std::optional<BundleIdentifier> identifier)
+        : _identifier(std::move(identifier)) {}
+
+    [[nodiscard]] const std::optional<BundleIdentifier>& identifier() const override {
+        return _identifier;
+    }
+    [[nodiscard]] Text localizedStringForKeyValueTable(const Text& /*key*/, const Text& value,
+                                                       const Text& /*table*/) const override {
+        return value;
+    }
+
+private:
+    std::optional<BundleIdentifier> _identifier;
+};
+
+} // namespace nimbra::device

@@ -1,0 +1,88 @@
+#include "host/core/scenario/ScenarioPlayer.h"
+
+#include "device/DeviceDirectory.h"
+#include "device/apps/Process.h"
+#include "device/apps/ProcessRecord.h"
+#include "device/files/Files.h"
+#include "host/core/PaneSession.h"
+#include "host/core/scenario/RunningApplications.h"
+#include "host/core/scenario/ScenarioReader.h"
+#include "host/core/trace/Trace.h"
+#include "tests/support/TemporaryDirectory.h"
+
+#include <chrono>
+#include <filesystem>
+#include <fstream>
+#include <gtest/gtest.h>
+#include <string>
+
+namespace nimbra::host {
+namespace {
+
+class ScenarioPlayerTest : public testing::Test {
+protected:
+    /// Plays these steps on a device without applications; those that come run where
+    /// `applications` says.
+    std::expected<void, StepFailure> play(RunningApplications& applications,
+                                          const std::string& steps) {
+        const auto scenario = readScenario(R"({"steps": [)" + steps + "]}", "scenario");
+        EXPECT_TRUE(scenario) << scenario.error();
+        EXPECT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
+        Trace trace([](const std::string&) {});
+        const auto session =
+            PaneSession::start({.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace});
+        EXPECT_TRUE(session) << session.error();
+        return ScenarioPlayer(*scenario, **session, applications, trace).play();
+    }
+
+    [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }
+    [[nodiscard]] std::filesystem::path elsewhere() const { return _directory.path(); }
+    [[nodiscard]] bool isRecorded(const std::string& application) const {
+        return std::filesystem::exists(root() / "run/nimbra" / (application + ".pid"));
+    }
+
+private:
+    test::TemporaryDirectory _directory;
+};
+
+TEST_F(ScenarioPlayerTest, AChangeOfTheApplicationsStartsAndEndsThem) {
+    RunningApplications applications(root());
+
+    ASSERT_TRUE(play(applications, R"(
+        {"do": "change", "device": {"apps": [{"identifier": "a", "running": true},
+                                             {"identifier": "b", "running": true}]}},
+        {"do": "change", "device": {"apps": [{"identifier": "a"},
+                                             {"identifier": "b", "running": true},
+                                             {"identifier": "c", "running": true}]}})"));
+
+    EXPECT_FALSE(isRecorded("a"));
+    EXPECT_TRUE(isRecorded("b"));
+    EXPECT_TRUE(isRecorded("c"));
+}
+
+TEST_F(ScenarioPlayerTest, AChangeOfSomethingElseLeavesTheApplicationsRunning) {
+    RunningApplications applications(root());
+
+    ASSERT_TRUE(play(applications, R"(
+        {"do": "change", "device": {"apps": [{"identifier": "a", "running": true}]}},
+        {"do": "change", "device": {"name": "Other"}})"));
+
+    EXPECT_TRUE(isRecorded("a"));
+}
+
+TEST_F(ScenarioPlayerTest, AnApplicationThatCannotBeStartedFailsTheStep) {
+    std::ofstream(elsewhere() / "run") << "a file";
+    RunningApplications applications(elsewhere());
+
+    const auto played = play(applications, R"(
+        {"do": "open"},
+        {"do": "change", "device": {"apps": [{"identifier": "a", "running": true}]}})");
+
+    ASSERT_FALSE(played);
+    EXPECT_EQ(played.error().index, 1U);
+    EXPECT_EQ(played.error().reason,
+              (elsewhere() / "run/nimbra").string() + ": cannot be made: Not a directory");
+}
+
+} // namespace
+} // namespace nimbra::host
