@@ -13,5 +13,5 @@ if(NIMBRA_SANITIZERS)
   add_compile_definitions(_GLIBCXX_ASSERTIONS)
   add_link_options(-fsanitize=${NIMBRA_SANITIZERS})
   # GCC 12's sanitizers make the optimiser see doubtful accesses in the standard library.
-  add_compile_options(-Wno-maybe-uninitialized)
+  add_compile_options($<$<CXX_COMPILER_ID:GNU>:-Wno-maybe-uninitialized>)
 endif()
