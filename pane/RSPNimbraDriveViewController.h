@@ -14,7 +14,7 @@
 namespace nimbra {
 
 class Account;
-class EventSource;
+class DataOrEventSource;
 class RefreshControl;
 class WorkQueue;
 
@@ -120,7 +120,7 @@ private:
     std::shared_ptr<ObserverToken> _mrDidUpdateLastSyncStatusObserver;
     std::shared_ptr<ObserverToken> _mrTidewaterIdentityTokenStatusObserver;
     std::shared_ptr<ObserverToken> _mrContainersListChangedNotification;
-    std::shared_ptr<EventSource> _containerPriorityHintingSource;
+    std::shared_ptr<DataOrEventSource> _containerPriorityHintingSource;
     std::shared_ptr<WorkQueue> _containerPriorityHintingQueue;
     std::once_flag _containerPriorityHintingCreation;
     /// A failed save replaces the account while the main queue may read it.

@@ -8,7 +8,7 @@
 namespace nimbra::device {
 
 /// The source of kind data-or over any queue. Any thread.
-class DataOrSource final : public EventSource {
+class DataOrSource final : public DataOrEventSource {
 public:
     /// A suspended source whose handler runs on `queue`.
     explicit DataOrSource(std::shared_ptr<WorkQueue> queue);

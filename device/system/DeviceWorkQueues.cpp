@@ -169,7 +169,7 @@ std::shared_ptr<WorkQueue> DeviceWorkQueues::serialQueueWithLabel(const std::str
     return std::make_shared<Queue>(_shared, label);
 }
 
-std::shared_ptr<EventSource>
+std::shared_ptr<DataOrEventSource>
 DeviceWorkQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
     return std::make_shared<DataOrSource>(std::move(queue));
 }

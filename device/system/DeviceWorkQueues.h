@@ -23,7 +23,7 @@ public:
     [[nodiscard]] WorkQueue& mainQueue() override;
     [[nodiscard]] std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) override;
-    [[nodiscard]] std::shared_ptr<EventSource>
+    [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
 
     /// Whether no background queue has work that is queued or under way.

@@ -14,4 +14,14 @@ const ControllerClass* ClassRegistry::classNamed(const std::string& name) const 
     return entry != _classes.end() ? &entry->second : nullptr;
 }
 
+bool ClassRegistry::registerHeaderFooterClass(HeaderFooterClass headerFooterClass) {
+    std::string name = headerFooterClass.name;
+    return _headerFooterClasses.emplace(std::move(name), std::move(headerFooterClass)).second;
+}
+
+const HeaderFooterClass* ClassRegistry::headerFooterClassNamed(const std::string& name) const {
+    const auto entry = _headerFooterClasses.find(name);
+    return entry != _headerFooterClasses.end() ? &entry->second : nullptr;
+}
+
 } // namespace nimbra

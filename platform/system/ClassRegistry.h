@@ -7,7 +7,9 @@
 
 namespace nimbra {
 
+class HeaderFooterView;
 class SettingsListController;
+class Specifier;
 struct PlatformServices;
 
 /// A controller class that can be found by its name, as long as the process runs.
@@ -15,6 +17,15 @@ struct ControllerClass {
     std::string name;
     /// Makes a controller over the given services, which outlive it.
     std::function<std::shared_ptr<SettingsListController>(const PlatformServices&)> create;
+};
+
+/// A class of views above or under a group's rows, which the group names.
+struct HeaderFooterClass {
+    std::string name;
+    /// Makes the view for `group`, over services that outlive it.
+    std::function<std::shared_ptr<HeaderFooterView>(const Specifier& group,
+                                                    const PlatformServices&)>
+        initWithSpecifier;
 };
 
 /// The classes that loaded bundles have registered. Main queue only.
@@ -26,8 +37,13 @@ public:
     /// The class called `name`, owned by the registry; null when no loaded bundle has it.
     [[nodiscard]] const ControllerClass* classNamed(const std::string& name) const;
 
+    /// The same for classes of views above or under a group's rows.
+    [[nodiscard]] bool registerHeaderFooterClass(HeaderFooterClass headerFooterClass);
+    [[nodiscard]] const HeaderFooterClass* headerFooterClassNamed(const std::string& name) const;
+
 private:
     std::map<std::string, ControllerClass> _classes;
+    std::map<std::string, HeaderFooterClass> _headerFooterClasses;
 };
 
 /// What a bundle's shared object exports under `kBundleEntryPoint`, with C linkage: it registers

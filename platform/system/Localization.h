@@ -1,17 +1,14 @@
 #pragma once
 
 #include "platform/system/Locale.h"
+#include "platform/values/Date.h"
 #include "platform/values/Text.h"
 
-#include <chrono>
 #include <cstdint>
 #include <span>
 #include <variant>
 
 namespace nimbra {
-
-/// A point in time.
-using Date = std::chrono::system_clock::time_point;
 
 /// What a placeholder of a text format is filled with.
 using FormatArgument = std::variant<std::int64_t, Text, Date>;

@@ -21,7 +21,7 @@ public:
     serialQueueWithLabel(const std::string& label) = 0;
 
     /// A new source of kind data-or, suspended, whose handler runs on `queue`.
-    [[nodiscard]] virtual std::shared_ptr<EventSource>
+    [[nodiscard]] virtual std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) = 0;
 };
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/values/Date.h"
 #include "platform/values/Identifier.h"
 #include "platform/values/Text.h"
 
@@ -14,7 +15,7 @@ class Account;
 
 /// One value of a user-info dictionary. An account is shared with whoever put it there.
 using UserInfoValue =
-    std::variant<std::monostate, bool, std::int64_t, double, Text, std::shared_ptr<Account>>;
+    std::variant<std::monostate, bool, std::int64_t, double, Text, Date, std::shared_ptr<Account>>;
 
 /// What travels with a row that opens a pane, or with a notification.
 using UserInfo = std::map<UserInfoKey, UserInfoValue>;

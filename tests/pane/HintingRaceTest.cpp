@@ -26,7 +26,7 @@ public:
         _made.push_back(_queues.serialQueueWithLabel(label));
         return _made.back();
     }
-    [[nodiscard]] std::shared_ptr<EventSource>
+    [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override {
         return _queues.dataOrSourceOnQueue(std::move(queue));
     }

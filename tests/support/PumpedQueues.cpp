@@ -11,7 +11,8 @@ std::shared_ptr<WorkQueue> PumpedQueues::serialQueueWithLabel(const std::string&
     return _queues.emplace(label, std::make_shared<PumpedQueue>(label))->second;
 }
 
-std::shared_ptr<EventSource> PumpedQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
+std::shared_ptr<DataOrEventSource>
+PumpedQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
     return std::make_shared<device::DataOrSource>(std::move(queue));
 }
 

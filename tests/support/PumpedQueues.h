@@ -15,7 +15,7 @@ public:
     [[nodiscard]] PumpedQueue& mainQueue() override { return _mainQueue; }
     [[nodiscard]] std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) override;
-    [[nodiscard]] std::shared_ptr<EventSource>
+    [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
 
     /// The queue made last under `label`; null when none was.

@@ -1,0 +1,115 @@
+#pragma once
+
+#include "platform/PlatformServices.h"
+#include "platform/values/KeyValueObserver.h"
+#include "platform/views/Geometry.h"
+#include "platform/views/LayoutConstraint.h"
+
+#include <array>
+#include <cstdint>
+#include <memory>
+#include <vector>
+
+namespace nimbra {
+
+class Window;
+
+/// The two directions of a layout; the numbers are the platform's.
+enum class LayoutAxis : std::uint8_t { horizontal = 0, vertical = 1 };
+
+/// How hard a view resists: 1000 means at any price.
+using LayoutPriority = float;
+inline constexpr LayoutPriority requiredLayoutPriority = 1000;
+inline constexpr LayoutPriority highLayoutPriority = 750;
+inline constexpr LayoutPriority lowLayoutPriority = 250;
+
+/// A rectangle in the tree of what a host shows. It draws nothing: a host looks at the tree. A view
+/// owns its subviews; views are made with `std::make_shared`. Main queue only.
+class View : public KeyValueObserver, public std::enable_shared_from_this<View> {
+public:
+    /// The services outlive the view.
+    View(const PlatformServices& services, const Rect& frame);
+    View(const View&) = delete;
+    View& operator=(const View&) = delete;
+    ~View() override;
+
+    // The tree.
+
+    /// Puts `view` in front of the subviews that are there; it leaves the view that it was in. It
+    /// moves into this view's window, or out of its own.
+    void addSubview(const std::shared_ptr<View>& view);
+    void removeFromSuperview();
+    [[nodiscard]] View* superview() const { return _superview; }
+    [[nodiscard]] const std::vector<std::shared_ptr<View>>& subviews() const { return _subviews; }
+
+    // Windows.
+
+    /// The window that the view is shown in; null while it is in none. Not owned.
+    [[nodiscard]] Window* window() const { return _window; }
+    /// Moves the view, which has no superview, and all below it into `window`, or out of its own
+    /// for null: what the host does with the root of a tree. Every view is told before. Also where
+    /// `window` is the one that it is in already.
+    void moveToWindow(Window* window);
+    /// Is told before the view moves to `window` (null: out of its own).
+    virtual void willMoveToWindow(Window* window);
+
+    // Looks.
+
+    [[nodiscard]] const Rect& frame() const { return _frame; }
+    /// A changed size asks for a layout.
+    void setFrame(const Rect& frame);
+    [[nodiscard]] bool isHidden() const { return _hidden; }
+    void setHidden(bool hidden) { _hidden = hidden; }
+
+    // Layout.
+
+    /// The size that the content needs; `ViewNoIntrinsicMetric` in a direction that does not
+    /// matter to it.
+    [[nodiscard]] virtual Size intrinsicContentSize() const;
+    /// The height of the content where it is `width` wide.
+    [[nodiscard]] virtual double heightForWidth(double width) const;
+
+    /// Asks for a layout of this view in the next pass.
+    void setNeedsLayout() { _needsLayout = true; }
+    [[nodiscard]] bool needsLayout() const { return _needsLayout; }
+    /// Runs one layout pass: lays out this view and all below it that ask for it, from here down.
+    void layoutIfNeeded();
+    /// Gives the subviews their frames: by default those that the constraints ask for.
+    virtual void layoutSubviews();
+
+    /// Whether the view's own frame stands as it is (the default), or constraints give it one.
+    [[nodiscard]] bool translatesAutoresizingMaskIntoConstraints() const { return _translates; }
+    void setTranslatesAutoresizingMaskIntoConstraints(bool translates) { _translates = translates; }
+
+    /// Adds constraints between this view and its subviews, and asks for a layout.
+    void addConstraints(std::vector<LayoutConstraint> constraints);
+    [[nodiscard]] const std::vector<LayoutConstraint>& constraints() const { return _constraints; }
+
+    /// How hard the view resists being made smaller than its content; 750 to begin with.
+    [[nodiscard]] LayoutPriority contentCompressionResistancePriorityForAxis(LayoutAxis axis) const;
+    void setContentCompressionResistancePriorityForAxis(LayoutPriority priority, LayoutAxis axis);
+
+    /// A plain view observes nothing: a change that reaches it has found no taker, which is said in
+    /// one line to `syslog`.
+    void observeValueForKeyPath(const KeyPath& keyPath, const Observation& observation) override;
+
+protected:
+    [[nodiscard]] const PlatformServices& services() const { return _services; }
+
+private:
+    void tellOfMoveTo(Window* window);
+    void setWindow(Window* window);
+
+    PlatformServices _services;
+    Rect _frame;
+    View* _superview = nullptr;
+    Window* _window = nullptr;
+    std::vector<std::shared_ptr<View>> _subviews;
+    std::vector<LayoutConstraint> _constraints;
+    std::array<LayoutPriority, 2> _compressionResistance{highLayoutPriority, highLayoutPriority};
+    bool _hidden = false;
+    bool _needsLayout = true;
+    bool _translates = true;
+};
+
+} // namespace nimbra
