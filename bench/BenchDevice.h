@@ -1,6 +1,7 @@
 #pragma once
 
 #include "device/DevicePlatform.h"
+#include "host/core/FixedViewMetrics.h"
 #include "host/core/HostLoop.h"
 #include "host/core/scenario/TemporaryDirectory.h"
 #include "platform/host/Presenter.h"
@@ -28,7 +29,9 @@ public:
     void reopen();
 
     [[nodiscard]] device::DevicePlatform& platform() { return *_platform; }
-    [[nodiscard]] PlatformServices services() { return _platform->servicesFor(*this); }
+    [[nodiscard]] PlatformServices services() {
+        return _platform->servicesFor(*this, _viewMetrics);
+    }
     /// The same, but with other bundles, which are not owned.
     [[nodiscard]] PlatformServices servicesWith(Bundles& bundles);
 
@@ -58,6 +61,7 @@ private:
 
     host::TemporaryDirectory _directory;
     host::HostLoop _loop;
+    host::FixedViewMetrics _viewMetrics;
     std::unique_ptr<device::DevicePlatform> _platform;
 };
 

@@ -141,7 +141,7 @@ DevicePlatform::~DevicePlatform() {
     _parts->workQueues.finish();
 }
 
-PlatformServices DevicePlatform::servicesFor(Presenter& presenter) {
+PlatformServices DevicePlatform::servicesFor(Presenter& presenter, ViewMetrics& viewMetrics) {
     return {.presenter = presenter,
             .accountStore = _parts->accountStore,
             .documentContainers = _parts->documentContainers,
@@ -155,7 +155,8 @@ PlatformServices DevicePlatform::servicesFor(Presenter& presenter) {
             .privacyConsentStore = _parts->privacyConsentStore,
             .applications = _parts->applications,
             .appTerminator = _parts->appTerminator,
-            .systemLog = _parts->systemLog};
+            .systemLog = _parts->systemLog,
+            .viewMetrics = viewMetrics};
 }
 
 DeviceAccountStore& DevicePlatform::accountStore() {

@@ -39,9 +39,10 @@ public:
     /// made over the services has gone before.
     ~DevicePlatform();
 
-    /// The services for one pane, which talks to its host through `presenter`. The platform and
-    /// the presenter outlive the pane.
-    [[nodiscard]] PlatformServices servicesFor(Presenter& presenter);
+    /// The services for one pane, which talks to its host through `presenter` and measures what it
+    /// shows with `viewMetrics`. Both belong to the host, are called on the main queue only and
+    /// outlive the pane, as the platform does.
+    [[nodiscard]] PlatformServices servicesFor(Presenter& presenter, ViewMetrics& viewMetrics);
 
     // What a host needs of the device beyond what a pane may ask.
 

@@ -17,6 +17,7 @@ class Presenter;
 class PrivacyConsentStore;
 class RestrictionsProfile;
 class SystemLog;
+class ViewMetrics;
 class WorkQueues;
 
 /// Everything that a pane reaches the platform through: handed to it when it is created. The host
@@ -37,6 +38,7 @@ struct PlatformServices {
     ServiceReference<Applications> applications;
     ServiceReference<AppTerminator> appTerminator;
     ServiceReference<SystemLog> systemLog;
+    ServiceReference<ViewMetrics> viewMetrics;
 };
 
 } // namespace nimbra

@@ -22,7 +22,7 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
         return std::unexpected(device.error());
     }
     session->_device = std::move(*device);
-    session->_services.emplace(session->_device->servicesFor(*session));
+    session->_services.emplace(session->_device->servicesFor(*session, session->_viewMetrics));
     if (const auto& locale = session->_configuration.locale) {
         session->_device->settings().overrideLocale(*locale);
     }

@@ -2,6 +2,7 @@
 
 #include "device/system/CurrentQueue.h"
 #include "host/core/AccountPage.h"
+#include "host/core/FixedViewMetrics.h"
 #include "host/core/HostLoop.h"
 #include "host/core/RowLookup.h"
 #include "platform/host/Presenter.h"
@@ -117,6 +118,7 @@ private:
     HostLoop _loop;
     device::CurrentQueueScope _scope;
     std::unique_ptr<device::DevicePlatform> _device;
+    FixedViewMetrics _viewMetrics;
     /// The device's own services, not traced.
     std::optional<PlatformServices> _services;
     std::unique_ptr<SessionTracer> _tracer;

@@ -14,6 +14,7 @@
 #include "platform/system/Localization.h"
 #include "platform/system/SystemLog.h"
 #include "tests/device/TestFiles.h"
+#include "tests/support/FakeViewMetrics.h"
 #include "tests/support/PumpedQueue.h"
 #include "tests/support/RecordingPresenter.h"
 #include "tests/support/TemporaryDirectory.h"
@@ -59,10 +60,12 @@ protected:
     }
 
     [[nodiscard]] test::PumpedQueue& mainQueue() { return _mainQueue; }
+    [[nodiscard]] test::FakeViewMetrics& viewMetrics() { return _viewMetrics; }
 
 private:
     test::TemporaryDirectory _directory;
     test::PumpedQueue _mainQueue{"main"};
+    test::FakeViewMetrics _viewMetrics;
 };
 
 TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
@@ -70,9 +73,10 @@ TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
     std::vector<std::string> calls;
     test::RecordingPresenter presenter(calls);
 
-    const PlatformServices services = platform->servicesFor(presenter);
+    const PlatformServices services = platform->servicesFor(presenter, viewMetrics());
 
     EXPECT_EQ(services.presenter.operator->(), &presenter);
+    EXPECT_EQ(services.viewMetrics.operator->(), &viewMetrics());
     EXPECT_TRUE(services.accountStore->accountWithIdentifier(AccountIdentifier("primary")));
     EXPECT_EQ(services.fileManager->tidewaterIdentityToken(), Text("token"));
     EXPECT_EQ(services.documentContainers->allContainers().size(), 1U);
@@ -98,7 +102,7 @@ TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
     std::vector<std::string> calls;
     test::RecordingPresenter presenter(calls);
 
-    const PlatformServices services = (*platform)->servicesFor(presenter);
+    const PlatformServices services = (*platform)->servicesFor(presenter, viewMetrics());
     const auto first =
         services.applications->applicationProxyForIdentifier(BundleIdentifier("com/a"));
     const auto second =
@@ -122,8 +126,9 @@ TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
     test::RecordingPresenter presenter(calls);
     std::promise<void> completed;
 
-    platform->servicesFor(presenter).documentContainers->forceRefreshAllContainersWithCompletion(
-        [&completed] { completed.set_value(); });
+    platform->servicesFor(presenter, viewMetrics())
+        .documentContainers->forceRefreshAllContainersWithCompletion(
+            [&completed] { completed.set_value(); });
 
     completed.get_future().wait();
 }
@@ -132,7 +137,7 @@ TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
     std::vector<std::string> calls;
     test::RecordingPresenter presenter(calls);
     auto platform = open();
-    const PlatformServices services = platform->servicesFor(presenter);
+    const PlatformServices services = platform->servicesFor(presenter, viewMetrics());
     const auto queue = services.workQueues->serialQueueWithLabel("late");
     std::promise<void> start;
     std::size_t found = 0;
@@ -160,7 +165,8 @@ TEST_F(DevicePlatformTest, ADeviceOfAnEarlierVersionHasNoConsentUntilSomeIsGiven
     const auto platform = open();
     std::vector<std::string> calls;
     test::RecordingPresenter presenter(calls);
-    PrivacyConsentStore& store = platform->servicesFor(presenter).privacyConsentStore;
+    PrivacyConsentStore& store =
+        platform->servicesFor(presenter, viewMetrics()).privacyConsentStore;
     const ConsentBundle bundle{BundleIdentifier("a")};
 
     const auto before = store.PRVAccessCopyInformation(kPRVServiceTidewater);

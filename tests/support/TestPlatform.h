@@ -13,6 +13,7 @@
 #include "tests/support/FakePrivacyConsentStore.h"
 #include "tests/support/FakeRestrictionsProfile.h"
 #include "tests/support/FakeSystemLog.h"
+#include "tests/support/FakeViewMetrics.h"
 #include "tests/support/PumpedQueues.h"
 #include "tests/support/RecordingPresenter.h"
 
@@ -39,6 +40,7 @@ struct TestPlatform {
     FakeApplications applications;
     FakeAppTerminator appTerminator{calls};
     FakeSystemLog systemLog;
+    FakeViewMetrics viewMetrics;
 
     [[nodiscard]] PlatformServices services() {
         return {.presenter = presenter,
@@ -54,7 +56,8 @@ struct TestPlatform {
                 .privacyConsentStore = privacyConsentStore,
                 .applications = applications,
                 .appTerminator = appTerminator,
-                .systemLog = systemLog};
+                .systemLog = systemLog,
+                .viewMetrics = viewMetrics};
     }
 };
 

@@ -1,0 +1,20 @@
+#pragma once
+
+#include "platform/views/ViewMetrics.h"
+
+namespace nimbra::host {
+
+/// The measures of a host without a screen: every character half as wide as the font is large, a
+/// line 1.2 times as high, so that a layout can be checked by hand. Any thread.
+class FixedViewMetrics final : public ViewMetrics {
+public:
+    [[nodiscard]] Font preferredFontForTextStyle(FontTextStyle style) const override;
+    [[nodiscard]] double lineHeight(const Font& font) const override;
+    /// Breaks at each line feed and, where a line would pass `width`, at spaces, which are dropped.
+    /// A word that is wider than `width` stands alone on its line.
+    [[nodiscard]] Size sizeOfText(const Text& text, const Font& font, double width,
+                                  int numberOfLines) const override;
+    [[nodiscard]] double progressBarHeight() const override;
+};
+
+} // namespace nimbra::host
