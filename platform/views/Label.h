@@ -28,7 +28,7 @@ public:
     void setTextColor(Color color) { _textColor = color; }
     [[nodiscard]] TextAlignment textAlignment() const { return _textAlignment; }
     void setTextAlignment(TextAlignment alignment) { _textAlignment = alignment; }
-    /// How many lines the label may take; 0 for as many as the text needs.
+    /// How many lines the label may take; 0, or a number below, for as many as the text needs.
     [[nodiscard]] int numberOfLines() const { return _numberOfLines; }
     void setNumberOfLines(int lines);
 

@@ -15,6 +15,12 @@ class View;
 
 /// What of a view a constraint speaks of.
 enum class LayoutAttribute : std::uint8_t { left, right, top, bottom, width, height, none };
+
+[[nodiscard]] constexpr bool isHorizontal(LayoutAttribute attribute) {
+    return attribute == LayoutAttribute::left || attribute == LayoutAttribute::right ||
+           attribute == LayoutAttribute::width;
+}
+
 enum class LayoutRelation : std::uint8_t { lessThanOrEqual, equal, greaterThanOrEqual };
 
 /// One rule of a layout: `firstItem.firstAttribute relation secondItem.secondAttribute + constant`.

@@ -17,8 +17,8 @@ public:
     [[nodiscard]] ProgressViewStyle style() const { return _style; }
     /// From 0 to 1.
     [[nodiscard]] float progress() const { return _progress; }
-    /// What lies outside 0 to 1 becomes the nearer of the two. `animated`: whether a host moves
-    /// the bar there instead of drawing it anew.
+    /// What lies outside 0 to 1 becomes the nearer of the two, what is no number 0. `animated`:
+    /// whether a host moves the bar there instead of drawing it anew.
     void setProgressAnimated(float progress, bool animated);
     /// Whether the last change is to be shown as a movement.
     [[nodiscard]] bool isProgressAnimated() const { return _animated; }

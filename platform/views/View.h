@@ -31,13 +31,16 @@ public:
     View(const PlatformServices& services, const Rect& frame);
     View(const View&) = delete;
     View& operator=(const View&) = delete;
+    /// Subviews that somebody else holds are left without a superview and out of the window.
     ~View() override;
 
     // The tree.
 
     /// Puts `view` in front of the subviews that are there; it leaves the view that it was in. It
-    /// moves into this view's window, or out of its own.
+    /// moves into this view's window, or out of its own, and is told before where that is another
+    /// one. To add a view to itself or below itself is a programming error that stops the program.
     void addSubview(const std::shared_ptr<View>& view);
+    /// Takes the view, and the constraints that speak of it, out of its superview and the window.
     void removeFromSuperview();
     [[nodiscard]] View* superview() const { return _superview; }
     [[nodiscard]] const std::vector<std::shared_ptr<View>>& subviews() const { return _subviews; }
@@ -50,7 +53,7 @@ public:
     /// for null: what the host does with the root of a tree. Every view is told before. Also where
     /// `window` is the one that it is in already.
     void moveToWindow(Window* window);
-    /// Is told before the view moves to `window` (null: out of its own).
+    /// Is told before the view moves to `window` (null: out of its own). Does nothing by default.
     virtual void willMoveToWindow(Window* window);
 
     // Looks.
@@ -66,7 +69,7 @@ public:
     /// The size that the content needs; `ViewNoIntrinsicMetric` in a direction that does not
     /// matter to it.
     [[nodiscard]] virtual Size intrinsicContentSize() const;
-    /// The height of the content where it is `width` wide.
+    /// The height of the content where it is `width` wide; by default what it is at any width.
     [[nodiscard]] virtual double heightForWidth(double width) const;
 
     /// Asks for a layout of this view in the next pass.
@@ -74,14 +77,18 @@ public:
     [[nodiscard]] bool needsLayout() const { return _needsLayout; }
     /// Runs one layout pass: lays out this view and all below it that ask for it, from here down.
     void layoutIfNeeded();
-    /// Gives the subviews their frames: by default those that the constraints ask for.
+    /// Gives the subviews their frames: by default those that the constraints ask for, where the
+    /// subviews do not stand as they are. What nothing is said of has no extent and stands at 0.
     virtual void layoutSubviews();
 
     /// Whether the view's own frame stands as it is (the default), or constraints give it one.
     [[nodiscard]] bool translatesAutoresizingMaskIntoConstraints() const { return _translates; }
     void setTranslatesAutoresizingMaskIntoConstraints(bool translates) { _translates = translates; }
 
-    /// Adds constraints between this view and its subviews, and asks for a layout.
+    /// Adds constraints between this view and its subviews, and asks for a layout. One that speaks
+    /// of another view, or of both directions at once, is a programming error that stops the
+    /// program. Where not all can hold, those of a lower priority give way, and among equals the
+    /// later ones; of required ones that is said in one line to `syslog`.
     void addConstraints(std::vector<LayoutConstraint> constraints);
     [[nodiscard]] const std::vector<LayoutConstraint>& constraints() const { return _constraints; }
 
@@ -97,8 +104,12 @@ protected:
     [[nodiscard]] const PlatformServices& services() const { return _services; }
 
 private:
+    [[nodiscard]] bool isInside(const View& view) const;
+    [[nodiscard]] bool canHold(const LayoutConstraint& constraint) const;
     void tellOfMoveTo(Window* window);
     void setWindow(Window* window);
+    /// Takes the view out of its superview, if it has one, without a word.
+    void leaveSuperview();
 
     PlatformServices _services;
     Rect _frame;
