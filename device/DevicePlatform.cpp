@@ -11,6 +11,7 @@
 #include "device/store/DeviceAccountStore.h"
 #include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceAbilities.h"
+#include "device/system/DeviceClock.h"
 #include "device/system/DeviceLocalization.h"
 #include "device/system/DeviceNotificationCenter.h"
 #include "device/system/DevicePreferences.h"
@@ -59,9 +60,10 @@ DevicePlatform::Databases::open(const DevicePaths& paths) {
 /// The services, each behind those that it uses. The threads end before the first of them goes.
 struct DevicePlatform::Parts {
     Parts(const DevicePaths& paths, DeviceSettings deviceSettings, Databases databases,
-          WorkQueue& mainQueue)
+          WorkQueue& mainQueue, std::shared_ptr<TimeSource> timeSource)
         : systemLog(paths, DeviceSystemLog::usualDestination()),
-          settings(std::move(deviceSettings)), preferences(paths, systemLog), workQueues(mainQueue),
+          settings(std::move(deviceSettings)), preferences(paths, systemLog),
+          workQueues(mainQueue, std::move(timeSource)), clock(workQueues.timeSource()),
           accountStore(std::move(databases.accounts), workQueues, systemLog),
           bundles(settings, classes), localization(settings, systemLog), abilities(settings),
           restrictions(paths, systemLog),
@@ -77,6 +79,7 @@ struct DevicePlatform::Parts {
     DeviceSettings settings;
     DevicePreferences preferences;
     DeviceWorkQueues workQueues;
+    DeviceClock clock;
     DeviceAccountStore accountStore;
     ClassRegistry classes;
     DeviceBundles bundles;
@@ -115,7 +118,8 @@ std::expected<void, Error> checkState(const DevicePaths& paths) {
 } // namespace
 
 std::expected<std::unique_ptr<DevicePlatform>, Error>
-DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue) {
+DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue,
+                     std::shared_ptr<TimeSource> timeSource) {
     const DevicePaths paths(root);
     if (const auto checked = checkState(paths); !checked) {
         return std::unexpected(checked.error());
@@ -131,8 +135,8 @@ DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue) {
     if (!databases) {
         return std::unexpected(databases.error());
     }
-    return std::unique_ptr<DevicePlatform>(new DevicePlatform(
-        std::make_unique<Parts>(paths, std::move(*settings), std::move(*databases), mainQueue)));
+    return std::unique_ptr<DevicePlatform>(new DevicePlatform(std::make_unique<Parts>(
+        paths, std::move(*settings), std::move(*databases), mainQueue, std::move(timeSource))));
 }
 
 DevicePlatform::DevicePlatform(std::unique_ptr<Parts> parts) : _parts(std::move(parts)) {}
@@ -181,6 +185,10 @@ DeviceSettings& DevicePlatform::settings() {
 
 DeviceWorkQueues& DevicePlatform::workQueues() {
     return _parts->workQueues;
+}
+
+const Clock& DevicePlatform::clock() const {
+    return _parts->clock;
 }
 
 ClassRegistry& DevicePlatform::classes() {

@@ -10,6 +10,7 @@
 
 namespace nimbra {
 class ClassRegistry;
+class Clock;
 class SystemLog;
 class WorkQueue;
 } // namespace nimbra
@@ -22,6 +23,7 @@ class DevicePreferences;
 class DevicePrivacyConsentStore;
 class DeviceSettings;
 class DeviceWorkQueues;
+class TimeSource;
 
 /// Every service of the platform on one device directory: made, wired and ended together.
 /// Main queue only; the services say for themselves where they may be used.
@@ -29,14 +31,17 @@ class DevicePlatform {
 public:
     /// The platform of the device in `root`, whose main queue is `mainQueue` (not owned, outlives
     /// the platform). A directory that lacks something or holds something unreadable is an error
-    /// that names the file and the place; nothing in it is changed.
+    /// that names the file and the place; nothing in it is changed. The clock and the timers run by
+    /// `timeSource`, by the machine's own time where none is given.
     [[nodiscard]] static std::expected<std::unique_ptr<DevicePlatform>, Error>
-    open(const std::filesystem::path& root, WorkQueue& mainQueue);
+    open(const std::filesystem::path& root, WorkQueue& mainQueue,
+         std::shared_ptr<TimeSource> timeSource = nullptr);
 
     DevicePlatform(const DevicePlatform&) = delete;
     DevicePlatform& operator=(const DevicePlatform&) = delete;
-    /// Waits for the background work under way, then ends the platform's threads. Every controller
-    /// made over the services has gone before.
+    /// Ends the timers and lets their handlers go, waits for the background work under way, then
+    /// ends the platform's threads. Every controller made over the services has gone before, but
+    /// for what those handlers hold.
     ~DevicePlatform();
 
     /// The services for one pane, which talks to its host through `presenter` and measures what it
@@ -52,6 +57,7 @@ public:
     [[nodiscard]] const DevicePreferences& preferences() const;
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();
+    [[nodiscard]] const Clock& clock() const;
     [[nodiscard]] ClassRegistry& classes();
     [[nodiscard]] SystemLog& systemLog();
 

@@ -1,7 +1,10 @@
 #include "device/system/DeviceWorkQueues.h"
 
 #include "device/system/DataOrSource.h"
+#include "device/system/MachineTime.h"
 #include "device/system/SerialQueue.h"
+#include "device/system/TimerSchedule.h"
+#include "device/system/TimerSource.h"
 
 #include <algorithm>
 #include <condition_variable>
@@ -150,14 +153,18 @@ private:
     std::shared_ptr<SerialQueue> _queue;
 };
 
-DeviceWorkQueues::DeviceWorkQueues(WorkQueue& mainQueue)
-    : _shared(std::make_shared<Shared>()), _mainQueue(mainQueue) {}
+DeviceWorkQueues::DeviceWorkQueues(WorkQueue& mainQueue, std::shared_ptr<TimeSource> timeSource)
+    : _shared(std::make_shared<Shared>()),
+      _timeSource(timeSource ? std::move(timeSource) : std::make_shared<MachineTime>()),
+      _timers(TimerSchedule::over(_timeSource)), _mainQueue(mainQueue) {}
 
 DeviceWorkQueues::~DeviceWorkQueues() {
     finish();
 }
 
 void DeviceWorkQueues::finish() {
+    // First: what the handlers held may queue work when it goes.
+    _timers->finish();
     _shared->finish();
 }
 
@@ -172,6 +179,14 @@ std::shared_ptr<WorkQueue> DeviceWorkQueues::serialQueueWithLabel(const std::str
 std::shared_ptr<DataOrEventSource>
 DeviceWorkQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
     return std::make_shared<DataOrSource>(std::move(queue));
+}
+
+std::shared_ptr<TimerEventSource> DeviceWorkQueues::timerSourceOnQueue(WorkQueue& queue) {
+    return std::make_shared<TimerSource>(_timers, queue);
+}
+
+std::shared_ptr<const TimeSource> DeviceWorkQueues::timeSource() const {
+    return _timeSource;
 }
 
 bool DeviceWorkQueues::isIdle() const {

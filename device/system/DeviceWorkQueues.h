@@ -8,16 +8,23 @@
 
 namespace nimbra::device {
 
+class TimeSource;
+class TimerSchedule;
+
 /// Serial queues on the platform's threads, beside the main queue that the host's loop runs.
-/// Any thread. A queue may outlive the threads, but then drops what is queued to it.
+/// Any thread. A queue may outlive the threads, but then drops what is queued to it. A timer that
+/// waits for its time is no work to do.
 class DeviceWorkQueues final : public WorkQueues {
 public:
-    /// `mainQueue` is not owned and outlives the queues.
-    explicit DeviceWorkQueues(WorkQueue& mainQueue);
+    /// `mainQueue` is not owned and outlives the queues. The timers run by `timeSource`, which is
+    /// no other platform's; by the machine's own time where none is given.
+    explicit DeviceWorkQueues(WorkQueue& mainQueue,
+                              std::shared_ptr<TimeSource> timeSource = nullptr);
     /// Ends the threads as `finish` does.
     ~DeviceWorkQueues() override;
 
-    /// Runs what is still queued, and what that queues, then ends the threads. Not on one of them.
+    /// Ends the timers and lets their handlers go on the calling thread, runs what is still queued,
+    /// and what that queues, then ends the threads. Not on one of them.
     void finish();
 
     [[nodiscard]] WorkQueue& mainQueue() override;
@@ -25,6 +32,10 @@ public:
     serialQueueWithLabel(const std::string& label) override;
     [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
+    [[nodiscard]] std::shared_ptr<TimerEventSource> timerSourceOnQueue(WorkQueue& queue) override;
+
+    /// What the timers run by.
+    [[nodiscard]] std::shared_ptr<const TimeSource> timeSource() const;
 
     /// Whether no background queue has work that is queued or under way.
     [[nodiscard]] bool isIdle() const;
@@ -37,6 +48,8 @@ private:
     class Queue;
 
     std::shared_ptr<Shared> _shared;
+    std::shared_ptr<TimeSource> _timeSource;
+    std::shared_ptr<TimerSchedule> _timers;
     WorkQueue& _mainQueue;
 };
 

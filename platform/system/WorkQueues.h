@@ -23,6 +23,11 @@ public:
     /// A new source of kind data-or, suspended, whose handler runs on `queue`.
     [[nodiscard]] virtual std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) = 0;
+
+    /// A new source of kind timer, suspended and unarmed, whose handler runs on `queue`, which is
+    /// not owned and outlives it.
+    [[nodiscard]] virtual std::shared_ptr<TimerEventSource>
+    timerSourceOnQueue(WorkQueue& queue) = 0;
 };
 
 } // namespace nimbra

@@ -30,6 +30,9 @@ public:
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override {
         return _queues.dataOrSourceOnQueue(std::move(queue));
     }
+    [[nodiscard]] std::shared_ptr<TimerEventSource> timerSourceOnQueue(WorkQueue& queue) override {
+        return _queues.timerSourceOnQueue(queue);
+    }
 
     /// Waits until what is queued by now has run.
     void finishWork() {

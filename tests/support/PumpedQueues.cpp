@@ -16,6 +16,10 @@ PumpedQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
     return std::make_shared<device::DataOrSource>(std::move(queue));
 }
 
+std::shared_ptr<TimerEventSource> PumpedQueues::timerSourceOnQueue(WorkQueue& /*queue*/) {
+    return _timers.emplace_back(std::make_shared<FakeTimer>());
+}
+
 std::shared_ptr<PumpedQueue> PumpedQueues::queueLabelled(const std::string& label) const {
     const auto behindLast = _queues.upper_bound(label);
     if (behindLast == _queues.begin() || std::prev(behindLast)->first != label) {
