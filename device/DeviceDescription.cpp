@@ -101,6 +101,12 @@ GivenDescription readDeviceDescription(const JsonReader& reader) {
     return given;
 }
 
+GivenDescription readScenarioDevice(const JsonReader& reader) {
+    GivenDescription given = readDeviceDescription(reader);
+    given.description.composesLastSyncText = false;
+    return given;
+}
+
 std::vector<std::string> keysWithoutEffect(const GivenDescription& given) {
     std::vector<std::string> keys;
     for (const LaterPart& part : laterParts) {

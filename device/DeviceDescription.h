@@ -75,6 +75,8 @@ struct DeviceDescription {
     /// The last sync as it was given: an instant or a sentence, null, or an object with an error.
     nlohmann::json lastSyncDate;
     nlohmann::json lastSyncText;
+    /// Whether nobody has given the sentence: the device composes it from the date.
+    bool composesLastSyncText = false;
     /// The table "Localizable" instead of the bundle's own.
     std::optional<std::map<std::string, std::string>> strings;
     bool paneBundleRegistered = true;
@@ -98,6 +100,9 @@ struct GivenDescription {
 /// Reads the object at `reader`. What is not as it should be, unknown keys included, is noted
 /// there; keys that this version checks but does not use yet are among `keys` all the same.
 [[nodiscard]] GivenDescription readDeviceDescription(const JsonReader& reader);
+
+/// The same for the device of a scenario, which composes no sentence: without one there is none.
+[[nodiscard]] GivenDescription readScenarioDevice(const JsonReader& reader);
 
 /// The keys of `given` that this version checks but that have no effect yet.
 [[nodiscard]] std::vector<std::string> keysWithoutEffect(const GivenDescription& given);

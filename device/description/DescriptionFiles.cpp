@@ -55,10 +55,13 @@ Json documentsContent(const DeviceDescription& description) {
                                   {"public", container.isPublic},
                                   {"registrationFails", container.registrationFails}});
     }
-    return Json{{"identity", orNull(description.identity)},
-                {"containers", containers},
-                {"lastSyncDate", description.lastSyncDate},
-                {"lastSyncText", description.lastSyncText}};
+    Json content{{"identity", orNull(description.identity)},
+                 {"containers", containers},
+                 {"lastSyncDate", description.lastSyncDate}};
+    if (!description.composesLastSyncText) {
+        content["lastSyncText"] = description.lastSyncText;
+    }
+    return content;
 }
 
 } // namespace

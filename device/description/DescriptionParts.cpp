@@ -174,9 +174,10 @@ void readDocuments(const JsonReader& reader, DeviceDescription& description) {
     description.lastSyncDate =
         readLastSync(reader.member("lastSyncDate"),
                      [](const JsonReader& date) { static_cast<void>(readInstant(date, {})); });
+    const JsonReader sentence = reader.member("lastSyncText");
     description.lastSyncText =
-        readLastSync(reader.member("lastSyncText"),
-                     [](const JsonReader& text) { static_cast<void>(text.string()); });
+        readLastSync(sentence, [](const JsonReader& text) { static_cast<void>(text.string()); });
+    description.composesLastSyncText = sentence.isAbsent();
 }
 
 void readStrings(const JsonReader& reader, DeviceDescription& description) {

@@ -128,6 +128,18 @@ TEST(DeviceDescriptionTest, NullMeansNoScreenNoVariantAndNoIdentity) {
     EXPECT_EQ(description.wirelessVariant, std::nullopt);
     EXPECT_EQ(description.identity, std::nullopt);
     EXPECT_TRUE(description.lastSyncDate.is_null());
+    EXPECT_TRUE(description.lastSyncText.is_null());
+    EXPECT_FALSE(description.composesLastSyncText);
+}
+
+TEST(DeviceDescriptionTest, ASentenceOfTheLastSyncThatIsLeftOutIsComposedButInAScenario) {
+    const std::string text = R"({"documents": {"lastSyncDate": "2024-03-05T13:00:00Z"}})";
+    const auto reader = JsonReader::parse(text, "scenario");
+    ASSERT_TRUE(reader);
+
+    EXPECT_TRUE(given(text).description.composesLastSyncText);
+    EXPECT_FALSE(readScenarioDevice(*reader).description.composesLastSyncText);
+    EXPECT_FALSE(given("{}").description.composesLastSyncText);
 }
 
 TEST(DeviceDescriptionTest, AnEmptyListOfAccountsMeansNone) {

@@ -1,5 +1,6 @@
 #include "device/DeviceDirectory.h"
 
+#include "device/description/DescriptionFiles.h"
 #include "device/store/AccountDatabase.h"
 #include "tests/device/TestFiles.h"
 #include "tests/support/TemporaryDirectory.h"
@@ -91,6 +92,25 @@ TEST_F(DeviceDirectoryTest, EveryPartOfADescriptionGetsItsFile) {
     EXPECT_EQ(contentOf(state("preferences/com.vantrel.marrow.json")),
               "{\n  \"log.level\": 1\n}\n");
     EXPECT_EQ(accounts(), std::vector{AccountIdentifier("primary")});
+}
+
+TEST_F(DeviceDirectoryTest, ASentenceThatTheDeviceComposesIsLeftOut) {
+    DeviceDescription description;
+    description.lastSyncDate = "2024-03-05T13:00:00Z";
+    description.composesLastSyncText = true;
+
+    create(description);
+
+    EXPECT_EQ(contentOf(state("documents.json")), R"({
+  "identity": null,
+  "containers": [],
+  "lastSyncDate": "2024-03-05T13:00:00Z"
+}
+)");
+    const auto read = readDescriptionFile(DevicePaths(root()), documentsFile);
+    ASSERT_TRUE(read) << read.error();
+    EXPECT_EQ(read->lastSyncDate, description.lastSyncDate);
+    EXPECT_TRUE(read->composesLastSyncText);
 }
 
 TEST_F(DeviceDirectoryTest, NothingButTheDeviceIsLeft) {

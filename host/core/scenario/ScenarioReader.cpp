@@ -55,7 +55,7 @@ std::expected<Scenario, Error> readScenario(std::string_view text, const std::st
     }
     reader->allowOnly({"device", "entry", "steps"});
     Scenario scenario;
-    scenario.device = device::readDeviceDescription(reader->member("device"));
+    scenario.device = device::readScenarioDevice(reader->member("device"));
     addNotes(scenario.device, "/device", scenario);
     scenario.entry = readEntry(reader->member("entry"), scenario.device.description);
 

@@ -83,7 +83,7 @@ Arguments post(const JsonReader& step) {
 
 Arguments change(const JsonReader& step) {
     step.allowOnly({"do", "device"});
-    return ChangeArguments{device::readDeviceDescription(required(step, "device", "an object"))};
+    return ChangeArguments{device::readScenarioDevice(required(step, "device", "an object"))};
 }
 
 // What follows is checked only: nothing in this version uses it.
