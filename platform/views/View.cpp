@@ -1,12 +1,14 @@
 #include "platform/views/View.h"
 
 #include "platform/system/Syslog.h"
+#include "platform/views/ConstraintSolver.h"
 
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
 #include <cstdlib>
 #include <iterator>
+#include <string>
 #include <syslog.h>
 #include <utility>
 
@@ -140,7 +142,17 @@ void View::layoutIfNeeded() {
     }
 }
 
-void View::layoutSubviews() {}
+void View::layoutSubviews() {
+    const ConstraintSolver solver(*this);
+    for (const ConstraintSolver::Placement& placement : solver.placements()) {
+        placement.view->setFrame(placement.frame);
+    }
+    const std::vector<std::string>& broken = solver.broken();
+    if (!broken.empty()) {
+        writeSyslog(LOG_WARNING, "a layout breaks " + std::to_string(broken.size()) +
+                                     " required constraints, the first is " + broken.front());
+    }
+}
 
 void View::addConstraints(std::vector<LayoutConstraint> constraints) {
     for (const LayoutConstraint& constraint : constraints) {
