@@ -12,6 +12,7 @@
 #include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceAbilities.h"
 #include "device/system/DeviceClock.h"
+#include "device/system/DeviceDistributedNotificationCenter.h"
 #include "device/system/DeviceLocalization.h"
 #include "device/system/DeviceNotificationCenter.h"
 #include "device/system/DevicePreferences.h"
@@ -64,6 +65,7 @@ struct DevicePlatform::Parts {
         : systemLog(paths, DeviceSystemLog::usualDestination()),
           settings(std::move(deviceSettings)), preferences(paths, systemLog),
           workQueues(mainQueue, std::move(timeSource)), clock(workQueues.timeSource()),
+          distributedNotificationCenter(paths, systemLog),
           accountStore(std::move(databases.accounts), workQueues, systemLog),
           bundles(settings, classes), localization(settings, systemLog), abilities(settings),
           restrictions(paths, systemLog),
@@ -80,6 +82,7 @@ struct DevicePlatform::Parts {
     DevicePreferences preferences;
     DeviceWorkQueues workQueues;
     DeviceClock clock;
+    DeviceDistributedNotificationCenter distributedNotificationCenter;
     DeviceAccountStore accountStore;
     ClassRegistry classes;
     DeviceBundles bundles;
@@ -142,6 +145,8 @@ DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue,
 DevicePlatform::DevicePlatform(std::unique_ptr<Parts> parts) : _parts(std::move(parts)) {}
 
 DevicePlatform::~DevicePlatform() {
+    // In this order: notifications from outside queue work, and so may blocks that are let go.
+    _parts->distributedNotificationCenter.finish();
     _parts->workQueues.finish();
 }
 
@@ -189,6 +194,10 @@ DeviceWorkQueues& DevicePlatform::workQueues() {
 
 const Clock& DevicePlatform::clock() const {
     return _parts->clock;
+}
+
+DistributedNotificationCenter& DevicePlatform::distributedNotificationCenter() {
+    return _parts->distributedNotificationCenter;
 }
 
 ClassRegistry& DevicePlatform::classes() {

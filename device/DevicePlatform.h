@@ -11,6 +11,7 @@
 namespace nimbra {
 class ClassRegistry;
 class Clock;
+class DistributedNotificationCenter;
 class SystemLog;
 class WorkQueue;
 } // namespace nimbra
@@ -39,9 +40,9 @@ public:
 
     DevicePlatform(const DevicePlatform&) = delete;
     DevicePlatform& operator=(const DevicePlatform&) = delete;
-    /// Ends the timers and lets their handlers go, waits for the background work under way, then
-    /// ends the platform's threads. Every controller made over the services has gone before, but
-    /// for what those handlers hold.
+    /// Ends the distributed notifications and the timers, lets their handlers go, waits for the
+    /// background work under way, then ends the platform's threads. Every controller made over the
+    /// services has gone before, but for what those handlers hold.
     ~DevicePlatform();
 
     /// The services for one pane, which talks to its host through `presenter` and measures what it
@@ -58,6 +59,7 @@ public:
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();
     [[nodiscard]] const Clock& clock() const;
+    [[nodiscard]] DistributedNotificationCenter& distributedNotificationCenter();
     [[nodiscard]] ClassRegistry& classes();
     [[nodiscard]] SystemLog& systemLog();
 

@@ -20,6 +20,7 @@ inline constexpr std::string_view kPreferencesDirectory = "/var/lib/nimbra/prefe
 inline constexpr std::string_view kRunningApplicationsDirectory = "/run/nimbra";
 inline constexpr std::string_view kPriorityHintsDirectory = "/run/nimbra/priority-hints";
 inline constexpr std::string_view kProgressDirectory = "/run/nimbra/progress";
+inline constexpr std::string_view kNotificationsDirectory = "/run/nimbra/notifications";
 inline constexpr std::string_view kApplicationsDirectory = "/usr/share/applications";
 inline constexpr std::string_view kLogFile = "/var/log/nimbra/settings.log";
 

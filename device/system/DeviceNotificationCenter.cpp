@@ -48,6 +48,16 @@ void DeviceNotificationCenter::removeObserver(const std::shared_ptr<ObserverToke
     }
 }
 
+void DeviceNotificationCenter::removeAllObservers() {
+    // Declared before the lock, as above.
+    std::list<std::shared_ptr<Registration>> removed;
+    const std::scoped_lock lock(_mutex);
+    removed.swap(_registrations);
+    for (const auto& registration : removed) {
+        registration->ended = true;
+    }
+}
+
 void DeviceNotificationCenter::postNotification(const Notification& notification) {
     std::vector<std::shared_ptr<Registration>> matching;
     {

@@ -14,6 +14,8 @@ public:
     [[nodiscard]] std::shared_ptr<ObserverToken>
     addObserverForName(const NotificationName& name, Observation observation) override;
     void removeObserver(const std::shared_ptr<ObserverToken>& token) override;
+    /// Ends every registration there is.
+    void removeAllObservers();
     void postNotification(const Notification& notification) override;
 
 private:

@@ -1,14 +1,10 @@
 #include "device/system/TimerSource.h"
 
-#include "device/system/DeviceWorkQueues.h"
-#include "device/system/StandingTime.h"
-#include "tests/support/PumpedQueue.h"
+#include "tests/device/system/TimerFixture.h"
 
 #include <algorithm>
 #include <gtest/gtest.h>
-#include <limits>
 #include <memory>
-#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -19,49 +15,8 @@ namespace {
 using std::chrono::hours;
 using std::chrono::nanoseconds;
 using std::chrono::seconds;
-using Times = std::vector<std::int64_t>;
 
-class TimerSourceTest : public testing::Test {
-protected:
-    [[nodiscard]] std::shared_ptr<TimerEventSource> makeTimer() {
-        return _queues->timerSourceOnQueue(_queue);
-    }
-    /// A running timer that notes the times of its calls, in seconds.
-    [[nodiscard]] std::shared_ptr<TimerEventSource> runningTimer(seconds first, seconds interval) {
-        auto timer = makeTimer();
-        timer->setEventHandler(noting());
-        timer->setTimer(first, interval, nanoseconds(0));
-        timer->resume();
-        return timer;
-    }
-    [[nodiscard]] std::function<void()> noting() {
-        return [this] { _calls.push_back(std::chrono::floor<seconds>(_time->elapsed()).count()); };
-    }
-    /// Goes from deadline to deadline, so that every call is made in its time.
-    void advance(nanoseconds duration) {
-        const nanoseconds target = _time->elapsed() + duration;
-        _queue.pump();
-        for (auto next = _time->nextDeadline(); next && *next <= target;
-             next = _time->nextDeadline()) {
-            _time->advanceTo(*next);
-            _queue.pump();
-        }
-        _time->advanceTo(target);
-        _queue.pump();
-    }
-
-    [[nodiscard]] const Times& calls() const { return _calls; }
-    [[nodiscard]] StandingTime& time() { return *_time; }
-    [[nodiscard]] test::PumpedQueue& queue() { return _queue; }
-    [[nodiscard]] DeviceWorkQueues& queues() { return *_queues; }
-    void endQueues() { _queues.reset(); }
-
-private:
-    std::shared_ptr<StandingTime> _time = std::make_shared<StandingTime>(Date(hours(400'000)));
-    test::PumpedQueue _queue{"main"};
-    std::optional<DeviceWorkQueues> _queues{std::in_place, _queue, _time};
-    Times _calls;
-};
+using TimerSourceTest = test::TimerFixture;
 
 TEST_F(TimerSourceTest, ATimerFallsDueAfterTheFirstDelayAndThenEveryInterval) {
     for (const auto& [first, times] : {std::pair(seconds(60), Times{60, 120, 180}),
@@ -366,80 +321,6 @@ TEST_F(TimerSourceTest, TimesBehindTheEndOfTimeNeverCome) {
     advance(hours(1'000));
 
     EXPECT_TRUE(time().nextDeadline());
-}
-
-/// An object that owns its timer and is held by the timer's handler.
-struct Owner {
-    std::shared_ptr<TimerEventSource> timer;
-    int calls = 0;
-};
-
-std::weak_ptr<Owner> ownerOfTimer(std::shared_ptr<TimerEventSource> timer) {
-    const auto owner = std::make_shared<Owner>(std::move(timer));
-    owner->timer->setEventHandler([owner] { ++owner->calls; });
-    owner->timer->setTimer(seconds(60), seconds(60), nanoseconds(0));
-    owner->timer->resume();
-    return owner;
-}
-
-TEST_F(TimerSourceTest, AHandlerThatHoldsTheOwnerIsLetGoWhenThePlatformShutsDown) {
-    const auto running = ownerOfTimer(makeTimer());
-    const auto suspended = ownerOfTimer(makeTimer());
-    suspended.lock()->timer->suspend();
-    const auto queued = ownerOfTimer(makeTimer());
-    queued.lock()->timer->setTimer(seconds(0), seconds(0), nanoseconds(0));
-    ASSERT_FALSE(running.expired() || suspended.expired() || queued.expired());
-
-    queues().finish();
-
-    EXPECT_TRUE(running.expired());
-    EXPECT_TRUE(suspended.expired());
-    EXPECT_TRUE(queued.expired());
-    EXPECT_EQ(time().nextDeadline(), std::nullopt);
-    queue().pump();
-}
-
-TEST_F(TimerSourceTest, AfterTheShutdownTimersCallNothingAndHoldNothing) {
-    const auto earlier = runningTimer(seconds(1), seconds(1));
-    queues().finish();
-    const auto held = std::make_shared<int>(0);
-    const auto late = makeTimer();
-
-    for (const auto& timer : {earlier, late}) {
-        timer->setEventHandler([held] { ++*held; });
-        timer->setTimer(seconds(0), seconds(1), nanoseconds(0));
-        timer->resume();
-    }
-    advance(seconds(10));
-    endQueues();
-    earlier->suspend();
-    late->cancel();
-
-    EXPECT_EQ(held.use_count(), 1);
-    EXPECT_EQ(*held, 0);
-    EXPECT_EQ(calls(), Times{});
-}
-
-TEST_F(TimerSourceTest, WhatTheHandlersHeldMayStillQueueWorkAtTheShutdown) {
-    struct Farewell {
-        std::shared_ptr<WorkQueue> queue;
-        bool& said;
-        Farewell(std::shared_ptr<WorkQueue> lastQueue, bool& isSaid)
-            : queue(std::move(lastQueue)), said(isSaid) {}
-        Farewell(const Farewell&) = delete;
-        Farewell& operator=(const Farewell&) = delete;
-        ~Farewell() {
-            queue->async([&said = said] { said = true; });
-        }
-    };
-    bool said = false;
-    const auto timer = makeTimer();
-    auto farewell = std::make_shared<Farewell>(queues().serialQueueWithLabel("last"), said);
-    timer->setEventHandler([farewell = std::move(farewell)] {});
-
-    queues().finish();
-
-    EXPECT_TRUE(said);
 }
 
 } // namespace
