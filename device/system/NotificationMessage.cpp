@@ -4,6 +4,7 @@
 
 #include <array>
 #include <charconv>
+#include <memory>
 #include <nlohmann/json.hpp>
 #include <system_error>
 #include <utility>
@@ -25,8 +26,8 @@ struct Encoder {
     Json operator()(std::int64_t value) const { return {{"integer", value}}; }
     Json operator()(double value) const {
         std::array<char, 32> digits{}; // the shortest form that reads back the same has 24 at most
-        const auto end = std::to_chars(digits.begin(), digits.end(), value).ptr;
-        return {{"number", std::string(digits.begin(), end)}};
+        const char* const end = std::to_chars(digits.begin(), digits.end(), value).ptr;
+        return {{"number", std::string(digits.cbegin(), end)}};
     }
     Json operator()(const Text& value) const {
         return {{"text", value ? Json(value.string()) : Json(nullptr)}};
@@ -40,7 +41,7 @@ struct Encoder {
 double parseNumber(const JsonReader& reader) {
     const std::string digits = reader.string();
     double value = 0;
-    const char* const end = digits.data() + digits.size();
+    const char* const end = std::to_address(digits.end());
     const auto parsed = std::from_chars(digits.data(), end, value);
     if (parsed.ec != std::errc() || parsed.ptr != end) {
         reader.expected("the digits of a number");

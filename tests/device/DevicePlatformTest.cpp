@@ -7,9 +7,12 @@
 #include "device/system/DevicePreferences.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/DeviceWorkQueues.h"
+#include "device/system/StandingTime.h"
 #include "platform/accounts/AccountStore.h"
 #include "platform/apps/Applications.h"
 #include "platform/documents/DocumentContainers.h"
+#include "platform/system/Clock.h"
+#include "platform/system/DistributedNotificationCenter.h"
 #include "platform/system/FileManager.h"
 #include "platform/system/Localization.h"
 #include "platform/system/SystemLog.h"
@@ -118,6 +121,48 @@ TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
     ASSERT_TRUE(records && records->size() == 1);
     EXPECT_EQ(records->front().kPRVInfoBundle->identifier(), BundleIdentifier("com/a"));
     EXPECT_EQ(records->front().kPRVInfoGranted, std::nullopt);
+}
+
+TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
+    const Date start(std::chrono::hours(400'000));
+    const auto time = std::make_shared<StandingTime>(start);
+    const auto platform = DevicePlatform::open(root(), mainQueue(), time);
+    ASSERT_TRUE(platform) << platform.error();
+    Date fired;
+    const auto timer = (*platform)->workQueues().timerSourceOnQueue(mainQueue());
+    timer->setEventHandler([&] { fired = (*platform)->clock().now(); });
+    timer->setTimer(std::chrono::seconds(60), std::chrono::seconds(60),
+                    std::chrono::nanoseconds(0));
+    timer->resume();
+    EXPECT_EQ((*platform)->clock().now(), start);
+
+    time->advance(std::chrono::seconds(60));
+    mainQueue().pump();
+
+    EXPECT_EQ(fired, start + std::chrono::seconds(60));
+}
+
+TEST_F(DevicePlatformTest, WhatTimersAndDistributedNotificationsHoldGoesWithThePlatform) {
+    const auto held = std::make_shared<int>(0);
+    auto platform = open();
+    auto timer = platform->workQueues().timerSourceOnQueue(mainQueue());
+    timer->setEventHandler([held, timer] { ++*held; });
+    timer->setTimer(std::chrono::hours(1), std::chrono::hours(1), std::chrono::nanoseconds(0));
+    timer->resume();
+    timer.reset();
+    static_cast<void>(platform->distributedNotificationCenter().addObserverForName(
+        MRDidUpdateLastSyncStatusDistributedNotification,
+        {.queue = &mainQueue(), .usingBlock = [held](const Notification&) { ++*held; }}));
+    platform->distributedNotificationCenter().postNotification(
+        {.name = MRDidUpdateLastSyncStatusDistributedNotification});
+    mainQueue().pump();
+    EXPECT_EQ(*held, 1);
+    EXPECT_EQ(held.use_count(), 3);
+
+    platform.reset();
+
+    EXPECT_EQ(held.use_count(), 1);
+    EXPECT_TRUE(std::filesystem::is_empty(root() / "run/nimbra/notifications"));
 }
 
 TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
