@@ -26,7 +26,7 @@ std::size_t codePointsIn(std::string_view utf8) {
 std::size_t charactersIn(double width, const Font& font) {
     constexpr double tolerance = 1e-6;
     constexpr double most = 1e9;
-    const double fitting = std::floor(width / (font.pointSize / 2) + tolerance);
+    const double fitting = std::floor((width / (font.pointSize / 2)) + tolerance);
     return fitting > 0 ? static_cast<std::size_t>(std::min(fitting, most)) : 0;
 }
 

@@ -208,12 +208,11 @@ bool VisualFormatReader::readConnection(Connection& connection) {
 }
 
 bool VisualFormatReader::readPredicates(Subject subject, std::vector<Predicate>& predicates) {
-    take("(");
-    do {
+    for (bool isMore = take("("); isMore; isMore = take(",")) {
         if (!readPredicate(subject, predicates.emplace_back())) {
             return false;
         }
-    } while (take(","));
+    }
     return take(")") || fail("a comma or a closing parenthesis");
 }
 

@@ -39,24 +39,23 @@ View::~View() {
     }
 }
 
-void View::addSubview(const std::shared_ptr<View>& view) {
+void View::addSubview(std::shared_ptr<View> view) {
     if (!view) {
         stopWith("there is no view to be added");
     }
     if (isInside(*view)) {
         stopWith("a view cannot be added to itself or to what is in it");
     }
-    // The caller's pointer may be the one that its superview gives up.
-    const std::shared_ptr<View> added = view;
-    const bool moves = added->_window != _window;
+    View& added = *view;
+    const bool moves = added._window != _window;
     if (moves) {
-        added->tellOfMoveTo(_window);
+        added.tellOfMoveTo(_window);
     }
-    added->leaveSuperview();
-    _subviews.push_back(added);
-    added->_superview = this;
+    added.leaveSuperview();
+    _subviews.push_back(std::move(view));
+    added._superview = this;
     if (moves) {
-        added->setWindow(_window);
+        added.setWindow(_window);
     }
     setNeedsLayout();
 }
@@ -103,6 +102,7 @@ void View::moveToWindow(Window* window) {
 
 void View::willMoveToWindow(Window* /*window*/) {}
 
+// NOLINTNEXTLINE(misc-no-recursion): a tree
 void View::tellOfMoveTo(Window* window) {
     willMoveToWindow(window);
     // A copy, as a view that is told may change the tree.
@@ -111,6 +111,7 @@ void View::tellOfMoveTo(Window* window) {
     }
 }
 
+// NOLINTNEXTLINE(misc-no-recursion): a tree
 void View::setWindow(Window* window) {
     _window = window;
     for (const std::shared_ptr<View>& view : _subviews) {
@@ -133,6 +134,7 @@ double View::heightForWidth(double /*width*/) const {
     return intrinsicContentSize().height;
 }
 
+// NOLINTNEXTLINE(misc-no-recursion): a tree
 void View::layoutIfNeeded() {
     if (std::exchange(_needsLayout, false)) {
         layoutSubviews();

@@ -39,7 +39,7 @@ public:
     /// Puts `view` in front of the subviews that are there; it leaves the view that it was in. It
     /// moves into this view's window, or out of its own, and is told before where that is another
     /// one. To add a view to itself or below itself is a programming error that stops the program.
-    void addSubview(const std::shared_ptr<View>& view);
+    void addSubview(std::shared_ptr<View> view);
     /// Takes the view, and the constraints that speak of it, out of its superview and the window.
     void removeFromSuperview();
     [[nodiscard]] View* superview() const { return _superview; }
