@@ -1,10 +1,12 @@
 #include "tests/fuzz/VisualFormatChecks.h"
 
 #include "platform/system/Syslog.h"
+#include "platform/views/ConstraintSolver.h"
 #include "platform/views/Label.h"
 #include "platform/views/ProgressView.h"
 #include "tests/support/TestPlatform.h"
 
+#include <algorithm>
 #include <cmath>
 #include <limits>
 
@@ -64,6 +66,48 @@ std::string faultIn(const Rect& frame) {
     return frame.size.width < 0 || frame.size.height < 0 ? "a size is negative" : "";
 }
 
+/// An edge or an extent of a view in the coordinates of `root`'s subviews.
+double valueOf(const View* view, LayoutAttribute attribute, const View& root) {
+    if (view == nullptr) {
+        return 0;
+    }
+    const Size size = view->frame().size;
+    const Point origin = view == &root ? Point{} : view->frame().origin;
+    switch (attribute) {
+    case LayoutAttribute::left:
+        return origin.x;
+    case LayoutAttribute::right:
+        return origin.x + size.width;
+    case LayoutAttribute::top:
+        return origin.y;
+    case LayoutAttribute::bottom:
+        return origin.y + size.height;
+    case LayoutAttribute::width:
+        return size.width;
+    case LayoutAttribute::height:
+        return size.height;
+    case LayoutAttribute::none:
+        break;
+    }
+    return 0;
+}
+
+bool holds(const LayoutConstraint& rule, const View& root) {
+    constexpr double tolerance = 1e-3;
+    const double excess = valueOf(rule.firstItem, rule.firstAttribute, root) -
+                          valueOf(rule.secondItem, rule.secondAttribute, root) - rule.constant;
+    return (excess <= tolerance || rule.relation == LayoutRelation::greaterThanOrEqual) &&
+           (excess >= -tolerance || rule.relation == LayoutRelation::lessThanOrEqual);
+}
+
+/// Whether as many required constraints hold as the solver says.
+bool isSolvedAsSaid(const View& root) {
+    const auto broken = std::ranges::count_if(root.constraints(), [&](const auto& rule) {
+        return rule.priority >= requiredLayoutPriority && !holds(rule, root);
+    });
+    return static_cast<std::size_t>(broken) == ConstraintSolver(root).broken().size();
+}
+
 TestPlatform& platform() {
     static TestPlatform platform;
     return platform;
@@ -91,6 +135,9 @@ std::string faultInVisualFormat(std::string_view format) {
             if (auto found = faultIn(view->frame()); !found.empty()) {
                 fault = std::move(found);
             }
+        }
+        if (!isSolvedAsSaid(*scene.root)) {
+            fault = "other required constraints are broken than the solver says";
         }
         if (scene.box->frame() != Rect{{1, 2}, {3, 4}}) {
             fault = "a view that stands as it is has moved";
