@@ -6,8 +6,12 @@
 #include "device/apps/DeviceApplications.h"
 #include "device/bundles/DeviceBundles.h"
 #include "device/description/DescriptionFiles.h"
+#include "device/documents/DeviceDaemonConnection.h"
 #include "device/documents/DeviceDocumentContainers.h"
 #include "device/documents/DeviceFileManager.h"
+#include "device/documents/DeviceProgressReports.h"
+#include "device/documents/ProgressFolder.h"
+#include "device/documents/ProgressPublisher.h"
 #include "device/store/DeviceAccountStore.h"
 #include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceAbilities.h"
@@ -74,8 +78,13 @@ struct DevicePlatform::Parts {
           applications(paths, applicationFolders(paths, processEnvironment), settings, systemLog),
           appTerminator(DeviceAppTerminator::waysOn(paths, systemLog), workQueues, systemLog),
           fileManager(DocumentsFile(paths, systemLog)),
-          documentContainers(paths, workQueues.serialQueueWithLabel("document-refresh"),
-                             systemLog) {}
+          documentContainers(paths, workQueues.serialQueueWithLabel("document-refresh"), systemLog),
+          progressReports(mainQueue), progressPublisher(mainQueue, progressReports),
+          progressFolder(paths, progressPublisher, daemonConnection.mobileDocumentsURL(),
+                         systemLog) {
+        // A process that shows no progress needs no thread for it.
+        progressReports.setFirstSubscriptionHandler([this] { progressFolder.start(); });
+    }
 
     DeviceSystemLog systemLog;
     DeviceSettings settings;
@@ -95,6 +104,10 @@ struct DevicePlatform::Parts {
     DeviceNotificationCenter notificationCenter;
     DeviceFileManager fileManager;
     DeviceDocumentContainers documentContainers;
+    DeviceDaemonConnection daemonConnection;
+    DeviceProgressReports progressReports;
+    ProgressPublisher progressPublisher;
+    ProgressFolder progressFolder;
 };
 
 namespace {
@@ -145,9 +158,12 @@ DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue,
 DevicePlatform::DevicePlatform(std::unique_ptr<Parts> parts) : _parts(std::move(parts)) {}
 
 DevicePlatform::~DevicePlatform() {
-    // In this order: notifications from outside queue work, and so may blocks that are let go.
+    // In this order: what comes from outside queues work, and so may blocks that are let go.
+    _parts->progressFolder.finish();
     _parts->distributedNotificationCenter.finish();
     _parts->workQueues.finish();
+    // Views, which the handlers hold, may still ask services for something as they go.
+    _parts->progressReports.finish();
 }
 
 PlatformServices DevicePlatform::servicesFor(Presenter& presenter, ViewMetrics& viewMetrics) {
@@ -178,6 +194,18 @@ DeviceBundles& DevicePlatform::bundles() {
 
 DevicePrivacyConsentStore& DevicePlatform::privacyConsentStore() {
     return _parts->privacyConsentStore;
+}
+
+const DaemonConnection& DevicePlatform::daemonConnection() const {
+    return _parts->daemonConnection;
+}
+
+ProgressReports& DevicePlatform::progressReports() {
+    return _parts->progressReports;
+}
+
+ProgressPublisher& DevicePlatform::progressPublisher() {
+    return _parts->progressPublisher;
 }
 
 const DevicePreferences& DevicePlatform::preferences() const {

@@ -12,6 +12,8 @@ namespace nimbra {
 class ClassRegistry;
 class Clock;
 class DistributedNotificationCenter;
+class DaemonConnection;
+class ProgressReports;
 class SystemLog;
 class WorkQueue;
 } // namespace nimbra
@@ -25,6 +27,7 @@ class DevicePrivacyConsentStore;
 class DeviceSettings;
 class DeviceWorkQueues;
 class TimeSource;
+class ProgressPublisher;
 
 /// Every service of the platform on one device directory: made, wired and ended together.
 /// Main queue only; the services say for themselves where they may be used.
@@ -55,6 +58,9 @@ public:
     [[nodiscard]] DeviceAccountStore& accountStore();
     [[nodiscard]] DeviceBundles& bundles();
     [[nodiscard]] DevicePrivacyConsentStore& privacyConsentStore();
+    [[nodiscard]] const DaemonConnection& daemonConnection() const;
+    [[nodiscard]] ProgressReports& progressReports();
+    [[nodiscard]] ProgressPublisher& progressPublisher();
     [[nodiscard]] const DevicePreferences& preferences() const;
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();

@@ -15,7 +15,6 @@
 #include <cstring>
 #include <poll.h>
 #include <pthread.h>
-#include <set>
 #include <string_view>
 #include <sys/eventfd.h>
 #include <sys/inotify.h>
@@ -61,7 +60,9 @@ void ProgressFolder::start() {
         _log.write(LogLevel::error, watched.error().description);
         return;
     }
-    _thread = std::thread([this] { run(); });
+    if (auto names = namesInFolder()) {
+        _thread = std::thread([this, names = std::move(*names)] { run(names); });
+    }
 }
 
 void ProgressFolder::finish() {
@@ -97,9 +98,9 @@ std::expected<void, Error> ProgressFolder::makeAndWatch() {
     return {};
 }
 
-void ProgressFolder::run() {
+void ProgressFolder::run(const std::set<std::string>& firstFiles) {
     ::pthread_setname_np(::pthread_self(), "progress-folder");
-    readAll();
+    readAll(firstFiles);
     std::array<pollfd, 2> files{pollfd{.fd = _watch->number(), .events = POLLIN, .revents = 0},
                                 pollfd{.fd = _end->number(), .events = POLLIN, .revents = 0}};
     while (true) {
@@ -143,7 +144,9 @@ bool ProgressFolder::readEvents() {
             return false;
         }
         if ((event.mask & IN_Q_OVERFLOW) != 0) {
-            readAll();
+            if (const auto names = namesInFolder()) {
+                readAll(*names);
+            }
         } else if ((event.mask & (IN_DELETE | IN_MOVED_FROM)) != 0) {
             fileGone(name);
         } else {
@@ -153,16 +156,20 @@ bool ProgressFolder::readEvents() {
     return true;
 }
 
-void ProgressFolder::readAll() {
+std::optional<std::set<std::string>> ProgressFolder::namesInFolder() {
     const auto files = entriesOfDirectory(_directory);
     if (!files) {
         _log.write(LogLevel::error, files.error().description);
-        return;
+        return std::nullopt;
     }
     std::set<std::string> names;
     for (const std::filesystem::path& file : *files) {
         names.insert(file.filename());
     }
+    return names;
+}
+
+void ProgressFolder::readAll(const std::set<std::string>& names) {
     for (const auto& [name, values] : std::map(_published)) {
         if (!names.contains(name)) {
             fileGone(name);
@@ -182,10 +189,11 @@ void ProgressFolder::fileChanged(const std::string& name) {
     if (!values) {
         // One that has gone since is told of by an event of its own.
         if (isThere(path)) {
-            _log.write(LogLevel::error, values.error().description);
+            reportBadFile(name, values.error());
         }
         return;
     }
+    _reported.erase(name);
     const auto known = _published.find(name);
     if (known == _published.end()) {
         check(_publisher.publish(identifierOf(name), _url, *values));
@@ -200,6 +208,7 @@ void ProgressFolder::fileChanged(const std::string& name) {
 }
 
 void ProgressFolder::fileGone(const std::string& name) {
+    _reported.erase(name);
     if (_published.erase(name) > 0) {
         check(_publisher.unpublish(identifierOf(name)));
     }
@@ -208,6 +217,14 @@ void ProgressFolder::fileGone(const std::string& name) {
 void ProgressFolder::allGone() {
     for (const auto& [name, values] : std::map(_published)) {
         fileGone(name);
+    }
+}
+
+void ProgressFolder::reportBadFile(const std::string& name, const Error& error) {
+    std::string& reported = _reported[name];
+    if (reported != error.description) {
+        reported = error.description;
+        _log.write(LogLevel::error, reported);
     }
 }
 

@@ -9,6 +9,7 @@
 #include <filesystem>
 #include <map>
 #include <optional>
+#include <set>
 #include <string>
 #include <thread>
 
@@ -47,13 +48,17 @@ public:
 
 private:
     [[nodiscard]] std::expected<void, Error> makeAndWatch();
-    void run();
+    void run(const std::set<std::string>& firstFiles);
     /// Does what the watch has told; false once the folder has gone.
     [[nodiscard]] bool readEvents();
-    void readAll();
+    /// The names of what stands in the folder now; nothing, with a line in the log, on an error.
+    [[nodiscard]] std::optional<std::set<std::string>> namesInFolder();
+    /// Makes what is published what the files `names` say.
+    void readAll(const std::set<std::string>& names);
     void fileChanged(const std::string& name);
     void fileGone(const std::string& name);
     void allGone();
+    void reportBadFile(const std::string& name, const Error& error);
     void check(const std::expected<void, Error>& outcome);
 
     DevicePaths _paths;
@@ -66,6 +71,8 @@ private:
     std::optional<Descriptor> _end;
     /// What is published of each file. Only the thread's.
     std::map<std::string, ProgressValues> _published;
+    /// What the log was told of each bad file, so as not to repeat it. Only the thread's.
+    std::map<std::string, std::string> _reported;
     std::thread _thread;
 };
 

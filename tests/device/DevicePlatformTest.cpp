@@ -1,6 +1,7 @@
 #include "device/DevicePlatform.h"
 
 #include "device/DeviceDirectory.h"
+#include "device/documents/ProgressPublisher.h"
 #include "device/store/ConsentBundle.h"
 #include "device/store/DeviceAccountStore.h"
 #include "device/store/DevicePrivacyConsentStore.h"
@@ -10,7 +11,9 @@
 #include "device/system/StandingTime.h"
 #include "platform/accounts/AccountStore.h"
 #include "platform/apps/Applications.h"
+#include "platform/documents/DaemonConnection.h"
 #include "platform/documents/DocumentContainers.h"
+#include "platform/documents/ProgressReports.h"
 #include "platform/system/Clock.h"
 #include "platform/system/DistributedNotificationCenter.h"
 #include "platform/system/FileManager.h"
@@ -163,6 +166,33 @@ TEST_F(DevicePlatformTest, WhatTimersAndDistributedNotificationsHoldGoesWithTheP
 
     EXPECT_EQ(held.use_count(), 1);
     EXPECT_TRUE(std::filesystem::is_empty(root() / "run/nimbra/notifications"));
+}
+
+TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
+    std::vector<std::string> seen;
+    const auto held = std::make_shared<int>();
+    auto platform = open();
+    const auto subscribe = [&] {
+        return platform->progressReports()._addSubscriberForFileURLWithPublishingHandler(
+            platform->daemonConnection().mobileDocumentsURL(),
+            [&seen, held](const std::shared_ptr<ProgressReport>& progress) {
+                seen.push_back(progress->localizedDescription().string());
+                return [held] {};
+            });
+    };
+    EXPECT_FALSE(std::filesystem::exists(root() / "run/nimbra/progress"));
+
+    const auto subscriber = subscribe();
+    const auto published = platform->progressPublisher().publish(
+        "id", "file:///var/mobile/NimbraDrive/a", {.description = "one"});
+    mainQueue().pump();
+
+    EXPECT_TRUE(published);
+    EXPECT_EQ(seen, std::vector<std::string>{"one"});
+    EXPECT_TRUE(std::filesystem::exists(root() / "run/nimbra/progress"));
+    platform.reset();
+    mainQueue().pump();
+    EXPECT_EQ(held.use_count(), 1);
 }
 
 TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
