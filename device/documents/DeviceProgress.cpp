@@ -1,6 +1,7 @@
 #include "device/documents/DeviceProgress.h"
 
 #include <algorithm>
+#include <ranges>
 #include <utility>
 
 namespace nimbra::device {
@@ -49,14 +50,14 @@ void DeviceProgress::addObserver(const std::shared_ptr<KeyValueObserver>& observ
 
 void DeviceProgress::removeObserverForKeyPath(const KeyValueObserver& observer,
                                               const KeyPath& keyPath) {
-    const auto newest = std::find_if(_observers.rbegin(), _observers.rend(),
-                                     [&](const std::shared_ptr<Observer>& candidate) {
-                                         // Where an observer has gone, another one may stand at its
-                                         // address.
-                                         return candidate->registration.forKeyPath == keyPath &&
-                                                candidate->observer.lock().get() == &observer;
-                                     });
-    if (newest != _observers.rend()) {
+    const auto newest = std::ranges::find_if(
+        _observers.rbegin(), _observers.rend(), [&](const std::shared_ptr<Observer>& candidate) {
+            // Where an observer has gone, another one may stand at its
+            // address.
+            return candidate->registration.forKeyPath == keyPath &&
+                   candidate->observer.lock().get() == &observer;
+        });
+    if (newest != std::views::reverse(_observers).end()) {
         (*newest)->ended = true;
         _observers.erase(std::next(newest).base());
     }

@@ -14,7 +14,7 @@ Text textOrNull(const JsonReader& reader) {
 
 double readFraction(const JsonReader& reader) {
     const double fraction = reader.number();
-    if (!(fraction >= 0 && fraction <= 1)) {
+    if (fraction < 0 || fraction > 1) {
         reader.expected("a number from 0 to 1");
     }
     return fraction;
