@@ -1,7 +1,7 @@
 #include "device/documents/DeviceProgress.h"
 
 #include <algorithm>
-#include <ranges>
+#include <iterator>
 #include <utility>
 
 namespace nimbra::device {
@@ -52,12 +52,11 @@ void DeviceProgress::removeObserverForKeyPath(const KeyValueObserver& observer,
                                               const KeyPath& keyPath) {
     const auto newest = std::ranges::find_if(
         _observers.rbegin(), _observers.rend(), [&](const std::shared_ptr<Observer>& candidate) {
-            // Where an observer has gone, another one may stand at its
-            // address.
+            // Where an observer has gone, another one may stand at its address.
             return candidate->registration.forKeyPath == keyPath &&
                    candidate->observer.lock().get() == &observer;
         });
-    if (newest != std::views::reverse(_observers).end()) {
+    if (newest != _observers.rend()) {
         (*newest)->ended = true;
         _observers.erase(std::next(newest).base());
     }
