@@ -9,6 +9,7 @@
 #include "device/documents/DeviceDaemonConnection.h"
 #include "device/documents/DeviceDocumentContainers.h"
 #include "device/documents/DeviceFileManager.h"
+#include "device/documents/DeviceLastSync.h"
 #include "device/documents/DeviceProgressReports.h"
 #include "device/documents/ProgressFolder.h"
 #include "device/documents/ProgressPublisher.h"
@@ -79,10 +80,11 @@ struct DevicePlatform::Parts {
           appTerminator(DeviceAppTerminator::waysOn(paths, systemLog), workQueues, systemLog),
           fileManager(DocumentsFile(paths, systemLog)),
           documentContainers(paths, workQueues.serialQueueWithLabel("document-refresh"), systemLog),
-          progressReports(mainQueue), progressPublisher(mainQueue, progressReports),
+          lastSync(paths, settings, clock), progressReports(mainQueue),
+          progressPublisher(mainQueue, progressReports),
           progressFolder(paths, progressPublisher, daemonConnection.mobileDocumentsURL(),
                          systemLog) {
-        // A process that shows no progress needs no thread for it.
+        // Who shows no progress needs no thread that looks for it.
         progressReports.setFirstSubscriptionHandler([this] { progressFolder.start(); });
     }
 
@@ -105,6 +107,7 @@ struct DevicePlatform::Parts {
     DeviceFileManager fileManager;
     DeviceDocumentContainers documentContainers;
     DeviceDaemonConnection daemonConnection;
+    DeviceLastSync lastSync;
     DeviceProgressReports progressReports;
     ProgressPublisher progressPublisher;
     ProgressFolder progressFolder;
@@ -181,6 +184,11 @@ PlatformServices DevicePlatform::servicesFor(Presenter& presenter, ViewMetrics& 
             .applications = _parts->applications,
             .appTerminator = _parts->appTerminator,
             .systemLog = _parts->systemLog,
+            .distributedNotificationCenter = _parts->distributedNotificationCenter,
+            .daemonConnection = _parts->daemonConnection,
+            .progressReports = _parts->progressReports,
+            .lastSync = _parts->lastSync,
+            .clock = _parts->clock,
             .viewMetrics = viewMetrics};
 }
 
@@ -200,10 +208,6 @@ const DaemonConnection& DevicePlatform::daemonConnection() const {
     return _parts->daemonConnection;
 }
 
-ProgressReports& DevicePlatform::progressReports() {
-    return _parts->progressReports;
-}
-
 ProgressPublisher& DevicePlatform::progressPublisher() {
     return _parts->progressPublisher;
 }
@@ -218,14 +222,6 @@ DeviceSettings& DevicePlatform::settings() {
 
 DeviceWorkQueues& DevicePlatform::workQueues() {
     return _parts->workQueues;
-}
-
-const Clock& DevicePlatform::clock() const {
-    return _parts->clock;
-}
-
-DistributedNotificationCenter& DevicePlatform::distributedNotificationCenter() {
-    return _parts->distributedNotificationCenter;
 }
 
 ClassRegistry& DevicePlatform::classes() {

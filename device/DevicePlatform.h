@@ -10,10 +10,7 @@
 
 namespace nimbra {
 class ClassRegistry;
-class Clock;
-class DistributedNotificationCenter;
 class DaemonConnection;
-class ProgressReports;
 class SystemLog;
 class WorkQueue;
 } // namespace nimbra
@@ -26,8 +23,8 @@ class DevicePreferences;
 class DevicePrivacyConsentStore;
 class DeviceSettings;
 class DeviceWorkQueues;
-class TimeSource;
 class ProgressPublisher;
+class TimeSource;
 
 /// Every service of the platform on one device directory: made, wired and ended together.
 /// Main queue only; the services say for themselves where they may be used.
@@ -43,9 +40,9 @@ public:
 
     DevicePlatform(const DevicePlatform&) = delete;
     DevicePlatform& operator=(const DevicePlatform&) = delete;
-    /// Ends the distributed notifications and the timers, lets their handlers go, waits for the
-    /// background work under way, then ends the platform's threads. Every controller made over the
-    /// services has gone before, but for what those handlers hold.
+    /// Ends the progress that is followed, the distributed notifications and the timers, lets their
+    /// handlers go, waits for the background work under way, then ends the platform's threads.
+    /// Every controller made over the services has gone before, but for what those handlers hold.
     ~DevicePlatform();
 
     /// The services for one pane, which talks to its host through `presenter` and measures what it
@@ -59,13 +56,10 @@ public:
     [[nodiscard]] DeviceBundles& bundles();
     [[nodiscard]] DevicePrivacyConsentStore& privacyConsentStore();
     [[nodiscard]] const DaemonConnection& daemonConnection() const;
-    [[nodiscard]] ProgressReports& progressReports();
     [[nodiscard]] ProgressPublisher& progressPublisher();
     [[nodiscard]] const DevicePreferences& preferences() const;
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();
-    [[nodiscard]] const Clock& clock() const;
-    [[nodiscard]] DistributedNotificationCenter& distributedNotificationCenter();
     [[nodiscard]] ClassRegistry& classes();
     [[nodiscard]] SystemLog& systemLog();
 

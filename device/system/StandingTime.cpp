@@ -13,7 +13,13 @@ std::chrono::nanoseconds StandingTime::elapsed() const {
 }
 
 Date StandingTime::now() const {
-    return _start + std::chrono::duration_cast<Date::duration>(elapsed());
+    const std::scoped_lock lock(_mutex);
+    return _start + std::chrono::duration_cast<Date::duration>(_elapsed);
+}
+
+void StandingTime::setNow(Date date) {
+    const std::scoped_lock lock(_mutex);
+    _start = date - std::chrono::duration_cast<Date::duration>(_elapsed);
 }
 
 void StandingTime::setWake(std::function<void()> wake) {

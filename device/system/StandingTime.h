@@ -21,6 +21,9 @@ public:
     void setWake(std::function<void()> wake) override;
     [[nodiscard]] bool wakeAt(std::optional<std::chrono::nanoseconds> deadline) override;
 
+    /// Sets the date, as a person does: what lasts, lasts as long as before.
+    void setNow(Date date);
+
     /// When something falls due next, as `elapsed` counts; nothing while no timer runs.
     [[nodiscard]] std::optional<std::chrono::nanoseconds> nextDeadline() const;
 
@@ -32,8 +35,8 @@ public:
     void advance(std::chrono::nanoseconds duration);
 
 private:
-    const Date _start;
     mutable std::mutex _mutex;
+    Date _start;
     std::chrono::nanoseconds _elapsed{0};
     std::optional<std::chrono::nanoseconds> _deadline;
     std::function<void()> _wake;

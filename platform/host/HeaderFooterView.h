@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/values/RowValue.h"
 #include "platform/views/View.h"
 
 namespace nimbra {
@@ -15,6 +16,10 @@ public:
     /// How high the view wants to be in a table of this width. `table` may be null.
     [[nodiscard]] virtual double preferredHeightForWidthInTableView(double width,
                                                                     const Table* table) const = 0;
+
+    /// What the view says of itself under the name `key`, to whoever looks into it from outside;
+    /// nothing where it has no such value.
+    [[nodiscard]] virtual RowValue valueForKey(const KeyPath& /*key*/) const { return {}; }
 };
 
 } // namespace nimbra

@@ -66,22 +66,23 @@ protected:
     }
 
     [[nodiscard]] test::PumpedQueue& mainQueue() { return _mainQueue; }
+    [[nodiscard]] test::RecordingPresenter& presenter() { return _presenter; }
     [[nodiscard]] test::FakeViewMetrics& viewMetrics() { return _viewMetrics; }
 
 private:
     test::TemporaryDirectory _directory;
     test::PumpedQueue _mainQueue{"main"};
+    std::vector<std::string> _calls;
+    test::RecordingPresenter _presenter{_calls};
     test::FakeViewMetrics _viewMetrics;
 };
 
 TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
     const auto platform = open();
-    std::vector<std::string> calls;
-    test::RecordingPresenter presenter(calls);
 
-    const PlatformServices services = platform->servicesFor(presenter, viewMetrics());
+    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
 
-    EXPECT_EQ(services.presenter.operator->(), &presenter);
+    EXPECT_EQ(services.presenter.operator->(), &presenter());
     EXPECT_EQ(services.viewMetrics.operator->(), &viewMetrics());
     EXPECT_TRUE(services.accountStore->accountWithIdentifier(AccountIdentifier("primary")));
     EXPECT_EQ(services.fileManager->tidewaterIdentityToken(), Text("token"));
@@ -105,10 +106,8 @@ TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
     ASSERT_TRUE(createDeviceDirectory(place, description));
     const auto platform = DevicePlatform::open(place, mainQueue());
     ASSERT_TRUE(platform) << platform.error();
-    std::vector<std::string> calls;
-    test::RecordingPresenter presenter(calls);
 
-    const PlatformServices services = (*platform)->servicesFor(presenter, viewMetrics());
+    const PlatformServices services = (*platform)->servicesFor(presenter(), viewMetrics());
     const auto first =
         services.applications->applicationProxyForIdentifier(BundleIdentifier("com/a"));
     const auto second =
@@ -132,12 +131,13 @@ TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
     const auto platform = DevicePlatform::open(root(), mainQueue(), time);
     ASSERT_TRUE(platform) << platform.error();
     Date fired;
-    const auto timer = (*platform)->workQueues().timerSourceOnQueue(mainQueue());
-    timer->setEventHandler([&] { fired = (*platform)->clock().now(); });
+    const PlatformServices services = (*platform)->servicesFor(presenter(), viewMetrics());
+    const auto timer = services.workQueues->timerSourceOnQueue(mainQueue());
+    timer->setEventHandler([&] { fired = services.clock->now(); });
     timer->setTimer(std::chrono::seconds(60), std::chrono::seconds(60),
                     std::chrono::nanoseconds(0));
     timer->resume();
-    EXPECT_EQ((*platform)->clock().now(), start);
+    EXPECT_EQ(services.clock->now(), start);
 
     time->advance(std::chrono::seconds(60));
     mainQueue().pump();
@@ -148,15 +148,16 @@ TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
 TEST_F(DevicePlatformTest, WhatTimersAndDistributedNotificationsHoldGoesWithThePlatform) {
     const auto held = std::make_shared<int>(0);
     auto platform = open();
-    auto timer = platform->workQueues().timerSourceOnQueue(mainQueue());
+    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
+    auto timer = services.workQueues->timerSourceOnQueue(mainQueue());
     timer->setEventHandler([held, timer] { ++*held; });
     timer->setTimer(std::chrono::hours(1), std::chrono::hours(1), std::chrono::nanoseconds(0));
     timer->resume();
     timer.reset();
-    static_cast<void>(platform->distributedNotificationCenter().addObserverForName(
+    static_cast<void>(services.distributedNotificationCenter->addObserverForName(
         MRDidUpdateLastSyncStatusDistributedNotification,
         {.queue = &mainQueue(), .usingBlock = [held](const Notification&) { ++*held; }}));
-    platform->distributedNotificationCenter().postNotification(
+    services.distributedNotificationCenter->postNotification(
         {.name = MRDidUpdateLastSyncStatusDistributedNotification});
     mainQueue().pump();
     EXPECT_EQ(*held, 1);
@@ -172,9 +173,10 @@ TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
     std::vector<std::string> seen;
     const auto held = std::make_shared<int>();
     auto platform = open();
+    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
     const auto subscribe = [&] {
-        return platform->progressReports()._addSubscriberForFileURLWithPublishingHandler(
-            platform->daemonConnection().mobileDocumentsURL(),
+        return services.progressReports->_addSubscriberForFileURLWithPublishingHandler(
+            services.daemonConnection->mobileDocumentsURL(),
             [&seen, held](const std::shared_ptr<ProgressReport>& progress) {
                 seen.push_back(progress->localizedDescription().string());
                 return [held] {};
@@ -197,11 +199,9 @@ TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
 
 TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
     const auto platform = open();
-    std::vector<std::string> calls;
-    test::RecordingPresenter presenter(calls);
     std::promise<void> completed;
 
-    platform->servicesFor(presenter, viewMetrics())
+    platform->servicesFor(presenter(), viewMetrics())
         .documentContainers->forceRefreshAllContainersWithCompletion(
             [&completed] { completed.set_value(); });
 
@@ -209,10 +209,8 @@ TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
 }
 
 TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
-    std::vector<std::string> calls;
-    test::RecordingPresenter presenter(calls);
     auto platform = open();
-    const PlatformServices services = platform->servicesFor(presenter, viewMetrics());
+    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
     const auto queue = services.workQueues->serialQueueWithLabel("late");
     std::promise<void> start;
     std::size_t found = 0;
@@ -238,10 +236,8 @@ TEST_F(DevicePlatformTest, OpeningAndReadingLeavesTheDirectoryAsItWas) {
 TEST_F(DevicePlatformTest, ADeviceOfAnEarlierVersionHasNoConsentUntilSomeIsGiven) {
     std::filesystem::remove(state("consent.db"));
     const auto platform = open();
-    std::vector<std::string> calls;
-    test::RecordingPresenter presenter(calls);
     PrivacyConsentStore& store =
-        platform->servicesFor(presenter, viewMetrics()).privacyConsentStore;
+        platform->servicesFor(presenter(), viewMetrics()).privacyConsentStore;
     const ConsentBundle bundle{BundleIdentifier("a")};
 
     const auto before = store.PRVAccessCopyInformation(kPRVServiceTidewater);

@@ -6,11 +6,16 @@
 #include "tests/support/FakeAppTerminator.h"
 #include "tests/support/FakeApplications.h"
 #include "tests/support/FakeBundles.h"
+#include "tests/support/FakeClock.h"
+#include "tests/support/FakeDaemonConnection.h"
 #include "tests/support/FakeDeviceInfo.h"
+#include "tests/support/FakeDistributedNotificationCenter.h"
 #include "tests/support/FakeDocumentContainers.h"
 #include "tests/support/FakeFileManager.h"
+#include "tests/support/FakeLastSync.h"
 #include "tests/support/FakeLocalization.h"
 #include "tests/support/FakePrivacyConsentStore.h"
+#include "tests/support/FakeProgressReports.h"
 #include "tests/support/FakeRestrictionsProfile.h"
 #include "tests/support/FakeSystemLog.h"
 #include "tests/support/FakeViewMetrics.h"
@@ -40,6 +45,11 @@ struct TestPlatform {
     FakeApplications applications;
     FakeAppTerminator appTerminator{calls};
     FakeSystemLog systemLog;
+    FakeDistributedNotificationCenter distributedNotificationCenter;
+    FakeDaemonConnection daemonConnection;
+    FakeProgressReports progressReports{calls};
+    FakeLastSync lastSync{calls};
+    FakeClock clock;
     FakeViewMetrics viewMetrics;
 
     [[nodiscard]] PlatformServices services() {
@@ -57,6 +67,11 @@ struct TestPlatform {
                 .applications = applications,
                 .appTerminator = appTerminator,
                 .systemLog = systemLog,
+                .distributedNotificationCenter = distributedNotificationCenter,
+                .daemonConnection = daemonConnection,
+                .progressReports = progressReports,
+                .lastSync = lastSync,
+                .clock = clock,
                 .viewMetrics = viewMetrics};
     }
 };
