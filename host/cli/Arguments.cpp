@@ -25,6 +25,7 @@ constexpr const char* examples =
     "  settingsctl list                      what the page shows\n"
     "  settingsctl get \"Nimbra Drive\"        is it on?\n"
     "  settingsctl --locale de-DE list       the same in German\n"
+    "  settingsctl watch                     how the sync is getting on\n"
     "  settingsctl init ./phone              a device to play with ...\n"
     "  settingsctl --root ./phone shell      ... and a prompt on it\n"
     "  settingsctl play fault.json           replay a fault report\n"
@@ -131,6 +132,11 @@ private:
 
         CLI::App* tap = add(Command::tap, "tap", "Press a button");
         addRow(tap);
+
+        add(Command::watch, "watch", "Show the status of the sync as it changes")
+            ->footer(
+                "Runs until it is interrupted (^C). A terminal gets one line that is drawn anew,\n"
+                "everything else a line for each change.");
 
         add(Command::shell, "shell", "A prompt with these commands, on a page that stays open")
             ->footer("Without a terminal, commands are read line by line from standard input.");

@@ -12,6 +12,7 @@ enum class Command {
     get,
     set,
     tap,
+    watch,
     init,
     play,
     shell,

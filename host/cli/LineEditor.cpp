@@ -1,10 +1,10 @@
 #include "host/cli/LineEditor.h"
 
+#include "host/cli/Interruption.h"
 #include "host/cli/TextLayout.h"
 
 #include <algorithm>
 #include <array>
-#include <atomic>
 #include <cerrno>
 #include <climits>
 #include <csignal>
@@ -12,7 +12,6 @@
 #include <cwchar>
 #include <histedit.h>
 #include <poll.h>
-#include <sys/eventfd.h>
 #include <system_error>
 #include <unistd.h>
 #include <utility>
@@ -20,39 +19,6 @@
 namespace nimbra::cli {
 
 namespace {
-
-// A signal handler can reach nothing but what is global. It may run on any thread, so that no call
-// of the main thread is sure to be interrupted by it.
-std::atomic<int> interruptionDescriptor = -1;
-static_assert(std::atomic<int>::is_always_lock_free, "a signal handler may wait for nobody");
-
-extern "C" void noteInterruption(int /*signal*/) {
-    const int error = errno;
-    static_cast<void>(::eventfd_write(interruptionDescriptor, 1));
-    errno = error;
-}
-
-/// While it lives, ^C only makes `interruptionDescriptor` readable.
-class InterruptionScope {
-public:
-    InterruptionScope() {
-        // Never closed: a handler that another thread has begun may write to it late.
-        if (interruptionDescriptor < 0) {
-            interruptionDescriptor = ::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK);
-        }
-        eventfd_t earlier = 0;
-        static_cast<void>(::eventfd_read(interruptionDescriptor, &earlier));
-        struct sigaction action{};
-        action.sa_handler = noteInterruption;
-        ::sigaction(SIGINT, &action, &_earlier);
-    }
-    InterruptionScope(const InterruptionScope&) = delete;
-    InterruptionScope& operator=(const InterruptionScope&) = delete;
-    ~InterruptionScope() { ::sigaction(SIGINT, &_earlier, nullptr); }
-
-private:
-    struct sigaction _earlier{};
-};
 
 std::string commonStart(const std::vector<std::string>& texts) {
     std::string start = texts.front();
@@ -98,7 +64,8 @@ public:
     }
 
     std::optional<std::string> readLine() {
-        const InterruptionScope scope;
+        // ^C gives a line up, and does not end the program.
+        const Interruption interruption({SIGINT});
         _isInterrupted = false;
         int length = 0;
         // Before the prompt is shown, which the library would do first: what is typed as soon as
@@ -171,7 +138,7 @@ private:
         std::array descriptors{
             pollfd{.fd = STDIN_FILENO, .events = POLLIN, .revents = 0},
             pollfd{.fd = _configuration.wakeUpDescriptor, .events = POLLIN, .revents = 0},
-            pollfd{.fd = interruptionDescriptor, .events = POLLIN, .revents = 0}};
+            pollfd{.fd = Interruption::descriptor(), .events = POLLIN, .revents = 0}};
         auto& [input, wakeUp, interruption] = descriptors;
         while (true) {
             if (::poll(descriptors.data(), descriptors.size(), -1) < 0) {

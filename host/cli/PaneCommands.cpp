@@ -1,5 +1,6 @@
 #include "host/cli/PaneCommands.h"
 
+#include "host/cli/StatusText.h"
 #include "host/cli/TextLayout.h"
 #include "host/core/PaneSession.h"
 
@@ -31,7 +32,15 @@ PaneCommands::PaneCommands(host::PaneSession& session, std::ostream& out)
     : _session(session), _out(out), _text(Terminal::ofStandardOutput()), _shown(rows()) {}
 
 PaneCommands::Outcome PaneCommands::list() const {
-    _out << _text.page(_session.paneTitle(), rows());
+    std::vector<RowDescription> shown = rows();
+    const SpecifierArray& specifiers = _session.rows();
+    for (std::size_t index = 0; index < shown.size(); ++index) {
+        if (const auto view = _session.footers().footerOf(*specifiers[index])) {
+            const std::string status = statusText(host::FooterDescription::of(*view));
+            shown[index].footer = status.empty() ? Text() : Text(status);
+        }
+    }
+    _out << _text.page(_session.paneTitle(), shown);
     return {};
 }
 

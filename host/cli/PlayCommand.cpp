@@ -2,6 +2,7 @@
 
 #include "device/DeviceDirectory.h"
 #include "device/files/Files.h"
+#include "device/system/StandingTime.h"
 #include "host/core/PaneSession.h"
 #include "host/core/scenario/RunningApplications.h"
 #include "host/core/scenario/ScenarioPlayer.h"
@@ -12,6 +13,7 @@
 
 #include <iostream>
 #include <iterator>
+#include <memory>
 
 namespace nimbra::cli {
 
@@ -45,12 +47,17 @@ std::expected<void, Failure> playOn(const std::filesystem::path& root,
         return badInput(running.error());
     }
     host::Trace trace([&out](const std::string& line) { out << line << '\n' << std::flush; });
-    const auto session = host::PaneSession::start(
-        {.root = root, .bundle = options.bundle, .locale = options.locale, .trace = &trace});
+    const auto time = std::make_shared<device::StandingTime>(scenario.device.description.now);
+    const auto session = host::PaneSession::start({.root = root,
+                                                   .bundle = options.bundle,
+                                                   .locale = options.locale,
+                                                   .trace = &trace,
+                                                   .timeSource = time});
     if (!session) {
         return badInput(session.error());
     }
-    if (const auto played = host::ScenarioPlayer(scenario, **session, applications, trace).play();
+    if (const auto played =
+            host::ScenarioPlayer(scenario, **session, applications, *time, trace).play();
         !played) {
         const host::StepFailure& failure = played.error();
         return std::unexpected(Failure{exitRefused, "step " + std::to_string(failure.index) + " (" +

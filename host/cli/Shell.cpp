@@ -108,7 +108,7 @@ bool Shell::isDone() const {
 }
 
 std::string Shell::takeChanges() {
-    _session.loop().runPending();
+    _session.runPending();
     std::string changes = _commands.takeChanges();
     if (_isRefreshing && !_session.isRefreshing()) {
         _isRefreshing = false;

@@ -8,11 +8,13 @@
 #include "host/cli/PlayCommand.h"
 #include "host/cli/Shell.h"
 #include "host/cli/TextLayout.h"
+#include "host/cli/WatchCommand.h"
 #include "host/core/PaneSession.h"
 
 #include <algorithm>
 #include <clocale>
 #include <iostream>
+#include <unistd.h>
 
 namespace nimbra::cli {
 
@@ -80,6 +82,11 @@ Outcome runOnPane(const Arguments& arguments) {
         return std::unexpected(session.error());
     }
     showActivity(**session, std::cerr);
+    // Only a page that is shown follows the sync.
+    if (arguments.command == Command::list || arguments.command == Command::watch) {
+        (*session)->appear();
+        (*session)->settle();
+    }
     PaneCommands commands(**session, std::cout);
     const auto withChanges = [&](const Outcome& outcome) {
         (*session)->settle();
@@ -95,6 +102,9 @@ Outcome runOnPane(const Arguments& arguments) {
         return withChanges(commands.set(arguments.row, arguments.value));
     case Command::tap:
         return withChanges(commands.tap(arguments.row));
+    case Command::watch:
+        return watch(**session, std::cout, Terminal::ofStandardOutput(),
+                     ::isatty(STDOUT_FILENO) != 0);
     default:
         return arguments.json ? commands.listAsJson() : commands.list();
     }

@@ -9,6 +9,7 @@
 #include "host/core/BundleSearch.h"
 #include "host/core/trace/SessionTracer.h"
 #include "platform/system/ClassRegistry.h"
+#include "platform/system/DistributedNotificationCenter.h"
 #include "platform/system/NotificationCenter.h"
 
 #include <utility>
@@ -17,7 +18,8 @@ namespace nimbra::host {
 
 std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configuration configuration) {
     std::unique_ptr<PaneSession> session(new PaneSession(std::move(configuration)));
-    auto device = device::DevicePlatform::open(session->_configuration.root, session->_loop);
+    auto device = device::DevicePlatform::open(session->_configuration.root, session->_loop,
+                                               session->_configuration.timeSource);
     if (!device) {
         return std::unexpected(device.error());
     }
@@ -33,7 +35,8 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
 }
 
 PaneSession::PaneSession(Configuration configuration)
-    : _configuration(std::move(configuration)), _scope(_loop.label()) {}
+    : _configuration(std::move(configuration)), _scope(_loop.label()),
+      _listWatcher([this] { updateFootersSoon(); }) {}
 
 PaneSession::~PaneSession() {
     if (_device) {
@@ -44,6 +47,20 @@ PaneSession::~PaneSession() {
 
 void PaneSession::settle() {
     _loop.runUntilIdle(_device->workQueues());
+    layOut();
+}
+
+void PaneSession::runPending() {
+    _loop.runPending();
+    layOut();
+}
+
+void PaneSession::layOut() {
+    // What a terminal shows has no width in points: this is a phone's.
+    constexpr double listWidth = 390;
+    if (_footers) {
+        _footers->layOut(listWidth);
+    }
 }
 
 void PaneSession::replaceTexts(std::map<std::string, std::string> texts) {
@@ -72,13 +89,16 @@ std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
     _pane->setParentController(_accountPage);
     if (_tracer) {
         _tracer->observeParent(*_accountPage);
-        _tracer->observeList(*_pane);
+        _listWatcher.setNext(&_tracer->listObserver());
     }
+    _pane->setObserver(&_listWatcher);
+    _footers = std::make_unique<GroupFooters>(_device->classes(), services, _device->systemLog());
     _pane->viewDidLoad();
     if (_tracer) {
         _tracer->observeRefreshControl(*_pane);
     }
     static_cast<void>(_pane->specifiers());
+    updateFootersSoon();
     return {};
 }
 
@@ -90,18 +110,35 @@ void PaneSession::closePane() {
         disappear();
     }
     _pane->setObserver(nullptr);
+    _footers.reset();
     _pane.reset();
     _accountPage.reset();
 }
 
 void PaneSession::appear() {
     _isShown = true;
+    _footers->update(rows());
+    _footers->setShown(true);
     _pane->viewDidAppear(true);
 }
 
 void PaneSession::disappear() {
     _isShown = false;
+    _footers->setShown(false);
     _pane->viewDidDisappear(true);
+}
+
+void PaneSession::updateFootersSoon() {
+    if (std::exchange(_areFootersBehind, true)) {
+        return;
+    }
+    // A batch of changes is one change to what stands in the window.
+    _loop.async([this] {
+        _areFootersBehind = false;
+        if (_footers) {
+            _footers->update(rows());
+        }
+    });
 }
 
 void PaneSession::pullToRefresh() {
@@ -160,6 +197,10 @@ void PaneSession::becomeActive() {
 
 void PaneSession::post(const Notification& notification) {
     _services->notificationCenter->postNotification(notification);
+}
+
+void PaneSession::postDistributed(const Notification& notification) {
+    _services->distributedNotificationCenter->postNotification(notification);
 }
 
 void PaneSession::setActivityObserver(std::function<void()> observer) {

@@ -3,7 +3,9 @@
 #include "device/system/CurrentQueue.h"
 #include "host/core/AccountPage.h"
 #include "host/core/FixedViewMetrics.h"
+#include "host/core/GroupFooters.h"
 #include "host/core/HostLoop.h"
+#include "host/core/ListWatcher.h"
 #include "host/core/RowLookup.h"
 #include "platform/host/Presenter.h"
 #include "platform/host/SettingsListController.h"
@@ -24,6 +26,7 @@ struct Notification;
 namespace nimbra::device {
 class DeviceBundle;
 class DevicePlatform;
+class TimeSource;
 } // namespace nimbra::device
 
 namespace nimbra::host {
@@ -44,6 +47,8 @@ public:
         std::optional<std::string> locale;
         /// Gets all that the pane does; null for no trace. Not owned, outlives the session.
         Trace* trace = nullptr;
+        /// What the device takes its time from; null for the machine's time.
+        std::shared_ptr<device::TimeSource> timeSource;
     };
 
     /// Starts using the device. An error names the file that cannot be used.
@@ -60,8 +65,11 @@ public:
     /// The device directory.
     [[nodiscard]] const std::filesystem::path& root() const { return _configuration.root; }
 
-    /// Runs the main queue until nothing is left to do anywhere.
+    /// Runs the main queue until nothing is left to do anywhere, a layout included. A timer that
+    /// runs is nothing to do until it falls due.
     void settle();
+    /// Runs the work that is queued now, and lays out what asks for it.
+    void runPending();
 
     /// Uses `texts` as the pane's own string table in every language, from now on.
     void replaceTexts(std::map<std::string, std::string> texts);
@@ -87,6 +95,8 @@ public:
     [[nodiscard]] bool isRefreshing();
     [[nodiscard]] std::string paneTitle() const;
     [[nodiscard]] const SpecifierArray& rows();
+    /// The views under the groups of the list; they follow it with the main queue's next run.
+    [[nodiscard]] GroupFooters& footers() { return *_footers; }
     /// The row that `name` stands for.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal> row(std::string_view name);
     [[nodiscard]] std::expected<void, RowRefusal> setRow(std::string_view name, bool isOn);
@@ -98,6 +108,8 @@ public:
     void becomeActive();
     /// Posts within this process, on the calling thread; any thread.
     void post(const Notification& notification);
+    /// Posts to every process of the device; any thread.
+    void postDistributed(const Notification& notification);
 
 private:
     explicit PaneSession(Configuration configuration);
@@ -110,6 +122,8 @@ private:
     void dismissPane(bool animated) override;
 
     void setActivity(Text activity);
+    void updateFootersSoon();
+    void layOut();
     [[nodiscard]] std::expected<void, Error> loadBundle();
     [[nodiscard]] PlatformServices servicesForPane();
     [[nodiscard]] std::expected<UserInfo, Error> userInfoFor(const PaneEntry& entry);
@@ -117,15 +131,19 @@ private:
     Configuration _configuration;
     HostLoop _loop;
     device::CurrentQueueScope _scope;
-    std::unique_ptr<device::DevicePlatform> _device;
     FixedViewMetrics _viewMetrics;
     /// The device's own services, not traced.
     std::optional<PlatformServices> _services;
+    /// Stays until the device has ended: what a view asks of a service last may still be traced.
     std::unique_ptr<SessionTracer> _tracer;
+    std::unique_ptr<device::DevicePlatform> _device;
     std::shared_ptr<device::DeviceBundle> _bundle;
     std::optional<std::map<std::string, std::string>> _texts;
     std::shared_ptr<AccountPage> _accountPage;
     std::shared_ptr<SettingsListController> _pane;
+    ListWatcher _listWatcher;
+    std::unique_ptr<GroupFooters> _footers;
+    bool _areFootersBehind = false;
     bool _isShown = false;
     Text _activity;
     std::function<void()> _activityObserver;

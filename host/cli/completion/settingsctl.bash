@@ -52,7 +52,7 @@ _settingsctl_rows() {
 
 _settingsctl() {
     local current=${COMP_WORDS[COMP_CWORD]} previous=${COMP_WORDS[COMP_CWORD - 1]}
-    local commands="list get set tap init play shell completion"
+    local commands="list get set tap watch init play shell completion"
     local options="--root --locale --bundle --account --first-setup --version --help"
     COMPREPLY=()
 

@@ -1,9 +1,11 @@
 #pragma once
 
 #include "device/DeviceDescription.h"
+#include "device/documents/ProgressValues.h"
 #include "host/core/AccountPage.h"
 #include "platform/system/NotificationCenter.h"
 
+#include <chrono>
 #include <string>
 #include <variant>
 #include <vector>
@@ -28,6 +30,22 @@ struct PostArguments {
     bool fromOtherThread = false;
 };
 
+/// A progress by the name that the scenario gives it.
+struct ProgressArguments {
+    std::string id;
+    /// The values given, in the order in which they stand in the step.
+    device::ProgressChanges changes;
+};
+
+struct MoveFooterArguments {
+    /// Into a window, or out of the one that the footer is in.
+    bool window = false;
+};
+
+struct AdvanceArguments {
+    std::chrono::nanoseconds duration{0};
+};
+
 struct ChangeArguments {
     device::GivenDescription device;
 };
@@ -36,7 +54,8 @@ struct ChangeArguments {
 struct ScenarioStep {
     /// The word under `do`.
     std::string name;
-    std::variant<std::monostate, RowArgument, SetArguments, PostArguments, ChangeArguments>
+    std::variant<std::monostate, RowArgument, SetArguments, PostArguments, ProgressArguments,
+                 MoveFooterArguments, AdvanceArguments, ChangeArguments>
         arguments;
 };
 

@@ -6,6 +6,7 @@
 #include "device/store/DeviceAccountStore.h"
 #include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceSettings.h"
+#include "device/system/StandingTime.h"
 #include "host/core/PaneSession.h"
 #include "host/core/RowDescription.h"
 #include "host/core/scenario/RunningApplications.h"
@@ -43,25 +44,27 @@ const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& nam
         Handler{.name = "post", .perform = &ScenarioPlayer::post},
         Handler{.name = "change", .perform = &ScenarioPlayer::change},
         Handler{.name = "close", .perform = &ScenarioPlayer::close, .needsPane = true},
-        Handler{.name = "publishProgress", .missing = "no sync progress"},
-        Handler{.name = "updateProgress", .missing = "no sync progress"},
-        Handler{.name = "unpublishProgress", .missing = "no sync progress"},
-        Handler{.name = "footer", .missing = "no status footer"},
-        Handler{.name = "moveFooter", .missing = "no status footer"},
+        Handler{.name = "publishProgress", .perform = &ScenarioPlayer::publishProgress},
+        Handler{.name = "updateProgress", .perform = &ScenarioPlayer::updateProgress},
+        Handler{.name = "unpublishProgress", .perform = &ScenarioPlayer::unpublishProgress},
+        Handler{.name = "footer", .perform = &ScenarioPlayer::footer, .needsPane = true},
+        Handler{.name = "moveFooter", .perform = &ScenarioPlayer::moveFooter, .needsPane = true},
+        Handler{.name = "advance", .perform = &ScenarioPlayer::advance},
         Handler{.name = "layout", .missing = "no screen to lay out"},
         Handler{.name = "views", .missing = "no screen with views"},
         Handler{.name = "tapButton", .missing = "no screen with buttons"},
         Handler{.name = "alert", .missing = "no alerts"},
         Handler{.name = "share", .missing = "no share sheet"},
-        Handler{.name = "advance", .missing = "no timers that a moved clock could fire"},
     };
     const auto* const handler = std::ranges::find(handlers, name, &Handler::name);
     return handler != handlers.end() ? handler : nullptr;
 }
 
 ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session,
-                               RunningApplications& applications, Trace& trace)
-    : _scenario(scenario), _session(session), _applications(applications), _trace(trace) {}
+                               RunningApplications& applications, device::StandingTime& time,
+                               Trace& trace)
+    : _scenario(scenario), _session(session), _applications(applications), _time(time),
+      _trace(trace) {}
 
 std::expected<void, StepFailure> ScenarioPlayer::play() {
     applyToSession(_scenario.device);
@@ -87,6 +90,9 @@ void ScenarioPlayer::applyToSession(const device::GivenDescription& given) {
     if (given.keys.contains("paneBundleRegistered")) {
         _session.device().bundles().setFindable(BundleIdentifier("com.vantrel.NimbraDriveSettings"),
                                                 given.description.paneBundleRegistered);
+    }
+    if (given.keys.contains("now")) {
+        _time.setNow(given.description.now);
     }
     if (given.keys.contains("faults")) {
         _session.device().accountStore().planSaveOutcomes(given.description.saveFaults);
@@ -175,13 +181,17 @@ ScenarioPlayer::Outcome ScenarioPlayer::pullToRefresh(const ScenarioStep& /*step
 
 ScenarioPlayer::Outcome ScenarioPlayer::post(const ScenarioStep& step) {
     const auto& arguments = std::get<PostArguments>(step.arguments);
-    if (arguments.distributed) {
-        return std::unexpected("this version has no notifications between processes yet");
-    }
+    const auto post = [&] {
+        if (arguments.distributed) {
+            _session.postDistributed(arguments.notification);
+        } else {
+            _session.post(arguments.notification);
+        }
+    };
     if (arguments.fromOtherThread) {
-        std::thread([&] { _session.post(arguments.notification); }).join();
+        std::thread(post).join();
     } else {
-        _session.post(arguments.notification);
+        post();
     }
     return {};
 }

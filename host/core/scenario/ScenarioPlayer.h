@@ -2,9 +2,14 @@
 
 #include "host/core/scenario/Scenario.h"
 
+#include <chrono>
 #include <cstddef>
 #include <expected>
 #include <string>
+
+namespace nimbra::device {
+class StandingTime;
+}
 
 namespace nimbra::host {
 
@@ -25,9 +30,10 @@ struct StepFailure {
 class ScenarioPlayer {
 public:
     /// `session` uses the device that was made from the scenario's description, on which
-    /// `applications` run, and traces to `trace`. None is owned; all outlive the player.
+    /// `applications` run and whose time is `time`, and traces to `trace`. None is owned; all
+    /// outlive the player.
     ScenarioPlayer(const Scenario& scenario, PaneSession& session,
-                   RunningApplications& applications, Trace& trace);
+                   RunningApplications& applications, device::StandingTime& time, Trace& trace);
 
     /// Does all steps, or those up to the first that cannot be done, and ends the trace.
     [[nodiscard]] std::expected<void, StepFailure> play();
@@ -41,6 +47,7 @@ private:
     /// Does what of a description stands in no file of the device directory.
     void applyToSession(const device::GivenDescription& given);
     [[nodiscard]] Outcome perform(const ScenarioStep& step);
+    void advanceTo(std::chrono::nanoseconds elapsed);
 
     Outcome open(const ScenarioStep& step);
     Outcome appear(const ScenarioStep& step);
@@ -53,11 +60,18 @@ private:
     Outcome pullToRefresh(const ScenarioStep& step);
     Outcome post(const ScenarioStep& step);
     Outcome change(const ScenarioStep& step);
+    Outcome publishProgress(const ScenarioStep& step);
+    Outcome updateProgress(const ScenarioStep& step);
+    Outcome unpublishProgress(const ScenarioStep& step);
+    Outcome footer(const ScenarioStep& step);
+    Outcome moveFooter(const ScenarioStep& step);
+    Outcome advance(const ScenarioStep& step);
     Outcome close(const ScenarioStep& step);
 
     const Scenario& _scenario;
     PaneSession& _session;
     RunningApplications& _applications;
+    device::StandingTime& _time;
     Trace& _trace;
 };
 

@@ -2,9 +2,11 @@
 
 #include "device/description/DescriptionValues.h"
 #include "device/json/JsonReader.h"
+#include "platform/system/DistributedNotificationCenter.h"
 
 #include <algorithm>
 #include <array>
+#include <chrono>
 #include <nlohmann/json.hpp>
 #include <string>
 #include <string_view>
@@ -15,6 +17,9 @@ namespace nimbra::host {
 namespace {
 
 using device::JsonReader;
+using device::ProgressChanges;
+using device::ProgressKey;
+using device::ProgressValues;
 using Arguments = decltype(ScenarioStep::arguments);
 
 /// A member that has to be there.
@@ -29,6 +34,14 @@ JsonReader required(const JsonReader& step, const std::string& key, const std::s
 std::string requiredString(const JsonReader& step, const std::string& key,
                            const std::string& what) {
     return required(step, key, what).string();
+}
+
+/// A date stands as a text in a file; null where the notification is to carry none.
+UserInfoValue readDate(const JsonReader& reader) {
+    if (reader.isNull()) {
+        return {};
+    }
+    return device::readInstant(reader, {});
 }
 
 UserInfoValue readUserInfoValue(const JsonReader& reader) {
@@ -71,8 +84,10 @@ Arguments post(const JsonReader& step) {
                                                  step, "name", "a notification's name"))}};
     const JsonReader given = step.member("userInfo");
     for (const std::string& key : given.keys()) {
-        arguments.notification.userInfo.emplace(UserInfoKey(key),
-                                                readUserInfoValue(given.member(key)));
+        const UserInfoKey name(key);
+        const JsonReader value = given.member(key);
+        arguments.notification.userInfo.emplace(
+            name, name == MRSyncStatusLastSyncDateKey ? readDate(value) : readUserInfoValue(value));
     }
     arguments.distributed = step.member("distributed").boolean();
     if (const JsonReader from = step.member("from"); !from.isAbsent()) {
@@ -86,31 +101,65 @@ Arguments change(const JsonReader& step) {
     return ChangeArguments{device::readScenarioDevice(required(step, "device", "an object"))};
 }
 
-// What follows is checked only: nothing in this version uses it.
+void readProgressValue(const JsonReader& reader, const std::string& key, ProgressChanges& changes) {
+    ProgressValues& values = changes.values;
+    const auto text = [&reader] {
+        const auto string = reader.stringOrNull();
+        return string ? Text(*string) : Text();
+    };
+    if (key == "fileOperationKind") {
+        values.fileOperationKind = text();
+        changes.keys.push_back(ProgressKey::fileOperationKind);
+    } else if (key == "fraction") {
+        values.fraction = reader.number();
+        changes.keys.push_back(ProgressKey::fraction);
+    } else if (key == "indeterminate") {
+        values.indeterminate = reader.boolean();
+        changes.keys.push_back(ProgressKey::indeterminate);
+    } else if (key == "description") {
+        values.description = text();
+        changes.keys.push_back(ProgressKey::description);
+    } else if (key == "additional") {
+        values.additional = text();
+        changes.keys.push_back(ProgressKey::additional);
+    }
+}
 
-Arguments publishProgress(const JsonReader& step) {
+Arguments progress(const JsonReader& step) {
     step.allowOnly({"do", "id", "fileOperationKind", "fraction", "indeterminate", "description",
                     "additional"});
-    static_cast<void>(requiredString(step, "id", "a progress's id"));
-    static_cast<void>(step.member("fileOperationKind").stringOrNull());
-    static_cast<void>(step.member("fraction").number());
-    static_cast<void>(step.member("indeterminate").boolean());
-    static_cast<void>(step.member("description").stringOrNull());
-    static_cast<void>(step.member("additional").stringOrNull());
-    return {};
+    ProgressArguments arguments{.id = requiredString(step, "id", "a progress's id"), .changes = {}};
+    for (const std::string& key : step.keys()) {
+        readProgressValue(step.member(key), key, arguments.changes);
+    }
+    return arguments;
 }
 
 Arguments unpublishProgress(const JsonReader& step) {
     step.allowOnly({"do", "id"});
-    static_cast<void>(requiredString(step, "id", "a progress's id"));
-    return {};
+    return ProgressArguments{.id = requiredString(step, "id", "a progress's id"), .changes = {}};
 }
 
 Arguments moveFooter(const JsonReader& step) {
     step.allowOnly({"do", "window"});
-    static_cast<void>(required(step, "window", "true or false").boolean());
-    return {};
+    return MoveFooterArguments{required(step, "window", "true or false").boolean()};
 }
+
+Arguments advance(const JsonReader& step) {
+    step.allowOnly({"do", "seconds"});
+    const JsonReader reader = required(step, "seconds", "a number");
+    const double seconds = reader.number();
+    // Ten years: a timer that repeats falls due a few million times then.
+    constexpr double most = 315'576'000;
+    if (!(seconds >= 0 && seconds <= most)) {
+        reader.expected("a number from 0 to 315576000");
+        return {};
+    }
+    return AdvanceArguments{
+        std::chrono::round<std::chrono::nanoseconds>(std::chrono::duration<double>(seconds))};
+}
+
+// What follows is checked only: nothing in this version uses it.
 
 Arguments layout(const JsonReader& step) {
     step.allowOnly({"do", "width", "height"});
@@ -137,12 +186,6 @@ Arguments share(const JsonReader& step) {
     return {};
 }
 
-Arguments advance(const JsonReader& step) {
-    step.allowOnly({"do", "seconds"});
-    static_cast<void>(required(step, "seconds", "a number").number());
-    return {};
-}
-
 struct StepForm {
     std::string_view name;
     Arguments (*read)(const JsonReader& step);
@@ -159,8 +202,8 @@ constexpr std::array forms{
     StepForm{"tap", row},
     StepForm{"pullToRefresh", nothing},
     StepForm{"post", post},
-    StepForm{"publishProgress", publishProgress},
-    StepForm{"updateProgress", publishProgress},
+    StepForm{"publishProgress", progress},
+    StepForm{"updateProgress", progress},
     StepForm{"unpublishProgress", unpublishProgress},
     StepForm{"footer", nothing},
     StepForm{"moveFooter", moveFooter},

@@ -13,9 +13,11 @@ SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
       _accountStore(services.accountStore, trace),
       _documentContainers(services.documentContainers, trace),
       _notificationCenter(services.notificationCenter, "local", trace),
+      _workQueues(services.workQueues, trace),
       _privacyConsentStore(services.privacyConsentStore, trace),
-      _appTerminator(services.appTerminator, trace), _systemLog(trace), _table(trace),
-      _parent(trace),
+      _appTerminator(services.appTerminator, trace), _systemLog(trace),
+      _distributedNotificationCenter(services.distributedNotificationCenter, trace),
+      _progressReports(services.progressReports, trace), _table(trace), _parent(trace),
       _earlierSyslogSink(replaceSyslogSink([&trace](int priority, const std::string& message) {
           trace.write("syslog", {{"priority", priority}, {"message", message}});
       })) {}
@@ -33,15 +35,14 @@ PlatformServices SessionTracer::services() {
     services.privacyConsentStore = _privacyConsentStore;
     services.appTerminator = _appTerminator;
     services.systemLog = _systemLog;
+    services.workQueues = _workQueues;
+    services.distributedNotificationCenter = _distributedNotificationCenter;
+    services.progressReports = _progressReports;
     return services;
 }
 
 std::shared_ptr<Account> SessionTracer::traced(std::shared_ptr<Account> account) const {
     return _accountStore.traced(std::move(account));
-}
-
-void SessionTracer::observeList(SettingsListController& pane) {
-    pane.setObserver(&_table);
 }
 
 void SessionTracer::observeRefreshControl(SettingsListController& pane) {

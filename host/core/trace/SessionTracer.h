@@ -4,11 +4,14 @@
 #include "host/core/trace/TableTracer.h"
 #include "host/core/trace/TracingAccountStore.h"
 #include "host/core/trace/TracingAppTerminator.h"
+#include "host/core/trace/TracingDistributedNotificationCenter.h"
 #include "host/core/trace/TracingDocumentContainers.h"
 #include "host/core/trace/TracingNotificationCenter.h"
 #include "host/core/trace/TracingPresenter.h"
 #include "host/core/trace/TracingPrivacyConsentStore.h"
+#include "host/core/trace/TracingProgressReports.h"
 #include "host/core/trace/TracingSystemLog.h"
+#include "host/core/trace/TracingWorkQueues.h"
 #include "platform/PlatformServices.h"
 #include "platform/system/Syslog.h"
 
@@ -39,8 +42,8 @@ public:
     /// `account`, traced, for a pane that gets it from its host; null for null.
     [[nodiscard]] std::shared_ptr<Account> traced(std::shared_ptr<Account> account) const;
 
-    /// Traces the changes of the list of `pane`.
-    void observeList(SettingsListController& pane);
+    /// Traces each change of a list that it is told of. Owned by the tracer.
+    [[nodiscard]] SettingsListObserver& listObserver() { return _table; }
     /// Traces the end of a refresh of `pane`, whose view is loaded.
     void observeRefreshControl(SettingsListController& pane);
     /// Traces that `parent` is built anew.
@@ -53,9 +56,12 @@ private:
     TracingAccountStore _accountStore;
     TracingDocumentContainers _documentContainers;
     TracingNotificationCenter _notificationCenter;
+    TracingWorkQueues _workQueues;
     TracingPrivacyConsentStore _privacyConsentStore;
     TracingAppTerminator _appTerminator;
     TracingSystemLog _systemLog;
+    TracingDistributedNotificationCenter _distributedNotificationCenter;
+    TracingProgressReports _progressReports;
     TableTracer _table;
     ParentTracer _parent;
     SyslogSink _earlierSyslogSink;

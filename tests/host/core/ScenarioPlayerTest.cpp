@@ -4,6 +4,7 @@
 #include "device/apps/Process.h"
 #include "device/apps/ProcessRecord.h"
 #include "device/files/Files.h"
+#include "device/system/StandingTime.h"
 #include "host/core/PaneSession.h"
 #include "host/core/scenario/RunningApplications.h"
 #include "host/core/scenario/ScenarioReader.h"
@@ -14,6 +15,7 @@
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
+#include <memory>
 #include <string>
 
 namespace nimbra::host {
@@ -29,10 +31,11 @@ protected:
         EXPECT_TRUE(scenario) << scenario.error();
         EXPECT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
         Trace trace([](const std::string&) {});
-        const auto session =
-            PaneSession::start({.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace});
+        const auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
+        const auto session = PaneSession::start(
+            {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
         EXPECT_TRUE(session) << session.error();
-        return ScenarioPlayer(*scenario, **session, applications, trace).play();
+        return ScenarioPlayer(*scenario, **session, applications, *time, trace).play();
     }
 
     [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }

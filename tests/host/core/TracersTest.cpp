@@ -74,6 +74,58 @@ TEST_F(Tracers, TellOfObserversAsLongAsTheyAreRegistered) {
                      R"({"event":"observer","op":"remove","center":"local","name":"Changed"})"}));
 }
 
+TEST_F(Tracers, TellOfObserversOnTheWholeDevice) {
+    const NotificationName name("Changed");
+    int calls = 0;
+    const auto token = _services.distributedNotificationCenter->addObserverForName(
+        name, {.queue = &_platform.workQueues.mainQueue(),
+               .usingBlock = [&](const Notification&) { ++calls; }});
+    _services.distributedNotificationCenter->postNotification({.name = name});
+    _services.distributedNotificationCenter->removeObserver(token);
+    _platform.workQueues.mainQueue().pump();
+
+    EXPECT_EQ(calls, 1);
+    EXPECT_EQ(_platform.distributedNotificationCenter.registrations.size(), 0U);
+    EXPECT_EQ(takeLines(),
+              (Lines{R"({"event":"observer","op":"add","center":"distributed","name":"Changed"})",
+                     R"({"event":"observer","op":"remove","center":"distributed",)"
+                     R"("name":"Changed"})"}));
+}
+
+TEST_F(Tracers, TellWhatIsAskedOfATimerAndWhenItFallsDue) {
+    int calls = 0;
+    const auto timer = _services.workQueues->timerSourceOnQueue(_services.workQueues->mainQueue());
+    timer->setEventHandler([&] { ++calls; });
+    timer->setTimer(std::chrono::seconds(2), std::chrono::milliseconds(1500),
+                    std::chrono::nanoseconds(0));
+    timer->resume();
+    _platform.workQueues.timers().at(0)->fire();
+    timer->suspend();
+    timer->cancel();
+
+    EXPECT_EQ(calls, 1);
+    EXPECT_EQ(_platform.workQueues.timers().at(0)->calls,
+              (Lines{"arm 2.000000/1.500000", "resume", "suspend", "cancel"}));
+    EXPECT_EQ(takeLines(),
+              (Lines{R"({"event":"timer","op":"arm","first":2,"interval":1.5})",
+                     R"({"event":"timer","op":"resume"})", R"({"event":"timer","op":"fire"})",
+                     R"({"event":"timer","op":"suspend"})", R"({"event":"timer","op":"cancel"})"}));
+}
+
+TEST_F(Tracers, TellWhoseProgressIsFollowed) {
+    const auto subscriber =
+        _services.progressReports->_addSubscriberForFileURLWithPublishingHandler(
+            "file:///documents/", [](const auto&) { return [] {}; });
+    EXPECT_EQ(_platform.progressReports.subscriptionCount(), 1U);
+    _services.progressReports->_removeSubscriber(subscriber);
+
+    EXPECT_EQ(_platform.progressReports.subscriptionCount(), 0U);
+    EXPECT_EQ(takeLines(), (Lines{R"({"event":"progress",)"
+                                  R"("op":"_addSubscriberForFileURL:withPublishingHandler:",)"
+                                  R"("url":"file:///documents/"})",
+                                  R"({"event":"progress","op":"_removeSubscriber:"})"}));
+}
+
 TEST_F(Tracers, TellWhatIsAskedOfTheContainers) {
     _platform.documentContainers.listed = {
         {.identifier = "one", .isPublic = false},
@@ -184,7 +236,7 @@ TEST_F(Tracers, TellOfEachChangeOfTheList) {
     const ControllerClass paneClass{.name = "Pane", .create = {}};
     const auto page = std::make_shared<AccountPage>(_services, "Drive", paneClass, UserInfo());
     static_cast<void>(page->specifiers());
-    _tracer.observeList(*page);
+    page->setObserver(&_tracer.listObserver());
     const auto more = Specifier::groupSpecifierWithID("More");
     const auto nameless = Specifier::preferenceSpecifierNamed(nullptr, {.cell = ButtonCell});
 

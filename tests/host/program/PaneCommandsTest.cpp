@@ -39,6 +39,8 @@ TEST(DefaultDevice, IsMadeFromTheSampleOnFirstUse) {
               "    Apps can keep their documents and data in Nimbra Drive, so you can get\n"
               "    to them on all your devices.\n"
               "\n"
+              "    Last synced on March 5, 2024\n"
+              "\n"
               "  2000 Songs                                                                 off\n"
               "  Atlas                                                                      off\n"
               "  Budget                                                                     off\n"
