@@ -1,9 +1,12 @@
 #include "device/system/DeviceSystemLog.h"
 
 #include "device/DeviceError.h"
+#include "device/files/Descriptor.h"
 
 #include <array>
 #include <cstdlib>
+#include <fcntl.h>
+#include <filesystem>
 #include <iostream>
 #include <mutex>
 #include <spdlog/logger.h>
@@ -40,9 +43,12 @@ void writeToStandardError(const std::string& line) {
 
 } // namespace
 
-/// The log file, made when something is to be written.
+/// The log file, made when something is to be written, with its folders.
 class DeviceSystemLog::File {
 public:
+    explicit File(const std::filesystem::path& root)
+        : _root(::open(root.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
+
     void write(const DevicePaths& paths, LogLevel level, const std::string& line) {
         const std::scoped_lock lock(_mutex);
         if (!_opened) {
@@ -63,10 +69,14 @@ private:
             writeToStandardError(path.error().description);
             return;
         }
+        // By the directory that was there at the start: the library makes folders that are missing,
+        // and one in the place of a device that has been removed meanwhile would come back.
+        const auto place = std::filesystem::path("/proc/self/fd") / std::to_string(_root.number()) /
+                           path->lexically_relative(paths.root());
         try {
             _logger = std::make_unique<spdlog::logger>(
                 programName, std::make_shared<spdlog::sinks::rotating_file_sink_mt>(
-                                 path->string(), largest, earlierFiles));
+                                 place.string(), largest, earlierFiles));
         } catch (const spdlog::spdlog_ex& exception) {
             writeToStandardError(oneLine(path->string() + ": " + exception.what()));
             return;
@@ -78,6 +88,7 @@ private:
         });
     }
 
+    const Descriptor _root;
     std::mutex _mutex;
     std::unique_ptr<spdlog::logger> _logger;
     bool _opened = false;
@@ -90,7 +101,8 @@ DeviceSystemLog::Destination DeviceSystemLog::usualDestination() {
 }
 
 DeviceSystemLog::DeviceSystemLog(DevicePaths paths, Destination destination)
-    : _paths(std::move(paths)), _destination(destination), _file(std::make_unique<File>()) {
+    : _paths(std::move(paths)), _destination(destination),
+      _file(std::make_unique<File>(_paths.root())) {
     const char* const wish = std::getenv("NIMBRA_LOG");
     _debugEnabled = wish != nullptr && std::string_view(wish) == "debug";
 }

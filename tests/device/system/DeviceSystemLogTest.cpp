@@ -88,6 +88,22 @@ TEST_F(DeviceSystemLogTest, AFileThatCannotBeOpenedIsToldOnceAndErrorsStillShow)
     EXPECT_EQ(test::contentOf(root() / "var/log"), "in the way");
 }
 
+TEST_F(DeviceSystemLogTest, ADeviceThatIsRemovedDoesNotComeBackWithItsLog) {
+    const auto device = root() / "device";
+    std::filesystem::create_directory(device);
+    DeviceSystemLog systemLog(DevicePaths(device), DeviceSystemLog::Destination::file);
+    std::filesystem::remove(device);
+    testing::internal::CaptureStderr();
+
+    systemLog.write(LogLevel::standard, "did");
+
+    EXPECT_FALSE(std::filesystem::exists(device));
+    const std::string shown = testing::internal::GetCapturedStderr();
+    const std::string place = (device / "var/log/nimbra/settings.log").string();
+    EXPECT_TRUE(shown.starts_with("nimbra-settings: " + place + ": ")) << shown;
+    EXPECT_EQ(std::ranges::count(shown, '\n'), 1);
+}
+
 TEST_F(DeviceSystemLogTest, ManyThreadsMayWriteWholeLines) {
     DeviceSystemLog systemLog = log();
     const auto write = [&systemLog] {
