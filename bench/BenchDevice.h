@@ -35,6 +35,12 @@ public:
     /// The same, but with other bundles, which are not owned.
     [[nodiscard]] PlatformServices servicesWith(Bundles& bundles);
 
+    /// Runs what is queued on the main queue, and what that queues in turn.
+    void runMainQueue() {
+        while (_loop.runPending()) {
+        }
+    }
+
     /// The folder of the pane's bundle as it was built.
     [[nodiscard]] static std::filesystem::path builtBundle();
     [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }

@@ -48,12 +48,12 @@ std::optional<Date> dateIn(const UserInfo& userInfo) {
 
 /// Both descriptions, or the first alone; the second never stands alone.
 Text textOf(const ProgressReport& progress) {
-    const Text description = progress.localizedDescription();
+    Text description = progress.localizedDescription();
     const Text additional = progress.localizedAdditionalDescription();
     if (description.string().empty() || additional.string().empty()) {
         return description;
     }
-    return Text(description.string() + " (" + additional.string() + ')');
+    return {description.string() + " (" + additional.string() + ')'};
 }
 
 } // namespace

@@ -13,7 +13,7 @@ namespace {
 
 /// The text without the blanks that keep a line's place.
 std::string wordsOf(const host::FooterDescription& footer) {
-    std::string words = printable(footer.text.string());
+    const std::string words = printable(footer.text.string());
     const std::size_t first = words.find_first_not_of(' ');
     if (first == std::string::npos) {
         return {};
@@ -61,7 +61,7 @@ std::string cut(const std::string& line, std::size_t width) {
 } // namespace
 
 std::string statusText(const host::FooterDescription& footer) {
-    const std::string words = wordsOf(footer);
+    std::string words = wordsOf(footer);
     if (footer.barHidden) {
         return words;
     }

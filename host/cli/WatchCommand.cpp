@@ -46,7 +46,8 @@ std::expected<void, Failure> watch(host::PaneSession& session, std::ostream& out
     const std::string start = isTerminal ? "\r\x1b[K" : "";
     const std::string end = isTerminal ? "" : "\n";
     std::optional<std::string> shown;
-    do {
+    bool goesOn = true;
+    while (goesOn) {
         session.runPending();
         const auto footer = session.isPaneOpen() ? session.footers().first() : nullptr;
         if (!footer) {
@@ -60,7 +61,8 @@ std::expected<void, Failure> watch(host::PaneSession& session, std::ostream& out
             out << start << line << end << std::flush;
             shown = line;
         }
-    } while (out && waitForWork(session));
+        goesOn = out && waitForWork(session);
+    }
     if (isTerminal && !shown.value_or("").empty()) {
         out << '\n' << std::flush;
     }
