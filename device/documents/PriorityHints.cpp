@@ -1,6 +1,7 @@
 #include "device/documents/PriorityHints.h"
 
 #include "device/DeviceError.h"
+#include "device/files/Folders.h"
 #include "device/files/PercentEncoding.h"
 
 #include <cerrno>
@@ -13,19 +14,15 @@ namespace nimbra::device {
 
 PriorityHints::PriorityHints(DevicePaths paths) : _paths(std::move(paths)) {}
 
-std::expected<std::filesystem::path, Error> PriorityHints::directory() const {
-    return _paths.resolve(std::string(kPriorityHintsDirectory) + '/' + std::to_string(::getpid()));
+std::string PriorityHints::directory() {
+    return std::string(kPriorityHintsDirectory) + '/' + std::to_string(::getpid());
 }
 
 std::expected<void, Error> PriorityHints::add(const std::string& container) const {
-    const auto folder = directory();
+    constexpr mode_t forEverybodyToRead = 0755;
+    const auto folder = makeFolder(_paths, directory(), forEverybodyToRead);
     if (!folder) {
         return std::unexpected(folder.error());
-    }
-    std::error_code failure;
-    std::filesystem::create_directories(*folder, failure);
-    if (failure) {
-        return std::unexpected(fileError(*folder, "cannot be made", failure.value()));
     }
     const std::filesystem::path hint = *folder / percentEncoded(container);
     constexpr mode_t readableByEverybody = 0644;
@@ -38,7 +35,7 @@ std::expected<void, Error> PriorityHints::add(const std::string& container) cons
 }
 
 std::expected<void, Error> PriorityHints::removeAll() const {
-    const auto folder = directory();
+    const auto folder = _paths.resolve(directory());
     if (!folder) {
         return std::unexpected(folder.error());
     }

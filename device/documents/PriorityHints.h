@@ -22,7 +22,8 @@ public:
     [[nodiscard]] std::expected<void, Error> removeAll() const;
 
 private:
-    [[nodiscard]] std::expected<std::filesystem::path, Error> directory() const;
+    /// Where this process has its hints, on the device.
+    [[nodiscard]] static std::string directory();
 
     DevicePaths _paths;
 };

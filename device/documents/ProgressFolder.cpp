@@ -4,6 +4,7 @@
 #include "device/documents/ProgressFile.h"
 #include "device/documents/ProgressPublisher.h"
 #include "device/files/Files.h"
+#include "device/files/Folders.h"
 #include "device/files/PlainFile.h"
 #include "platform/system/SystemLog.h"
 
@@ -60,9 +61,13 @@ void ProgressFolder::start() {
         _log.write(LogLevel::error, watched.error().description);
         return;
     }
-    if (auto names = namesInFolder()) {
-        _thread = std::thread([this, names = std::move(*names)] { run(names); });
+    const auto names = namesInFolder();
+    if (!names) {
+        return;
     }
+    // At once: who shows a page and ends shows the sync that is under way.
+    readAll(*names);
+    _thread = std::thread([this] { run(); });
 }
 
 void ProgressFolder::finish() {
@@ -75,18 +80,12 @@ void ProgressFolder::finish() {
 }
 
 std::expected<void, Error> ProgressFolder::makeAndWatch() {
-    auto directory = _paths.resolve(kProgressDirectory);
+    constexpr mode_t forItsOwner = 0700;
+    auto directory = makeFolder(_paths, kProgressDirectory, forItsOwner);
     if (!directory) {
         return std::unexpected(directory.error());
     }
     _directory = std::move(*directory);
-    std::error_code failure;
-    std::filesystem::create_directories(_directory.parent_path(), failure);
-    constexpr mode_t forItsOwner = 0700;
-    if (failure || (::mkdir(_directory.c_str(), forItsOwner) != 0 && errno != EEXIST)) {
-        return std::unexpected(
-            fileError(_directory, "cannot be made", failure ? failure.value() : errno));
-    }
     _watch.emplace(::inotify_init1(IN_CLOEXEC | IN_NONBLOCK));
     _end.emplace(::eventfd(0, EFD_CLOEXEC));
     constexpr std::uint32_t events = IN_CLOSE_WRITE | IN_MOVED_TO | IN_MOVED_FROM | IN_DELETE |
@@ -98,9 +97,8 @@ std::expected<void, Error> ProgressFolder::makeAndWatch() {
     return {};
 }
 
-void ProgressFolder::run(const std::set<std::string>& firstFiles) {
+void ProgressFolder::run() {
     ::pthread_setname_np(::pthread_self(), "progress-folder");
-    readAll(firstFiles);
     std::array<pollfd, 2> files{pollfd{.fd = _watch->number(), .events = POLLIN, .revents = 0},
                                 pollfd{.fd = _end->number(), .events = POLLIN, .revents = 0}};
     while (true) {

@@ -38,8 +38,8 @@ public:
     /// Ends the thread as `finish` does.
     ~ProgressFolder();
 
-    /// Makes the folder where it is missing, for its owner alone, and watches it from here on,
-    /// beginning with what stands there. Where that is not possible, one line in the log says why.
+    /// Makes the folder where it is missing, for its owner alone, publishes what stands there, and
+    /// watches it from here on. Where that is not possible, one line in the log says why.
     /// Once only.
     void start();
 
@@ -48,7 +48,7 @@ public:
 
 private:
     [[nodiscard]] std::expected<void, Error> makeAndWatch();
-    void run(const std::set<std::string>& firstFiles);
+    void run();
     /// Does what the watch has told; false once the folder has gone.
     [[nodiscard]] bool readEvents();
     /// The names of what stands in the folder now; nothing, with a line in the log, on an error.
@@ -69,7 +69,7 @@ private:
     std::optional<Descriptor> _watch;
     /// Tells the thread to end.
     std::optional<Descriptor> _end;
-    /// What is published of each file. Only the thread's.
+    /// What is published of each file. Only the thread's, once that has begun.
     std::map<std::string, ProgressValues> _published;
     /// What the log was told of each bad file, so as not to repeat it. Only the thread's.
     std::map<std::string, std::string> _reported;

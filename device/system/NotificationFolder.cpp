@@ -2,6 +2,7 @@
 
 #include "device/DeviceError.h"
 #include "device/files/Files.h"
+#include "device/files/Folders.h"
 
 #include <algorithm>
 #include <atomic>
@@ -49,23 +50,6 @@ Descriptor openFolder(const std::filesystem::path& path) {
     return Descriptor(::open(path.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC));
 }
 
-std::expected<Descriptor, Error> makeFolder(const std::filesystem::path& path) {
-    std::error_code failure;
-    std::filesystem::create_directories(path.parent_path(), failure);
-    constexpr mode_t forItsOwner = 0700;
-    if (failure) {
-        return std::unexpected(fileError(path, "cannot be made", failure.value()));
-    }
-    if (::mkdir(path.c_str(), forItsOwner) != 0 && errno != EEXIST) {
-        return std::unexpected(fileError(path, "cannot be made", errno));
-    }
-    Descriptor folder = openFolder(path);
-    if (!folder.isOpen()) {
-        return std::unexpected(fileError(path, "cannot be opened", errno));
-    }
-    return folder;
-}
-
 bool isSocket(const Descriptor& folder, const std::string& name) {
     struct stat status{};
     return ::fstatat(folder.number(), name.c_str(), &status, AT_SYMLINK_NOFOLLOW) == 0 &&
@@ -111,13 +95,14 @@ NotificationFolder::Socket::~Socket() {
 NotificationFolder::NotificationFolder(DevicePaths paths) : _paths(std::move(paths)) {}
 
 std::expected<NotificationFolder::Socket, Error> NotificationFolder::bind() const {
-    const auto path = _paths.resolve(kNotificationsDirectory);
+    constexpr mode_t forItsOwner = 0700;
+    const auto path = makeFolder(_paths, kNotificationsDirectory, forItsOwner);
     if (!path) {
         return std::unexpected(path.error());
     }
-    auto folder = makeFolder(*path);
-    if (!folder) {
-        return std::unexpected(folder.error());
+    Descriptor folder = openFolder(*path);
+    if (!folder.isOpen()) {
+        return std::unexpected(fileError(*path, "cannot be opened", errno));
     }
     Descriptor socket = makeSocket();
     if (!socket.isOpen()) {
@@ -128,9 +113,9 @@ std::expected<NotificationFolder::Socket, Error> NotificationFolder::bind() cons
     constexpr int mostAttempts = 100;
     for (int attempt = 0; attempt < mostAttempts; ++attempt) {
         const std::string name = std::to_string(::getpid()) + '.' + std::to_string(++count);
-        const sockaddr_un address = addressOf(*folder, name);
+        const sockaddr_un address = addressOf(folder, name);
         if (::bind(socket.number(), generic(address), sizeof address) == 0) {
-            return Socket(std::move(*folder), std::move(socket), name);
+            return Socket(std::move(folder), std::move(socket), name);
         }
         if (errno != EADDRINUSE) {
             break;

@@ -65,7 +65,7 @@ private:
     SystemLog& _log;
     bool _isShown = false;
     /// The pane's own, and another one to move straight into.
-    std::array<Window, 2> _windows;
+    std::array<Window, 2> _windows{};
     /// Of the groups in the list, from top to bottom.
     std::vector<Footer> _footers;
     /// Of groups that are not in the list and may come back.

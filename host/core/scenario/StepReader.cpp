@@ -151,7 +151,7 @@ Arguments advance(const JsonReader& step) {
     const double seconds = reader.number();
     // Ten years: a timer that repeats falls due a few million times then.
     constexpr double most = 315'576'000;
-    if (!(seconds >= 0 && seconds <= most)) {
+    if (seconds < 0 || seconds > most) {
         reader.expected("a number from 0 to 315576000");
         return {};
     }

@@ -183,6 +183,17 @@ TEST_F(Watch, TheListShowsTheSentenceUnderTheSwitch) {
     EXPECT_LT(result.output.find("Nimbra Drive    "), sentence);
 }
 
+TEST_F(Watch, TheListShowsTheSyncThatIsUnderWay) {
+    const std::string device = makeDevice(R"("Synced at two.")");
+    std::filesystem::create_directories(std::filesystem::path(device) / "run/nimbra/progress");
+    writeProgress(device, "sync.json", R"({"fraction": 0.25, "description": "Uploading"})");
+
+    const auto result = _program.run({"--root", device, "list"});
+
+    EXPECT_EQ(result.status, 0);
+    EXPECT_NE(result.output.find("\n    25 %  Uploading\n"), std::string::npos) << result.output;
+}
+
 TEST_F(Watch, TheListHasNoLineWhereThereIsNothingToSay) {
     const std::string device = _program.makePlainDevice("device");
 
