@@ -4,26 +4,15 @@
 #include "device/apps/DesktopLocales.h"
 #include "device/apps/EntitlementsReader.h"
 #include "device/system/LanguageChain.h"
+#include "tests/fuzz/OneLine.h"
 
 #include <algorithm>
 #include <cmath>
-#include <unicode/unistr.h>
 #include <vector>
 
 namespace nimbra::test {
 
 namespace {
-
-bool isUtf8(const std::string& text) {
-    std::string again;
-    icu::UnicodeString::fromUTF8(text).toUTF8String(again);
-    return again == text;
-}
-
-bool isOneLine(const std::string& text) {
-    return isUtf8(text) &&
-           std::ranges::none_of(text, [](unsigned char byte) { return byte < 0x20; });
-}
 
 std::string faultIn(const EntitlementValue& value, std::size_t depth);
 
