@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/values/Date.h"
 #include "platform/values/Error.h"
 
 #include <chrono>
@@ -60,7 +61,7 @@ struct DeviceDescription {
     std::optional<Screen> screen = Screen();
     std::string locale = "en-US";
     std::string timeZone = "UTC";
-    std::chrono::system_clock::time_point now;
+    Date now;
     bool cellularData = true;
     std::optional<std::string> wirelessVariant;
     std::map<std::string, nlohmann::json> preferences;

@@ -15,7 +15,7 @@ inline constexpr std::chrono::nanoseconds refreshInterval = std::chrono::seconds
     if (date >= now) {
         return 0;
     }
-    // Unsigned: two dates can lie further apart than a signed count of ticks reaches.
+    // Unsigned: dates can lie further apart than a signed count of ticks reaches.
     const auto ticks = static_cast<std::uint64_t>(now.time_since_epoch().count()) -
                        static_cast<std::uint64_t>(date.time_since_epoch().count());
     constexpr auto ticksPerSecond = static_cast<std::uint64_t>(Date::duration::period::den);

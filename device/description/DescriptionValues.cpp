@@ -104,8 +104,7 @@ std::set<std::string> readNames(const JsonReader& reader) {
     return names;
 }
 
-std::chrono::system_clock::time_point readInstant(const JsonReader& reader,
-                                                  std::chrono::system_clock::time_point fallback) {
+Date readInstant(const JsonReader& reader, Date fallback) {
     if (reader.isAbsent()) {
         return fallback;
     }

@@ -1,9 +1,9 @@
 #pragma once
 
 #include "device/json/JsonReader.h"
+#include "platform/values/Date.h"
 #include "platform/values/Error.h"
 
-#include <chrono>
 #include <initializer_list>
 #include <optional>
 #include <set>
@@ -32,8 +32,7 @@ namespace nimbra::device {
 /// An array of strings that are not empty.
 [[nodiscard]] std::set<std::string> readNames(const JsonReader& reader);
 /// An instant as RFC 3339 writes it.
-[[nodiscard]] std::chrono::system_clock::time_point
-readInstant(const JsonReader& reader, std::chrono::system_clock::time_point fallback);
+[[nodiscard]] Date readInstant(const JsonReader& reader, Date fallback);
 
 /// An error: an object with domain, code and description.
 [[nodiscard]] Error readError(const JsonReader& reader);

@@ -1,12 +1,13 @@
 #include "device/description/Instant.h"
 
+#include <chrono>
 #include <regex>
 
 namespace nimbra::device {
 
-std::optional<std::chrono::system_clock::time_point> parseInstant(const std::string& text) {
+std::optional<Date> parseInstant(const std::string& text) {
     using namespace std::chrono;
-    static const std::regex form(R"((\d{4})-(\d\d)-(\d\d)[Tt](\d\d):(\d\d):(\d\d)(\.\d{1,9})?)"
+    static const std::regex form(R"((\d{4})-(\d\d)-(\d\d)[Tt](\d\d):(\d\d):(\d\d)(\.\d+)?)"
                                  R"(([Zz]|([+-])(\d\d):(\d\d)))");
     std::smatch match;
     if (!std::regex_match(text, match, form)) {

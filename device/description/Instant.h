@@ -1,6 +1,7 @@
 #pragma once
 
-#include <chrono>
+#include "platform/values/Date.h"
+
 #include <optional>
 #include <string>
 
@@ -8,7 +9,6 @@ namespace nimbra::device {
 
 /// The instant that `text` names in the form of RFC 3339, to the microsecond; nothing for any
 /// other text.
-[[nodiscard]] std::optional<std::chrono::system_clock::time_point>
-parseInstant(const std::string& text);
+[[nodiscard]] std::optional<Date> parseInstant(const std::string& text);
 
 } // namespace nimbra::device

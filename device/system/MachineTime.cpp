@@ -39,7 +39,7 @@ std::chrono::nanoseconds MachineTime::elapsed() const {
 }
 
 Date MachineTime::now() const {
-    return std::chrono::system_clock::now();
+    return std::chrono::floor<Date::duration>(std::chrono::system_clock::now());
 }
 
 void MachineTime::setWake(std::function<void()> wake) {

@@ -31,7 +31,7 @@ TEST(DeviceDescriptionTest, ADeviceThatNobodyDescribedHasTheDefaults) {
     EXPECT_EQ(description.screen->scale, 2);
     EXPECT_EQ(description.locale, "en-US");
     EXPECT_EQ(description.timeZone, "UTC");
-    EXPECT_EQ(std::chrono::system_clock::to_time_t(description.now), 1709647629);
+    EXPECT_EQ(description.now, Date(std::chrono::seconds(1709647629)));
     EXPECT_TRUE(description.cellularData);
     EXPECT_EQ(description.wirelessVariant, std::nullopt);
     EXPECT_TRUE(description.apps.empty());
@@ -86,7 +86,7 @@ TEST(DeviceDescriptionTest, EveryPartIsRead) {
     EXPECT_EQ(description.screen->scale, 2);
     EXPECT_EQ(description.locale, "zh-Hant-TW");
     EXPECT_EQ(description.timeZone, "Asia/Tokyo");
-    EXPECT_EQ(std::chrono::system_clock::to_time_t(description.now), 1709647629);
+    EXPECT_EQ(description.now, Date(std::chrono::seconds(1709647629)));
     EXPECT_FALSE(description.cellularData);
     EXPECT_EQ(description.wirelessVariant, "WAPI");
     EXPECT_EQ(description.preferences.at("com.vantrel.marrow").dump(),

@@ -43,7 +43,7 @@ struct FooterFixture : testing::Test {
     [[nodiscard]] bool isBarHidden() const { return view->progressBar()->isHidden(); }
 
     /// The daemon has this date of the last sync.
-    void storeAge(std::chrono::nanoseconds age) { platform.lastSync.date = now - age; }
+    void storeAge(Date::duration age) { platform.lastSync.date = now - age; }
 
     /// A notification comes in that carries `userInfo`.
     void postLastSync(const UserInfo& userInfo) {

@@ -95,12 +95,42 @@ TEST_F(FooterProgress, TheEndOfAProgressHidesTheBarAndShowsTheSentence) {
 
 TEST_F(FooterProgress, TheEndHoldsProgressAndView) {
     auto progress = progressCalled("Uploading");
-    const std::weak_ptr<FakeProgress> held = progress;
+    const std::weak_ptr<FakeProgress> heldProgress = progress;
     auto end = platform.progressReports.publish(std::exchange(progress, nullptr));
+    timer().setEventHandler({});
+    platform.progressReports.finish();
+    platform.distributedNotificationCenter.registrations.clear();
+    const std::weak_ptr<View> heldView = view;
 
-    EXPECT_FALSE(held.expired());
+    view.reset();
+
+    EXPECT_FALSE(heldProgress.expired());
+    EXPECT_FALSE(heldView.expired());
     end = {};
-    EXPECT_TRUE(held.expired());
+    EXPECT_TRUE(heldProgress.expired());
+    EXPECT_TRUE(heldView.expired());
+}
+
+TEST_F(FooterProgress, AChangeOfTheFractionAloneAsksForALayout) {
+    const auto progress = progressCalled("Uploading");
+    const auto end = platform.progressReports.publish(progress);
+    view->layoutIfNeeded();
+    progress->fraction = 0.5;
+
+    progress->tell(fractionCompletedKeyPath);
+
+    EXPECT_TRUE(view->needsLayout());
+    end();
+}
+
+TEST_F(FooterProgress, AnEndThatChangesNoTextAsksForALayout) {
+    const auto end = platform.progressReports.publish(progressCalled("Synced."));
+    view->layoutIfNeeded();
+
+    end();
+
+    EXPECT_EQ(text(), Text("Synced."));
+    EXPECT_TRUE(view->needsLayout());
 }
 
 TEST_F(FooterProgress, AFileOperationIsNotShown) {

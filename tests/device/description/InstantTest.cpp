@@ -24,7 +24,10 @@ TEST(InstantTest, OffsetsAndFractionsAreCounted) {
     EXPECT_EQ(microsecondsOf("2024-03-05T08:37:09-05:30"), 1709647629 * second);
     EXPECT_EQ(microsecondsOf("1970-01-01T00:00:00.5Z"), second / 2);
     EXPECT_EQ(microsecondsOf("1970-01-01T00:00:00.123456789Z"), 123456);
+    EXPECT_EQ(microsecondsOf("1970-01-01T00:00:00.1234567890123Z"), 123456);
     EXPECT_EQ(microsecondsOf("1969-12-31T23:59:60Z"), 0);
+    EXPECT_EQ(microsecondsOf("0001-01-01T00:00:00Z"), -62135596800 * second);
+    EXPECT_EQ(microsecondsOf("9999-12-31T23:59:59Z"), 253402300799 * second);
     EXPECT_EQ(microsecondsOf("2024-02-29T00:00:00Z"), 1709164800 * second);
 }
 

@@ -96,6 +96,12 @@ TEST(LastSyncSentenceTest, InArabic) {
                    "تمت آخر مزامنة للتو"}));
 }
 
+TEST(LastSyncSentenceTest, EveryYearThatCanBeWrittenHasItsSentence) {
+    EXPECT_EQ(told("en-US", "0001-06-01T12:00:00Z"), "Last synced on June 3, 1");
+    EXPECT_EQ(told("en-US", "1700-01-02T12:00:00Z"), "Last synced on January 2, 1700");
+    EXPECT_EQ(told("en-US", "9999-12-31T12:00:00Z"), "Last synced just now");
+}
+
 TEST(LastSyncSentenceTest, ARegionHasTheRulesOfItsOwn) {
     EXPECT_EQ(told("en-GB", "2023-12-24T12:00:00Z"), "Last synced on 24 December 2023");
     EXPECT_EQ(told("de-AT", "2024-01-02T12:00:00Z"), "Zuletzt am 2. Jänner synchronisiert");

@@ -172,7 +172,7 @@ TEST_F(DeviceLocalizationTest, TextsStandWhereTheirNumberIs) {
 
 TEST_F(DeviceLocalizationTest, DatesAreShownInTheDevicesTimeZone) {
     // 2024-03-05T20:07:09Z is the next morning in Tokyo.
-    const Date date = std::chrono::system_clock::from_time_t(1709669229);
+    const Date date = Date(std::chrono::seconds(1709669229));
     EXPECT_EQ(formatted("en-US", "{0, date, short}", {date}), "3/6/24");
     EXPECT_EQ(formatted("de-DE", "{0, date, short}", {date}), "06.03.24");
     EXPECT_EQ(formatted("de-DE", "{1}: {0, time, short}", {date, Text("um")}), "um: 05:07");

@@ -33,10 +33,10 @@ TEST_F(StandingTimeTest, ItStandsAtItsStartUntilItIsToldToMove) {
     EXPECT_EQ(time().now(), start());
 
     time().advance(seconds(90));
-    time().advance(nanoseconds(1));
+    time().advance(microseconds(1));
 
-    EXPECT_EQ(time().elapsed(), seconds(90) + nanoseconds(1));
-    EXPECT_EQ(time().now(), start() + seconds(90) + nanoseconds(1));
+    EXPECT_EQ(time().elapsed(), seconds(90) + microseconds(1));
+    EXPECT_EQ(time().now(), start() + seconds(90) + microseconds(1));
 }
 
 TEST_F(StandingTimeTest, ItNeverGoesBack) {
@@ -53,7 +53,7 @@ TEST_F(StandingTimeTest, ItWakesWhenTheDeadlineIsReachedAndNotBefore) {
 
     time().advance(seconds(10) - nanoseconds(1));
     EXPECT_EQ(wakes(), 0);
-    time().advance(nanoseconds(1));
+    time().advance(microseconds(1));
 
     EXPECT_EQ(wakes(), 1);
 }
