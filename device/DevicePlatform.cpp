@@ -162,11 +162,15 @@ DevicePlatform::DevicePlatform(std::unique_ptr<Parts> parts) : _parts(std::move(
 
 DevicePlatform::~DevicePlatform() {
     // In this order: what comes from outside queues work, and so may blocks that are let go.
-    _parts->progressFolder.finish();
-    _parts->distributedNotificationCenter.finish();
+    stopListening();
     _parts->workQueues.finish();
     // Views, which the handlers hold, may still ask services for something as they go.
     _parts->progressReports.finish();
+}
+
+void DevicePlatform::stopListening() {
+    _parts->progressFolder.finish();
+    _parts->distributedNotificationCenter.finish();
 }
 
 PlatformServices DevicePlatform::servicesFor(Presenter& presenter, ViewMetrics& viewMetrics) {

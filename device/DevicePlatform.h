@@ -50,6 +50,10 @@ public:
     /// outlive the pane, as the platform does.
     [[nodiscard]] PlatformServices servicesFor(Presenter& presenter, ViewMetrics& viewMetrics);
 
+    /// From here on nothing comes from other processes: no progress and no notification. What has
+    /// come and has not been told yet is dropped.
+    void stopListening();
+
     // What a host needs of the device beyond what a pane may ask.
 
     [[nodiscard]] DeviceAccountStore& accountStore();

@@ -80,6 +80,14 @@ int sendTo(const sockaddr_un& address, std::string_view message, SteadyClock::ti
     return 0;
 }
 
+/// Removes the socket called `name` where nobody reads from it any more, and says whether it has.
+bool removeStale(const Descriptor& folder, const std::string& name) {
+    const Descriptor probe = makeSocket();
+    const sockaddr_un address = addressOf(folder, name);
+    return probe.isOpen() && ::connect(probe.number(), generic(address), sizeof address) != 0 &&
+           errno == ECONNREFUSED && ::unlinkat(folder.number(), name.c_str(), 0) == 0;
+}
+
 } // namespace
 
 NotificationFolder::Socket::Socket(Descriptor folder, Descriptor descriptor, std::string name)
@@ -108,20 +116,23 @@ std::expected<NotificationFolder::Socket, Error> NotificationFolder::bind() cons
     if (!socket.isOpen()) {
         return std::unexpected(fileError(*path, "no socket can be made", errno));
     }
-    // Another process may have had this one's number, and left its sockets behind.
     static std::atomic<unsigned> count = 0;
     constexpr int mostAttempts = 100;
-    for (int attempt = 0; attempt < mostAttempts; ++attempt) {
+    for (int attempt = 0; attempt < mostAttempts;) {
         const std::string name = std::to_string(::getpid()) + '.' + std::to_string(++count);
         const sockaddr_un address = addressOf(folder, name);
         if (::bind(socket.number(), generic(address), sizeof address) == 0) {
             return Socket(std::move(folder), std::move(socket), name);
         }
         if (errno != EADDRINUSE) {
-            break;
+            return std::unexpected(fileError(*path, "no socket can be bound", errno));
+        }
+        // Another process may have had this one's number, and left its sockets behind.
+        if (!removeStale(folder, name)) {
+            ++attempt;
         }
     }
-    return std::unexpected(fileError(*path, "no socket can be bound", errno));
+    return std::unexpected(fileError(*path, "no socket can be bound", EADDRINUSE));
 }
 
 std::vector<Error> NotificationFolder::send(std::string_view message, const std::string& own,

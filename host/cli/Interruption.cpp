@@ -30,6 +30,10 @@ Interruption::Interruption(std::initializer_list<int> signals) {
     static_cast<void>(::eventfd_read(interruptionDescriptor, &earlier));
     struct sigaction action{};
     action.sa_handler = noteInterruption;
+    if (interruptionDescriptor < 0) {
+        // Signals that nobody would learn of had better end the program.
+        return;
+    }
     for (const int signal : signals) {
         struct sigaction before{};
         ::sigaction(signal, nullptr, &before);

@@ -22,9 +22,13 @@ std::string wordsOf(const host::FooterDescription& footer) {
 }
 
 std::string percentage(float progress) {
-    constexpr float hundred = 100;
+    constexpr double hundred = 100;
+    // A bar holds 0.53 as a little less than that.
+    constexpr double tolerance = 1e-4;
     // Not rounded up: only what is complete shows as complete.
-    return std::to_string(static_cast<int>(std::floor(progress * hundred))) + " %";
+    const double most = progress < 1 ? hundred - 1 : hundred;
+    const double whole = std::floor((static_cast<double>(progress) * hundred) + tolerance);
+    return std::to_string(static_cast<int>(std::min(whole, most))) + " %";
 }
 
 std::string drawnBar(float progress) {

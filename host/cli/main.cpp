@@ -173,6 +173,10 @@ int runProgram(int count, char** words) {
         std::cerr << "settingsctl: " << printable(outcome.error().message) << '\n';
         return outcome.error().exitStatus;
     }
+    if (!std::cout.flush()) {
+        std::cerr << "settingsctl: the output cannot be written\n";
+        return exitRefused;
+    }
     return exitDone;
 }
 

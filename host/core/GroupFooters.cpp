@@ -17,6 +17,12 @@ GroupFooters::~GroupFooters() {
     setShown(false);
 }
 
+bool GroupFooters::Footer::isFor(const Specifier& row, const std::string& rowClass) const {
+    const bool isSameGroup =
+        group.get() == &row || (row.identifier() && row.identifier() == group->identifier());
+    return isSameGroup && className == rowClass;
+}
+
 void GroupFooters::update(const SpecifierArray& rows) {
     std::vector<Footer> earlier = std::exchange(_footers, {});
     std::ranges::move(std::exchange(_absent, {}), std::back_inserter(earlier));
@@ -26,32 +32,35 @@ void GroupFooters::update(const SpecifierArray& rows) {
             continue;
         }
         const auto known = std::ranges::find_if(
-            earlier, [&row](const Footer& footer) { return footer.group.lock() == row; });
+            earlier, [&](const Footer& footer) { return footer.isFor(*row, className.string()); });
         if (known != earlier.end()) {
+            known->group = row;
             _footers.push_back(std::move(*known));
             earlier.erase(known);
         } else {
-            _footers.push_back(footerFor(row, className.string()));
+            _footers.push_back({.group = row,
+                                .className = className.string(),
+                                .view = viewFor(*row, className.string())});
         }
     }
-    for (Footer& footer : earlier) {
+    _absent = std::move(earlier);
+    for (const Footer& footer : _absent) {
         move(footer, nullptr);
-        if (!footer.group.expired()) {
-            _absent.push_back(std::move(footer));
-        }
     }
-    setShown(_isShown);
+    if (_isShown) {
+        setShown(true);
+    }
 }
 
-GroupFooters::Footer GroupFooters::footerFor(const std::shared_ptr<Specifier>& group,
-                                             const std::string& className) {
+std::shared_ptr<HeaderFooterView> GroupFooters::viewFor(const Specifier& group,
+                                                        const std::string& className) {
     const HeaderFooterClass* headerFooterClass = _classes.headerFooterClassNamed(className);
     if (headerFooterClass == nullptr) {
         _log.write(LogLevel::error, "No view class \"" + className + "\" for the group \"" +
-                                        group->label().string() + '"');
-        return {.group = group, .view = nullptr};
+                                        group.label().string() + '"');
+        return nullptr;
     }
-    return {.group = group, .view = headerFooterClass->initWithSpecifier(*group, _services)};
+    return headerFooterClass->initWithSpecifier(group, _services);
 }
 
 void GroupFooters::setShown(bool isShown) {
@@ -81,7 +90,7 @@ void GroupFooters::layOut(double width) {
 
 std::shared_ptr<HeaderFooterView> GroupFooters::footerOf(const Specifier& group) const {
     const auto place = std::ranges::find_if(
-        _footers, [&group](const Footer& footer) { return footer.group.lock().get() == &group; });
+        _footers, [&group](const Footer& footer) { return footer.group.get() == &group; });
     return place != _footers.end() ? place->view : nullptr;
 }
 

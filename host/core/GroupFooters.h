@@ -18,8 +18,9 @@ class SystemLog;
 namespace nimbra::host {
 
 /// The views under the groups of one pane's list: made when a group that names a class of them
-/// comes into the list for the first time, kept as long as there is the group. While the pane is
-/// shown, those whose group is in the list are in its window. Main queue.
+/// comes into the list for the first time, and kept while the pane is open. A list that is built
+/// anew has other groups, of the same identifiers: their views stay. While the pane is shown, those
+/// whose group is in the list are in its window. Main queue.
 class GroupFooters {
 public:
     /// Looks classes up in `classes` and makes their views over `services`; who names a class that
@@ -30,8 +31,8 @@ public:
     /// Takes the views out of the window and lets them go.
     ~GroupFooters();
 
-    /// Makes the views of the groups among `rows` that have none yet, takes those out of the window
-    /// whose group is not among them, and lets those go whose group is no more.
+    /// Makes the views of the groups among `rows` that have none yet, and takes those out of the
+    /// window whose group is not among them.
     void update(const SpecifierArray& rows);
 
     /// Moves the views into the window, or out of it; where they are already, nothing happens.
@@ -51,13 +52,17 @@ public:
 
 private:
     struct Footer {
-        std::weak_ptr<Specifier> group;
+        std::shared_ptr<Specifier> group;
+        std::string className;
         /// Null where the class is unknown.
         std::shared_ptr<HeaderFooterView> view;
+
+        /// Whether the view is the one for `row`, whose views are of this class.
+        [[nodiscard]] bool isFor(const Specifier& row, const std::string& rowClass) const;
     };
 
-    [[nodiscard]] Footer footerFor(const std::shared_ptr<Specifier>& group,
-                                   const std::string& className);
+    [[nodiscard]] std::shared_ptr<HeaderFooterView> viewFor(const Specifier& group,
+                                                            const std::string& className);
     static void move(const Footer& footer, Window* window);
 
     const ClassRegistry& _classes;

@@ -95,10 +95,13 @@ bool HostLoop::runPending() {
     }
     const device::CurrentQueueScope scope(label());
     const bool hadWork = !work.empty();
+    _turnObserver();
     while (!work.empty()) {
         Work piece = std::move(work.front());
         work.pop_front();
         piece();
+        piece = nullptr;
+        _turnObserver();
     }
     return hadWork;
 }

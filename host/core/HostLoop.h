@@ -3,10 +3,12 @@
 #include "platform/system/WorkQueue.h"
 
 #include <deque>
+#include <functional>
 #include <memory>
 #include <mutex>
 #include <string>
 #include <thread>
+#include <utility>
 
 namespace nimbra::device {
 class DeviceWorkQueues;
@@ -31,6 +33,10 @@ public:
     /// `run` operations take its signal back. Owned by the loop.
     [[nodiscard]] int wakeUpDescriptor() const;
 
+    /// Calls `observer` at the start of each run and after each piece of work: what follows what
+    /// the main queue has done stands before what it does next.
+    void setTurnObserver(std::function<void()> observer) { _turnObserver = std::move(observer); }
+
     /// Runs the work that is queued now, but not what that work queues in turn. Says whether there
     /// was any.
     bool runPending();
@@ -49,6 +55,7 @@ private:
     std::shared_ptr<WakeUp> _wakeUp;
     mutable std::mutex _mutex;
     std::deque<Work> _pending;
+    std::function<void()> _turnObserver = [] {};
 };
 
 } // namespace nimbra::host

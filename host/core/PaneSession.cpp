@@ -36,13 +36,18 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
 
 PaneSession::PaneSession(Configuration configuration)
     : _configuration(std::move(configuration)), _scope(_loop.label()),
-      _listWatcher([this] { updateFootersSoon(); }) {}
+      _listWatcher([this] { updateFootersSoon(); }) {
+    _loop.setTurnObserver([this] { updateFooters(); });
+}
 
 PaneSession::~PaneSession() {
     if (_device) {
+        // First, or a flood of news would have to be told before the end.
+        _device->stopListening();
         closePane();
         settle();
     }
+    _loop.setTurnObserver([] {});
 }
 
 void PaneSession::settle() {
@@ -117,8 +122,8 @@ void PaneSession::closePane() {
 
 void PaneSession::appear() {
     _isShown = true;
-    _footers->update(rows());
     _footers->setShown(true);
+    _footers->update(rows());
     _pane->viewDidAppear(true);
 }
 
@@ -129,16 +134,17 @@ void PaneSession::disappear() {
 }
 
 void PaneSession::updateFootersSoon() {
-    if (std::exchange(_areFootersBehind, true)) {
-        return;
+    // A batch of changes is one change to what stands in the window. The work makes sure that the
+    // main queue has a turn.
+    if (!_areFootersBehind.exchange(true)) {
+        _loop.async([] {});
     }
-    // A batch of changes is one change to what stands in the window.
-    _loop.async([this] {
-        _areFootersBehind = false;
-        if (_footers) {
-            _footers->update(rows());
-        }
-    });
+}
+
+void PaneSession::updateFooters() {
+    if (_areFootersBehind.exchange(false) && _footers) {
+        _footers->update(rows());
+    }
 }
 
 void PaneSession::pullToRefresh() {

@@ -11,6 +11,7 @@
 #include "platform/host/SettingsListController.h"
 #include "platform/values/Error.h"
 
+#include <atomic>
 #include <expected>
 #include <filesystem>
 #include <functional>
@@ -95,7 +96,8 @@ public:
     [[nodiscard]] bool isRefreshing();
     [[nodiscard]] std::string paneTitle() const;
     [[nodiscard]] const SpecifierArray& rows();
-    /// The views under the groups of the list; they follow it with the main queue's next run.
+    /// The views under the groups of the list; they follow it when the main queue runs, right after
+    /// the piece of work that has changed it.
     [[nodiscard]] GroupFooters& footers() { return *_footers; }
     /// The row that `name` stands for.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal> row(std::string_view name);
@@ -123,6 +125,7 @@ private:
 
     void setActivity(Text activity);
     void updateFootersSoon();
+    void updateFooters();
     void layOut();
     [[nodiscard]] std::expected<void, Error> loadBundle();
     [[nodiscard]] PlatformServices servicesForPane();
@@ -143,7 +146,8 @@ private:
     std::shared_ptr<SettingsListController> _pane;
     ListWatcher _listWatcher;
     std::unique_ptr<GroupFooters> _footers;
-    bool _areFootersBehind = false;
+    /// Set on any thread: on the one that posts, a notification can make the list anew.
+    std::atomic<bool> _areFootersBehind = false;
     bool _isShown = false;
     Text _activity;
     std::function<void()> _activityObserver;

@@ -36,15 +36,14 @@ std::string requiredString(const JsonReader& step, const std::string& key,
     return required(step, key, what).string();
 }
 
-/// A date stands as a text in a file; null where the notification is to carry none.
-UserInfoValue readDate(const JsonReader& reader) {
+/// The value under `key`, in whose place null stands for none; a date is a text in a file.
+UserInfoValue readUserInfoValue(const UserInfoKey& key, const JsonReader& reader) {
     if (reader.isNull()) {
         return {};
     }
-    return device::readInstant(reader, {});
-}
-
-UserInfoValue readUserInfoValue(const JsonReader& reader) {
+    if (key == MRSyncStatusLastSyncDateKey) {
+        return device::readInstant(reader, {});
+    }
     const nlohmann::ordered_json& value = reader.value();
     if (value.is_boolean()) {
         return value.get<bool>();
@@ -58,7 +57,7 @@ UserInfoValue readUserInfoValue(const JsonReader& reader) {
     if (value.is_string()) {
         return Text(value.get<std::string>());
     }
-    reader.expected("true, false, a number or a string");
+    reader.expected("true, false, a number, a string or null");
     return {};
 }
 
@@ -85,9 +84,7 @@ Arguments post(const JsonReader& step) {
     const JsonReader given = step.member("userInfo");
     for (const std::string& key : given.keys()) {
         const UserInfoKey name(key);
-        const JsonReader value = given.member(key);
-        arguments.notification.userInfo.emplace(
-            name, name == MRSyncStatusLastSyncDateKey ? readDate(value) : readUserInfoValue(value));
+        arguments.notification.userInfo.emplace(name, readUserInfoValue(name, given.member(key)));
     }
     arguments.distributed = step.member("distributed").boolean();
     if (const JsonReader from = step.member("from"); !from.isAbsent()) {

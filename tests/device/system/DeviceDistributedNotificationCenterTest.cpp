@@ -213,6 +213,29 @@ TEST_F(DeviceDistributedNotificationCenterTest, ASocketWhoseProcessIsGoneIsRemov
     EXPECT_EQ(logged(), Calls{});
 }
 
+TEST_F(DeviceDistributedNotificationCenterTest,
+       SocketsOfAnEarlierProcessOfTheNumberAreInNobodysWay) {
+    constexpr int more = 150;
+    std::filesystem::create_directories(folder());
+    for (int count = 1; count <= more; ++count) {
+        const std::string stale = std::to_string(::getpid()) + '.' + std::to_string(count);
+        const int socket = ::socket(AF_UNIX, SOCK_DGRAM | SOCK_CLOEXEC, 0);
+        const sockaddr_un address = addressOf(folder() / stale);
+        ASSERT_EQ(::bind(socket, reinterpret_cast<const sockaddr*>(&address), sizeof address), 0);
+        ::close(socket);
+    }
+
+    const auto center = makeCenter();
+    static_cast<void>(center->addObserverForName(name(), recording("told")));
+    // Whoever still reads is left alone, whatever its name is.
+    const auto second = makeCenter();
+    static_cast<void>(second->addObserverForName(name(), recording("second")));
+
+    EXPECT_EQ(logged(), Calls{});
+    center->postNotification({.name = name()});
+    EXPECT_EQ(sockets().size(), 2U);
+}
+
 TEST_F(DeviceDistributedNotificationCenterTest, AProcessThatDoesNotKeepUpMissesAPosting) {
     constexpr int more = 10'000; // than any machine queues for one socket
     std::filesystem::create_directories(folder());

@@ -32,6 +32,14 @@ TEST(StatusText, SaysHowFarTheSyncHasCome) {
     EXPECT_EQ(statusText(syncing(0, Text())), "0 %");
     EXPECT_EQ(statusText(syncing(1, "Done")), "100 %  Done");
     EXPECT_EQ(statusText(syncing(0.9999F, "Nearly")), "99 %  Nearly");
+    EXPECT_EQ(statusText(syncing(0.999999F, "Nearly")), "99 %  Nearly");
+}
+
+TEST(StatusText, EachHundredthIsItsPercentage) {
+    for (int percent = 0; percent <= 100; ++percent) {
+        const auto progress = static_cast<float>(percent / 100.0);
+        EXPECT_EQ(statusText(syncing(progress, "")), std::to_string(percent) + " %");
+    }
 }
 
 TEST(StatusText, ALineHasADrawnBar) {

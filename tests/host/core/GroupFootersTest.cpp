@@ -43,9 +43,9 @@ protected:
              }}));
     }
 
-    [[nodiscard]] static std::shared_ptr<Specifier> group(const char* identifier,
+    [[nodiscard]] static std::shared_ptr<Specifier> group(Text identifier,
                                                           const char* className = "Noted") {
-        auto made = Specifier::groupSpecifierWithID(identifier);
+        auto made = Specifier::groupSpecifierWithID(std::move(identifier));
         made->setPropertyForKey(Text(className), FooterCellClassGroupKey);
         return made;
     }
@@ -111,15 +111,52 @@ TEST_F(GroupFootersTest, AGroupThatComesBackHasItsViewAgain) {
     EXPECT_EQ(takeCalls(), (Calls{"a in", "a out", "a in"}));
 }
 
-TEST_F(GroupFootersTest, TheViewOfAGroupThatIsNoMoreGoes) {
-    auto a = group("a");
+TEST_F(GroupFootersTest, AListThatIsBuiltAnewKeepsTheViewsOfItsGroups) {
+    const auto before = group("a");
+    const auto after = group("a");
+    _footers.update({before});
+    _footers.setShown(true);
+    const auto view = _footers.footerOf(*before);
+
+    _footers.update({after});
+
+    EXPECT_EQ(_footers.footerOf(*after), view);
+    EXPECT_FALSE(_footers.footerOf(*before));
+    EXPECT_EQ(takeCalls(), Calls{"a in"});
+}
+
+TEST_F(GroupFootersTest, AnotherClassIsAnotherView) {
+    EXPECT_TRUE(_classes.registerHeaderFooterClass(
+        {.name = "Other",
+         .initWithSpecifier = [this](const Specifier& /*group*/, const PlatformServices& services) {
+             return std::make_shared<NotedView>(services, "other", _calls);
+         }}));
+    _footers.update({group("a")});
+    _footers.setShown(true);
+
+    _footers.update({group("a", "Other")});
+
+    EXPECT_EQ(takeCalls(), (Calls{"a in", "a out", "other in"}));
+}
+
+TEST_F(GroupFootersTest, GroupsWithoutAnIdentifierHaveViewsOfTheirOwn) {
+    const auto first = group(nullptr);
+    const auto second = group(nullptr);
+
+    _footers.update({first, second});
+
+    EXPECT_EQ(_made, 2);
+    EXPECT_NE(_footers.footerOf(*first), _footers.footerOf(*second));
+}
+
+TEST_F(GroupFootersTest, AViewThatWasMovedInStaysThereWhenTheListChanges) {
+    const auto a = group("a");
     _footers.update({a});
-    const std::weak_ptr<HeaderFooterView> gone = _footers.footerOf(*a);
+    _footers.moveFirst(true);
 
-    a.reset();
-    _footers.update({});
+    _footers.update({a, group("b")});
 
-    EXPECT_TRUE(gone.expired());
+    EXPECT_EQ(takeCalls(), Calls{"a in"});
 }
 
 TEST_F(GroupFootersTest, TheFirstViewMovesBetweenWindows) {

@@ -1,7 +1,11 @@
 #include "device/DeviceDirectory.h"
+#include "device/DevicePlatform.h"
+#include "device/documents/ProgressPublisher.h"
 #include "device/json/JsonReader.h"
+#include "host/core/FooterDescription.h"
 #include "host/core/PaneSession.h"
 #include "host/core/trace/Trace.h"
+#include "platform/documents/DaemonConnection.h"
 #include "platform/system/DistributedNotificationCenter.h"
 #include "tests/support/TemporaryDirectory.h"
 
@@ -82,6 +86,27 @@ TEST_F(ManyOpenings, LeaveOneRegistrationAndOneTimerEachAndNothingElse) {
     _session->settle();
     EXPECT_EQ(linesWith(R"("event":"timer","queue":"main","op":"arm")"), kOpenings);
     EXPECT_EQ(_lines.size(), static_cast<std::size_t>(kOpenings));
+}
+
+TEST_F(ManyOpenings, TheFooterGoesWithThePlatform) {
+    ASSERT_TRUE(_session->openPane({}));
+    _session->settle();
+    _session->appear();
+    _session->settle();
+    auto& device = _session->device();
+    ASSERT_TRUE(device.progressPublisher().publish(
+        "sync", device.daemonConnection().mobileDocumentsURL(), {.description = "Uploading"}));
+    _session->settle();
+    const std::weak_ptr<HeaderFooterView> footer = _session->footers().first();
+    ASSERT_TRUE(FooterDescription::of(*footer.lock()).syncing);
+    ASSERT_TRUE(FooterDescription::of(*footer.lock()).timerRunning);
+
+    _session->closePane();
+    _session->settle();
+    EXPECT_FALSE(footer.expired()) << "its timer and its registration hold it";
+    _session.reset();
+
+    EXPECT_TRUE(footer.expired());
 }
 
 } // namespace

@@ -122,6 +122,27 @@ TEST_F(Watch, EndsAtEachSignalWithWhichAPersonEndsAProgram) {
     }
 }
 
+TEST_F(Watch, EndsWhenNobodyReadsItAnyMore) {
+    const std::string device = makeDevice(R"("Synced at two.")");
+    WatchingProgram watching(_program, device);
+    EXPECT_EQ(watching.nextLine(), "Synced at two.");
+
+    watching.closeOutput();
+
+    EXPECT_EQ(watching.end(), 0);
+}
+
+TEST_F(Watch, AnOutputThatCannotBeWrittenIsAFailure) {
+    const std::string device = makeDevice(R"("Synced at two.")");
+
+    const auto result = _program.runOther(
+        {"/bin/sh", "-c",
+         std::string(NIMBRA_SETTINGSCTL) + " --root " + device + " list >/dev/full"});
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.messages, "settingsctl: the output cannot be written\n");
+}
+
 TEST_F(Watch, LeavesNoSocketBehind) {
     const std::string device = makeDevice(R"("Synced at two.")");
     const auto sockets = std::filesystem::path(device) / "run/nimbra/notifications";
