@@ -9,6 +9,7 @@
 namespace nimbra::device {
 namespace {
 
+using std::chrono::microseconds;
 using std::chrono::nanoseconds;
 using std::chrono::seconds;
 
@@ -53,7 +54,7 @@ TEST_F(StandingTimeTest, ItWakesWhenTheDeadlineIsReachedAndNotBefore) {
 
     time().advance(seconds(10) - nanoseconds(1));
     EXPECT_EQ(wakes(), 0);
-    time().advance(microseconds(1));
+    time().advance(nanoseconds(1));
 
     EXPECT_EQ(wakes(), 1);
 }
