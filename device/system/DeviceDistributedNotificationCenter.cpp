@@ -1,6 +1,7 @@
 #include "device/system/DeviceDistributedNotificationCenter.h"
 
 #include "device/DeviceError.h"
+#include "device/system/Backlog.h"
 #include "device/system/NotificationMessage.h"
 
 #include <array>
@@ -19,7 +20,9 @@ namespace nimbra::device {
 /// The process's socket, and the thread that waits for messages at it.
 class DeviceDistributedNotificationCenter::Receiver {
 public:
-    using Delivery = std::function<void(std::string_view message)>;
+    /// What is to be kept until the message has been told, or dropped.
+    using Delivery =
+        std::function<void(std::string_view message, const std::shared_ptr<void>& held)>;
 
     Receiver(NotificationFolder::Socket socket, Descriptor ending, Delivery deliver)
         : _socket(std::move(socket)), _ending(std::move(ending)), _deliver(std::move(deliver)),
@@ -40,16 +43,28 @@ private:
     void run() {
         // One byte more than the longest message shows that one is too long.
         std::vector<char> buffer(longestNotificationMessage + 1);
-        std::array<pollfd, 2> waited{{{.fd = _socket.number(), .events = POLLIN, .revents = 0},
-                                      {.fd = _ending.number(), .events = POLLIN, .revents = 0}}};
+        std::array<pollfd, 3> waited{
+            {{.fd = _socket.number(), .events = POLLIN, .revents = 0},
+             {.fd = _backlog->descriptor(), .events = POLLIN, .revents = 0},
+             {.fd = _ending.number(), .events = POLLIN, .revents = 0}}};
+        auto& [socket, room, ending] = waited;
         while (true) {
+            // One with a negative number is not looked at.
+            const bool isFull = _backlog->isFull() && _backlog->descriptor() >= 0;
+            socket.fd = isFull ? -1 : _socket.number();
             static_cast<void>(::poll(waited.data(), waited.size(), -1));
-            if (waited.back().revents != 0) {
+            if (ending.revents != 0) {
                 return;
+            }
+            if (room.revents != 0) {
+                _backlog->takeBack();
+            }
+            if (isFull) {
+                continue;
             }
             const auto length = ::recv(_socket.number(), buffer.data(), buffer.size(), 0);
             if (length >= 0) {
-                _deliver({buffer.data(), static_cast<std::size_t>(length)});
+                _deliver({buffer.data(), static_cast<std::size_t>(length)}, _backlog->add());
             }
         }
     }
@@ -57,6 +72,7 @@ private:
     NotificationFolder::Socket _socket;
     Descriptor _ending;
     Delivery _deliver;
+    const std::shared_ptr<Backlog> _backlog = std::make_shared<Backlog>();
     std::thread _thread;
 };
 
@@ -135,11 +151,15 @@ void DeviceDistributedNotificationCenter::startReceiver() {
                    fileError(socket->name(), "cannot be waited at", errno).description);
         return;
     }
-    _receiver = std::make_unique<Receiver>(std::move(*socket), std::move(ending),
-                                           [this](std::string_view message) { deliver(message); });
+    _receiver = std::make_unique<Receiver>(
+        std::move(*socket), std::move(ending),
+        [this](std::string_view message, const std::shared_ptr<void>& held) {
+            deliver(message, held);
+        });
 }
 
-void DeviceDistributedNotificationCenter::deliver(std::string_view message) {
+void DeviceDistributedNotificationCenter::deliver(std::string_view message,
+                                                  const std::shared_ptr<void>& held) {
     if (message.size() > longestNotificationMessage) {
         _log.write(LogLevel::error, "A notification from another process is too long");
         return;
@@ -150,7 +170,7 @@ void DeviceDistributedNotificationCenter::deliver(std::string_view message) {
                                         notification.error().description);
         return;
     }
-    _observers.postNotification(*notification);
+    _observers.postNotification(*notification, held);
 }
 
 } // namespace nimbra::device

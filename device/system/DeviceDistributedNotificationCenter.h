@@ -17,7 +17,8 @@ namespace nimbra::device {
 ///
 /// The first observation binds the process's socket and starts a thread that waits for the others'
 /// postings; where that fails, the log is told once, and the process hears only its own. What comes
-/// in and is no notification is told to the log and ignored.
+/// in and is no notification is told to the log and ignored. While the queues do not keep up, no
+/// more is taken in: the posters wait, each as long as its patience.
 class DeviceDistributedNotificationCenter final : public DistributedNotificationCenter {
 public:
     /// A poster waits no longer than `patience` for processes that do not keep up, which then miss
@@ -48,7 +49,7 @@ private:
     class Receiver;
 
     void startReceiver();
-    void deliver(std::string_view message);
+    void deliver(std::string_view message, const std::shared_ptr<void>& held);
 
     const NotificationFolder _folder;
     SystemLog& _log;

@@ -59,6 +59,11 @@ void DeviceNotificationCenter::removeAllObservers() {
 }
 
 void DeviceNotificationCenter::postNotification(const Notification& notification) {
+    postNotification(notification, nullptr);
+}
+
+void DeviceNotificationCenter::postNotification(const Notification& notification,
+                                                const std::shared_ptr<void>& held) {
     std::vector<std::shared_ptr<Registration>> matching;
     {
         const std::scoped_lock lock(_mutex);
@@ -71,7 +76,7 @@ void DeviceNotificationCenter::postNotification(const Notification& notification
             continue;
         }
         registration->observation.queue->async(
-            [weakRegistration = std::weak_ptr(registration), notification] {
+            [weakRegistration = std::weak_ptr(registration), notification, held] {
                 if (const auto alive = weakRegistration.lock()) {
                     alive->call(notification);
                 }

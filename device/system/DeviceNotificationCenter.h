@@ -17,6 +17,8 @@ public:
     /// Ends every registration there is.
     void removeAllObservers();
     void postNotification(const Notification& notification) override;
+    /// The same; `held` is let go when every block has run or been dropped.
+    void postNotification(const Notification& notification, const std::shared_ptr<void>& held);
 
 private:
     struct Registration;

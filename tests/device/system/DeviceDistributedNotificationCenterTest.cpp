@@ -1,12 +1,15 @@
 #include "device/system/DeviceDistributedNotificationCenter.h"
 
+#include "device/system/Backlog.h"
 #include "device/system/DeviceWorkQueues.h"
+#include "device/system/NotificationMessage.h"
 #include "tests/device/RecordingLog.h"
 #include "tests/device/TestFiles.h"
 #include "tests/device/Threads.h"
 #include "tests/support/PumpedQueue.h"
 #include "tests/support/TemporaryDirectory.h"
 
+#include <algorithm>
 #include <array>
 #include <atomic>
 #include <cstring>
@@ -18,6 +21,7 @@
 #include <sys/socket.h>
 #include <sys/un.h>
 #include <sys/wait.h>
+#include <thread>
 #include <unistd.h>
 #include <utility>
 #include <vector>
@@ -277,6 +281,32 @@ TEST_F(DeviceDistributedNotificationCenterTest, WhatIsNoNotificationIsLoggedAndI
     EXPECT_TRUE(lines[0].starts_with(unreadable + "notification: line 1, column ")) << lines[0];
     EXPECT_TRUE(lines[1].starts_with(unreadable)) << lines[1];
     EXPECT_EQ(lines[2], "A notification from another process is too long");
+}
+
+TEST_F(DeviceDistributedNotificationCenterTest, AFloodWaitsOutsideTheQueue) {
+    constexpr std::size_t sent = 1000;
+    const auto center = makeCenter();
+    static_cast<void>(center->addObserverForName(name(), recording("told")));
+    const std::string message = notificationMessage({.name = name()});
+    std::size_t most = 0;
+
+    std::thread flood([&] {
+        for (std::size_t count = 0; count < sent; ++count) {
+            sendRaw(message);
+        }
+    });
+    while (calls().size() < sent) {
+        // As slow as can be: one is told when there is no room for another.
+        const std::size_t waiting = queue().pendingCount();
+        most = std::max(most, waiting);
+        if (waiting >= Backlog::most || calls().size() + waiting == sent) {
+            queue().pumpOne();
+        }
+    }
+    flood.join();
+
+    EXPECT_LE(most, static_cast<std::size_t>(Backlog::most));
+    EXPECT_EQ(logged(), Calls{});
 }
 
 TEST_F(DeviceDistributedNotificationCenterTest, ALongNotificationStaysInItsProcess) {
