@@ -15,10 +15,9 @@ namespace nimbra::device {
 namespace {
 
 using Json = nlohmann::ordered_json;
-using std::chrono::nanoseconds;
 
 /// A value under the name of its type. A number is a text, as JSON has no infinite ones; a date
-/// counts nanoseconds since 1970.
+/// counts microseconds since 1970.
 struct Encoder {
     Json operator()(std::monostate /*nothing*/) const { return nullptr; }
     Json operator()(const std::shared_ptr<Account>& /*account*/) const { return nullptr; }
@@ -33,8 +32,7 @@ struct Encoder {
         return {{"text", value ? Json(value.string()) : Json(nullptr)}};
     }
     Json operator()(Date value) const {
-        return {
-            {"date", std::chrono::duration_cast<nanoseconds>(value.time_since_epoch()).count()}};
+        return {{"date", std::chrono::microseconds(value.time_since_epoch()).count()}};
     }
 };
 
@@ -71,7 +69,7 @@ UserInfoValue parseValue(const JsonReader& reader) {
         return text ? Text(*text) : Text();
     }
     if (type == "date") {
-        return Date(std::chrono::duration_cast<Date::duration>(nanoseconds(value.integer())));
+        return Date(std::chrono::microseconds(value.integer()));
     }
     reader.expected("a value of a known type");
     return {};
