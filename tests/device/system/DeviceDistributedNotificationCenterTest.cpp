@@ -3,6 +3,7 @@
 #include "device/system/Backlog.h"
 #include "device/system/DeviceWorkQueues.h"
 #include "device/system/NotificationMessage.h"
+#include "tests/device/OtherProcess.h"
 #include "tests/device/RecordingLog.h"
 #include "tests/device/TestFiles.h"
 #include "tests/device/Threads.h"
@@ -10,17 +11,14 @@
 #include "tests/support/TemporaryDirectory.h"
 
 #include <algorithm>
-#include <array>
 #include <atomic>
 #include <cstring>
-#include <functional>
 #include <future>
 #include <gtest/gtest.h>
 #include <memory>
 #include <string>
 #include <sys/socket.h>
 #include <sys/un.h>
-#include <sys/wait.h>
 #include <thread>
 #include <unistd.h>
 #include <utility>
@@ -31,41 +29,6 @@ namespace {
 
 using Calls = std::vector<std::string>;
 using Center = DeviceDistributedNotificationCenter;
-
-/// A process of its own that does something when it is told to. Made before there are threads.
-class OtherProcess {
-public:
-    explicit OtherProcess(const std::function<void()>& task) {
-        EXPECT_EQ(::pipe(_start.data()), 0);
-        _process = ::fork();
-        if (_process == 0) {
-            char byte = 0;
-            if (::read(_start.front(), &byte, 1) == 1) {
-                task();
-            }
-            // At once: nothing is tidied up, as when a process is killed.
-            ::_exit(0);
-        }
-    }
-    OtherProcess(const OtherProcess&) = delete;
-    OtherProcess& operator=(const OtherProcess&) = delete;
-    ~OtherProcess() {
-        ::close(_start.front());
-        ::close(_start.back());
-    }
-
-    /// Lets it do its task, and waits for its end.
-    void run() {
-        EXPECT_EQ(::write(_start.back(), "x", 1), 1);
-        int status = 0;
-        EXPECT_EQ(::waitpid(_process, &status, 0), _process);
-        EXPECT_EQ(status, 0);
-    }
-
-private:
-    std::array<int, 2> _start{};
-    pid_t _process = 0;
-};
 
 class DeviceDistributedNotificationCenterTest : public testing::Test {
 protected:
@@ -164,7 +127,7 @@ TEST_F(DeviceDistributedNotificationCenterTest, OwnObserversAreQueuedWhenThePost
 
 TEST_F(DeviceDistributedNotificationCenterTest, AnotherProcessHearsWhatIsPosted) {
     const Date date(std::chrono::microseconds(1'700'000'000'123'456));
-    OtherProcess poster([this, date] {
+    test::OtherProcess poster([this, date] {
         makeCenter()->postNotification(
             {.name = name(), .userInfo = {{MRSyncStatusLastSyncDateKey, date}}});
     });
@@ -202,7 +165,7 @@ TEST_F(DeviceDistributedNotificationCenterTest, TheSocketComesWithTheFirstObserv
 }
 
 TEST_F(DeviceDistributedNotificationCenterTest, ASocketWhoseProcessIsGoneIsRemoved) {
-    OtherProcess killed([this] {
+    test::OtherProcess killed([this] {
         const auto center = makeCenter();
         static_cast<void>(center->addObserverForName(name(), recording("told")));
         ::_exit(0);
