@@ -4,6 +4,7 @@
 #include "tests/device/apps/PrivateBus.h"
 
 #include <chrono>
+#include <functional>
 #include <future>
 #include <gtest/gtest.h>
 #include <string>
@@ -25,6 +26,21 @@ protected:
         return _units.askToEnd(BundleIdentifier("org.example.Notes"));
     }
     [[nodiscard]] test::PrivateBus& bus() { return _bus; }
+
+    /// Expects that who waits for a unit that ignores TERM learns of its end by `change`.
+    void expectEndBy(const std::function<void(ManagerStandIn& manager)>& change) {
+        ManagerStandIn manager;
+        manager.start(notesUnit, Manner::ignoresTerm);
+        const auto ending = askNotes();
+        ASSERT_TRUE(ending);
+
+        auto ended = std::async(std::launch::async, [&] { return ending->awaitEnd(ages); });
+        // Asked for once to find it, and once more to see that it still runs.
+        manager.awaitLists(2);
+        change(manager);
+
+        EXPECT_TRUE(ended.get());
+    }
 
 private:
     test::PrivateBus _bus;
@@ -49,30 +65,11 @@ TEST_F(SystemdUnitsTest, EveryUnitOfTheApplicationIsAskedAndNoOther) {
 }
 
 TEST_F(SystemdUnitsTest, TheEndOfAUnitIsWaitedFor) {
-    ManagerStandIn manager;
-    manager.start(notesUnit, Manner::ignoresTerm);
-    const auto ending = askNotes();
-    ASSERT_TRUE(ending);
-
-    auto ended = std::async(std::launch::async, [&] { return ending->awaitEnd(ages); });
-    // Asked for once to find it, and once more to see that it still runs.
-    manager.awaitLists(2);
-    manager.end(notesUnit);
-
-    EXPECT_TRUE(ended.get());
+    expectEndBy([](ManagerStandIn& manager) { manager.end(notesUnit); });
 }
 
 TEST_F(SystemdUnitsTest, AUnitThatFailsHasEnded) {
-    ManagerStandIn manager;
-    manager.start(notesUnit, Manner::ignoresTerm);
-    const auto ending = askNotes();
-    ASSERT_TRUE(ending);
-
-    auto ended = std::async(std::launch::async, [&] { return ending->awaitEnd(ages); });
-    manager.awaitLists(2);
-    manager.fail(notesUnit);
-
-    EXPECT_TRUE(ended.get());
+    expectEndBy([](ManagerStandIn& manager) { manager.fail(notesUnit); });
 }
 
 TEST_F(SystemdUnitsTest, AUnitThatDoesNotListenIsKilled) {
