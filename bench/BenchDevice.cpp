@@ -2,6 +2,8 @@
 
 #include "bench/MemoryServices.h"
 #include "device/DeviceDirectory.h"
+#include "device/bundles/DeviceBundle.h"
+#include "device/bundles/DeviceBundles.h"
 #include "platform/accounts/Dataclass.h"
 #include "platform/privacy/PrivacyConsentStore.h"
 #include "platform/system/ClassRegistry.h"
@@ -50,6 +52,10 @@ void BenchDevice::reopen() {
     _platform = valueOf(device::DevicePlatform::open(root(), _loop));
 }
 
+void BenchDevice::loadBundle() {
+    static_cast<void>(valueOf(_platform->bundles().load(builtBundle())));
+}
+
 PlatformServices BenchDevice::servicesWith(Bundles& bundles) {
     PlatformServices services = this->services();
     services.bundles = bundles;
@@ -70,7 +76,7 @@ std::size_t BenchDevice::rowsOf(SettingsListController& pane) {
         Specifier::preferenceSpecifierNamed("Nimbra Drive", {.cell = CellType::LinkListCell});
     entry->setUserInfo({{FirstSetupKey, false}, {AccountIdentifierKey, Text("primary")}});
     pane.setSpecifier(entry);
-    pane.viewDidLoad();
+    pane.loadViewIfNeeded();
     return pane.specifiers().size();
 }
 

@@ -6,6 +6,7 @@
 #include "host/core/scenario/TemporaryDirectory.h"
 #include "platform/host/Presenter.h"
 #include "platform/host/SettingsListController.h"
+#include "platform/views/ViewAnimations.h"
 
 #include <cstddef>
 #include <filesystem>
@@ -30,10 +31,13 @@ public:
 
     [[nodiscard]] device::DevicePlatform& platform() { return *_platform; }
     [[nodiscard]] PlatformServices services() {
-        return _platform->servicesFor(*this, _viewMetrics);
+        return _platform->servicesFor({*this, _viewMetrics, _viewAnimations});
     }
     /// The same, but with other bundles, which are not owned.
     [[nodiscard]] PlatformServices servicesWith(Bundles& bundles);
+
+    /// Loads the bundle as it was built, so that its texts and images are found.
+    void loadBundle();
 
     /// Runs what is queued on the main queue, and what that queues in turn.
     void runMainQueue() {
@@ -63,11 +67,17 @@ private:
     void reloadParentSpecifier() override {}
     void reloadAllParentSpecifiers() override {}
     void dismissPresentedController(bool /*animated*/) override {}
-    void dismissPane(bool /*animated*/) override {}
+    void presentController(const std::shared_ptr<SetupController>& /*controller*/,
+                           bool /*animated*/) override {}
+    void dismissController(const ViewController& /*controller*/, bool /*animated*/) override {}
+    void presentAlert(const std::shared_ptr<AlertController>& /*alert*/,
+                      bool /*animated*/) override {}
+    void showAccountAlert(const std::shared_ptr<AccountAlertView>& /*alert*/) override {}
 
     host::TemporaryDirectory _directory;
     host::HostLoop _loop;
     host::FixedViewMetrics _viewMetrics;
+    ViewAnimations _viewAnimations;
     std::unique_ptr<device::DevicePlatform> _platform;
 };
 

@@ -20,7 +20,6 @@ struct LaterPart {
 };
 
 constexpr std::array laterParts{
-    LaterPart{"deviceList", checkDeviceList},
     LaterPart{"databaseSettings", checkDatabaseSettings},
     LaterPart{"tool", checkTool},
 };
@@ -34,7 +33,8 @@ constexpr std::array parts{
     Part{"preferences", readPreferences}, Part{"restrictions", readRestrictions},
     Part{"accounts", readAccounts},       Part{"apps", readApplications},
     Part{"consent", readConsent},         Part{"documents", readDocuments},
-    Part{"strings", readStrings},         Part{"faults", readFaults},
+    Part{"deviceList", readDeviceList},   Part{"strings", readStrings},
+    Part{"faults", readFaults},
 };
 
 } // namespace

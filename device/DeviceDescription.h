@@ -55,6 +55,17 @@ struct DeviceDescription {
         bool isPublic = false;
         bool registrationFails = false;
     };
+    /// What an account's service says of the account's devices when it is asked.
+    struct DeviceList {
+        enum class Outcome : std::uint8_t { answers, fails, neverAnswers };
+
+        /// As their users call them, in the order of the answer.
+        std::vector<std::string> incompatible;
+        std::vector<std::string> needUpgrade;
+        Outcome outcome = Outcome::answers;
+        /// How long the service takes, in seconds.
+        double delay = 0;
+    };
 
     std::string name = "Nimbra Phone";
     std::string idiom = "phone";
@@ -78,6 +89,7 @@ struct DeviceDescription {
     nlohmann::json lastSyncText;
     /// Whether nobody has given the sentence: the device composes it from the date.
     bool composesLastSyncText = false;
+    DeviceList deviceList;
     /// The table "Localizable" instead of the bundle's own.
     std::optional<std::map<std::string, std::string>> strings;
     bool paneBundleRegistered = true;

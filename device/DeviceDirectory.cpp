@@ -146,7 +146,8 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
             return std::unexpected(fileError(root, "cannot be made", failure.value()));
         }
     }
-    for (const DescriptionFile* file : {&deviceFile, &restrictionsFile, &documentsFile}) {
+    for (const DescriptionFile* file :
+         {&deviceFile, &restrictionsFile, &documentsFile, &deviceListFile}) {
         if (auto written = writeDescriptionFile(paths, *file, description); !written) {
             return written;
         }
@@ -209,6 +210,9 @@ std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& ro
     }
     if (changed && isGiven("documents")) {
         changed = writeDescriptionFile(paths, documentsFile, description);
+    }
+    if (changed && isGiven("deviceList")) {
+        changed = writeDescriptionFile(paths, deviceListFile, description);
     }
     if (changed && isGiven("preferences")) {
         changed = replacePreferences(paths, description);

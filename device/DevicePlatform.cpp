@@ -1,6 +1,7 @@
 #include "device/DevicePlatform.h"
 
 #include "device/DeviceError.h"
+#include "device/accounts/DeviceListService.h"
 #include "device/apps/ApplicationFolders.h"
 #include "device/apps/DeviceAppTerminator.h"
 #include "device/apps/DeviceApplications.h"
@@ -72,8 +73,9 @@ struct DevicePlatform::Parts {
           workQueues(mainQueue, std::move(timeSource)), clock(workQueues.timeSource()),
           distributedNotificationCenter(paths, systemLog),
           accountStore(std::move(databases.accounts), workQueues, systemLog),
-          bundles(settings, classes), localization(settings, systemLog), abilities(settings),
-          restrictions(paths, systemLog),
+          deviceListRequests(DeviceListFile(paths, systemLog), workQueues),
+          bundles(settings, classes, systemLog), localization(settings, systemLog),
+          abilities(settings), restrictions(paths, systemLog),
           privacyConsentStore(std::move(databases.consentPath), std::move(databases.consent),
                               systemLog),
           applications(paths, applicationFolders(paths, processEnvironment), settings, systemLog),
@@ -95,6 +97,7 @@ struct DevicePlatform::Parts {
     DeviceClock clock;
     DeviceDistributedNotificationCenter distributedNotificationCenter;
     DeviceAccountStore accountStore;
+    DeviceListService deviceListRequests;
     ClassRegistry classes;
     DeviceBundles bundles;
     DeviceLocalization localization;
@@ -171,10 +174,11 @@ DevicePlatform::~DevicePlatform() {
 void DevicePlatform::stopListening() {
     _parts->progressFolder.finish();
     _parts->distributedNotificationCenter.finish();
+    _parts->deviceListRequests.finish();
 }
 
-PlatformServices DevicePlatform::servicesFor(Presenter& presenter, ViewMetrics& viewMetrics) {
-    return {.presenter = presenter,
+PlatformServices DevicePlatform::servicesFor(const HostServices& host) {
+    return {.presenter = host.presenter,
             .accountStore = _parts->accountStore,
             .documentContainers = _parts->documentContainers,
             .notificationCenter = _parts->notificationCenter,
@@ -193,7 +197,9 @@ PlatformServices DevicePlatform::servicesFor(Presenter& presenter, ViewMetrics& 
             .progressReports = _parts->progressReports,
             .lastSync = _parts->lastSync,
             .clock = _parts->clock,
-            .viewMetrics = viewMetrics};
+            .viewMetrics = host.viewMetrics,
+            .viewAnimations = host.viewAnimations,
+            .deviceListRequests = _parts->deviceListRequests};
 }
 
 DeviceAccountStore& DevicePlatform::accountStore() {

@@ -40,18 +40,24 @@ public:
 
     DevicePlatform(const DevicePlatform&) = delete;
     DevicePlatform& operator=(const DevicePlatform&) = delete;
-    /// Ends the progress that is followed, the distributed notifications and the timers, lets their
-    /// handlers go, waits for the background work under way, then ends the platform's threads.
+    /// Ends the progress that is followed, the distributed notifications, the requests that wait
+    /// for an answer and the timers, lets their handlers go, waits for the background work under
+    /// way, then ends the platform's threads.
     /// Every controller made over the services has gone before, but for what those handlers hold.
     ~DevicePlatform();
 
-    /// The services for one pane, which talks to its host through `presenter` and measures what it
-    /// shows with `viewMetrics`. Both belong to the host, are called on the main queue only and
-    /// outlive the pane, as the platform does.
-    [[nodiscard]] PlatformServices servicesFor(Presenter& presenter, ViewMetrics& viewMetrics);
+    /// What a host gives a pane beside the device's own services. All belong to the host, are
+    /// called on the main queue only and outlive the pane, as the platform does.
+    struct HostServices {
+        Presenter& presenter;
+        ViewMetrics& viewMetrics;
+        ViewAnimations& viewAnimations;
+    };
+    /// The services for one pane.
+    [[nodiscard]] PlatformServices servicesFor(const HostServices& host);
 
-    /// From here on nothing comes from other processes: no progress and no notification. What has
-    /// come and has not been told yet is dropped.
+    /// From here on nothing comes from elsewhere: no progress, no notification, and no answer of an
+    /// account's service. What has come and has not been told yet is dropped.
     void stopListening();
 
     // What a host needs of the device beyond what a pane may ask.

@@ -44,7 +44,7 @@ void RSPNimbraDriveViewController::viewDidLoad() {
     navigationItem().setRightBarButtonItem(std::nullopt);
 
     const auto refreshControl = std::make_shared<RefreshControl>();
-    table().setRefreshControl(refreshControl);
+    table()->setRefreshControl(refreshControl);
     refreshControl->addTargetActionForControlEvents(
         weak_from_this(),
         [this](const std::shared_ptr<RefreshControl>& sender) { _refresh(sender); },

@@ -11,6 +11,7 @@ class Bundles;
 class Clock;
 class DaemonConnection;
 class DeviceInfo;
+class DeviceListRequests;
 class DistributedNotificationCenter;
 class DocumentContainers;
 class FileManager;
@@ -22,6 +23,7 @@ class PrivacyConsentStore;
 class ProgressReports;
 class RestrictionsProfile;
 class SystemLog;
+class ViewAnimations;
 class ViewMetrics;
 class WorkQueues;
 
@@ -49,6 +51,8 @@ struct PlatformServices {
     ServiceReference<LastSync> lastSync;
     ServiceReference<Clock> clock;
     ServiceReference<ViewMetrics> viewMetrics;
+    ServiceReference<ViewAnimations> viewAnimations;
+    ServiceReference<DeviceListRequests> deviceListRequests;
 };
 
 } // namespace nimbra

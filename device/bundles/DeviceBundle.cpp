@@ -28,6 +28,10 @@ Text DeviceBundle::localizedStringForKeyValueTable(const Text& key, const Text& 
     return value;
 }
 
+std::shared_ptr<const Image> DeviceBundle::imageNamed(const Text& name) const {
+    return _parts.images.imageNamed(name.string());
+}
+
 void DeviceBundle::replaceTable(const std::string& table,
                                 std::map<std::string, std::string> texts) {
     StringTable replacement;

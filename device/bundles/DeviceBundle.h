@@ -1,5 +1,6 @@
 #pragma once
 
+#include "device/bundles/BundleImages.h"
 #include "device/bundles/StringTables.h"
 #include "platform/system/Bundle.h"
 
@@ -26,6 +27,7 @@ public:
         /// The language whose tables have every key.
         std::string developmentLanguage;
         LanguageTables tables;
+        BundleImages images;
         const ControllerClass* principalClass;
         const DeviceSettings* settings;
     };
@@ -35,6 +37,7 @@ public:
     [[nodiscard]] const std::optional<BundleIdentifier>& identifier() const override;
     [[nodiscard]] Text localizedStringForKeyValueTable(const Text& key, const Text& value,
                                                        const Text& table) const override;
+    [[nodiscard]] std::shared_ptr<const Image> imageNamed(const Text& name) const override;
 
     /// The class that the manifest names as the bundle's first; owned by the class registry.
     [[nodiscard]] const ControllerClass& principalClass() const;

@@ -1,6 +1,7 @@
 #include "device/bundles/DeviceBundles.h"
 
 #include "device/DeviceError.h"
+#include "device/bundles/BundleImages.h"
 #include "device/bundles/DeviceBundle.h"
 #include "device/bundles/Manifest.h"
 #include "device/bundles/StringTables.h"
@@ -29,7 +30,9 @@ std::expected<BundleEntryPoint*, Error> entryPoint(const std::filesystem::path& 
         return std::unexpected(fileError(path, "the bundle's shared object cannot be loaded",
                                          failure ? failure.value() : ENOENT));
     }
-    void* const object = ::dlopen(path.c_str(), RTLD_NOW | RTLD_LOCAL);
+    // The linker keeps the path as it is given, for whoever asks later where a class comes from.
+    void* const object =
+        ::dlopen(std::filesystem::absolute(path, failure).c_str(), RTLD_NOW | RTLD_LOCAL);
     if (object == nullptr) {
         return std::unexpected(deviceError(
             path.string() + ": the bundle's shared object cannot be loaded: " + linkerError()));
@@ -46,8 +49,8 @@ std::expected<BundleEntryPoint*, Error> entryPoint(const std::filesystem::path& 
 
 } // namespace
 
-DeviceBundles::DeviceBundles(const DeviceSettings& settings, ClassRegistry& classes)
-    : _settings(settings), _classes(classes) {}
+DeviceBundles::DeviceBundles(const DeviceSettings& settings, ClassRegistry& classes, SystemLog& log)
+    : _settings(settings), _classes(classes), _log(log) {}
 
 DeviceBundles::~DeviceBundles() = default;
 
@@ -61,6 +64,19 @@ DeviceBundles::bundleWithIdentifier(const BundleIdentifier& identifier) const {
         return bundle.second->identifier() == identifier;
     });
     return entry != _bundles.end() ? entry->second : nullptr;
+}
+
+std::shared_ptr<Bundle> DeviceBundles::bundleForClass(const std::type_info& classType) const {
+    Dl_info object{};
+    if (::dladdr(&classType, &object) == 0 || object.dli_fname == nullptr) {
+        return nullptr;
+    }
+    std::error_code failure;
+    const std::filesystem::path folder =
+        std::filesystem::canonical(std::filesystem::path(object.dli_fname).parent_path(), failure);
+    const std::scoped_lock lock(_mutex);
+    const auto loaded = failure ? _bundles.end() : _bundles.find(folder);
+    return loaded != _bundles.end() ? loaded->second : nullptr;
 }
 
 std::expected<std::shared_ptr<DeviceBundle>, Error>
@@ -96,6 +112,7 @@ DeviceBundles::load(const std::filesystem::path& path) {
         DeviceBundle::Parts{.identifier = std::move(manifest->identifier),
                             .developmentLanguage = std::move(manifest->developmentLanguage),
                             .tables = std::move(*tables),
+                            .images = BundleImages::read(path, _log),
                             .principalClass = *principalClass,
                             .settings = &_settings});
     const std::scoped_lock lock(_mutex);

@@ -13,6 +13,7 @@
 
 namespace nimbra {
 class ClassRegistry;
+class SystemLog;
 struct ControllerClass;
 } // namespace nimbra
 
@@ -25,16 +26,20 @@ class DeviceSettings;
 class DeviceBundles final : public Bundles {
 public:
     /// Texts are looked up in the language of `settings`; bundles register their classes with
-    /// `classes`. Neither is owned; both outlive the bundles.
-    DeviceBundles(const DeviceSettings& settings, ClassRegistry& classes);
+    /// `classes`; `log` is told of images that cannot be read. None is owned; all outlive the
+    /// bundles.
+    DeviceBundles(const DeviceSettings& settings, ClassRegistry& classes, SystemLog& log);
     ~DeviceBundles() override;
 
     [[nodiscard]] std::shared_ptr<Bundle>
     bundleWithIdentifier(const BundleIdentifier& identifier) const override;
+    /// Whether the bundle is findable makes no difference here.
+    [[nodiscard]] std::shared_ptr<Bundle>
+    bundleForClass(const std::type_info& classType) const override;
 
-    /// Loads the bundle in the folder `path`: its manifest, its string tables, its shared object
-    /// with dlopen, which stays loaded for the life of the process, and registers its classes. An
-    /// error names the file and what was expected of it.
+    /// Loads the bundle in the folder `path`: its manifest, its string tables, the sizes of its
+    /// images, its shared object with dlopen, which stays loaded for the life of the process, and
+    /// registers its classes. An error names the file and what was expected of it.
     /// A folder that is loaded already gives the bundle that was made of it.
     [[nodiscard]] std::expected<std::shared_ptr<DeviceBundle>, Error>
     load(const std::filesystem::path& path);
@@ -49,6 +54,7 @@ private:
 
     const DeviceSettings& _settings;
     ClassRegistry& _classes;
+    SystemLog& _log;
     mutable std::mutex _mutex;
     /// By the folder's path without links.
     std::map<std::filesystem::path, std::shared_ptr<DeviceBundle>> _bundles;

@@ -1,10 +1,13 @@
 #include "device/description/DescriptionFiles.h"
 
 #include "device/description/DescriptionParts.h"
+#include "device/description/DescriptionValues.h"
 #include "device/description/MachineFacts.h"
 #include "device/files/Files.h"
 #include "device/json/JsonReader.h"
 
+#include <algorithm>
+#include <array>
 #include <filesystem>
 #include <system_error>
 
@@ -13,6 +16,15 @@ namespace nimbra::device {
 namespace {
 
 using Json = nlohmann::ordered_json;
+using DeviceList = DeviceDescription::DeviceList;
+
+struct NamedOutcome {
+    std::string_view name;
+    DeviceList::Outcome outcome;
+};
+constexpr std::array outcomes{NamedOutcome{"answers", DeviceList::Outcome::answers},
+                              NamedOutcome{"fails", DeviceList::Outcome::fails},
+                              NamedOutcome{"never answers", DeviceList::Outcome::neverAnswers}};
 
 void readDevice(const JsonReader& reader, DeviceDescription& description) {
     reader.allowOnly({"name", "idiom", "screen", "locale", "timeZone", "abilities"});
@@ -20,6 +32,26 @@ void readDevice(const JsonReader& reader, DeviceDescription& description) {
     const JsonReader abilities = reader.member("abilities");
     abilities.allowOnly({"cellularData", "wirelessVariant"});
     readAbilities(abilities, description);
+}
+
+DeviceList::Outcome readOutcome(const JsonReader& reader) {
+    const std::string name =
+        readOneOf(reader, {outcomes[0].name, outcomes[1].name, outcomes[2].name});
+    const auto* const named = std::ranges::find(outcomes, name, &NamedOutcome::name);
+    return named != outcomes.end() ? named->outcome : DeviceList::Outcome::answers;
+}
+
+void readDeviceListFile(const JsonReader& reader, DeviceDescription& description) {
+    reader.allowOnly({"incompatible", "needUpgrade", "outcome", "delay"});
+    readDeviceNames(reader, description);
+    if (const JsonReader outcome = reader.member("outcome"); !outcome.isAbsent()) {
+        description.deviceList.outcome = readOutcome(outcome);
+    }
+    const JsonReader delay = reader.member("delay");
+    description.deviceList.delay = delay.number();
+    if (description.deviceList.delay < 0) {
+        delay.expected("a number of seconds, 0 or above");
+    }
 }
 
 Json orNull(const std::optional<std::string>& text) {
@@ -64,11 +96,21 @@ Json documentsContent(const DeviceDescription& description) {
     return content;
 }
 
+Json deviceListContent(const DeviceDescription& description) {
+    const DeviceList& list = description.deviceList;
+    const auto* const named = std::ranges::find(outcomes, list.outcome, &NamedOutcome::outcome);
+    return Json{{"incompatible", list.incompatible},
+                {"needUpgrade", list.needUpgrade},
+                {"outcome", named->name},
+                {"delay", list.delay}};
+}
+
 } // namespace
 
 const DescriptionFile deviceFile{kDeviceFile, readDevice, deviceContent};
 const DescriptionFile restrictionsFile{kRestrictionsFile, readRestrictions, restrictionsContent};
 const DescriptionFile documentsFile{kDocumentsFile, readDocuments, documentsContent};
+const DescriptionFile deviceListFile{kDeviceListFile, readDeviceListFile, deviceListContent};
 
 std::expected<DeviceDescription, Error> readDescriptionFile(const DevicePaths& paths,
                                                             const DescriptionFile& file) {

@@ -26,6 +26,7 @@ struct DescriptionFile {
 extern const DescriptionFile deviceFile;
 extern const DescriptionFile restrictionsFile;
 extern const DescriptionFile documentsFile;
+extern const DescriptionFile deviceListFile;
 
 /// A description whose part in `file` is as the file says and whose other parts are the default.
 /// On a real device a file may be missing: what Linux tells of the machine then stands for it.

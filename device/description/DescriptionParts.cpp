@@ -180,6 +180,21 @@ void readDocuments(const JsonReader& reader, DeviceDescription& description) {
     description.composesLastSyncText = sentence.isAbsent();
 }
 
+void readDeviceList(const JsonReader& reader, DeviceDescription& description) {
+    using Outcome = DeviceDescription::DeviceList::Outcome;
+    description.deviceList = {};
+    if (reader.isNull()) {
+        description.deviceList.outcome = Outcome::fails;
+    } else if (reader.isString() && reader.string() == "never") {
+        description.deviceList.outcome = Outcome::neverAnswers;
+    } else if (!reader.isObject()) {
+        reader.expected("an object, null or \"never\"");
+    } else {
+        reader.allowOnly({"incompatible", "needUpgrade"});
+        readDeviceNames(reader, description);
+    }
+}
+
 void readStrings(const JsonReader& reader, DeviceDescription& description) {
     description.strings.emplace();
     for (const std::string& key : reader.keys()) {
@@ -198,6 +213,11 @@ void readFaults(const JsonReader& reader, DeviceDescription& description) {
     for (const JsonReader& outcome : reader.member("consentSet").elements()) {
         description.consentSetFaults.push_back(readRefusal(outcome));
     }
+}
+
+void readDeviceNames(const JsonReader& reader, DeviceDescription& description) {
+    description.deviceList.incompatible = readTexts(reader.member("incompatible"));
+    description.deviceList.needUpgrade = readTexts(reader.member("needUpgrade"));
 }
 
 void readDeviceFacts(const JsonReader& reader, DeviceDescription& description) {

@@ -16,9 +16,12 @@ void readAccounts(const JsonReader& reader, DeviceDescription& description);
 void readApplications(const JsonReader& reader, DeviceDescription& description);
 void readConsent(const JsonReader& reader, DeviceDescription& description);
 void readDocuments(const JsonReader& reader, DeviceDescription& description);
+void readDeviceList(const JsonReader& reader, DeviceDescription& description);
 void readStrings(const JsonReader& reader, DeviceDescription& description);
 void readFaults(const JsonReader& reader, DeviceDescription& description);
 
+/// The members `incompatible` and `needUpgrade` of the object at `reader`.
+void readDeviceNames(const JsonReader& reader, DeviceDescription& description);
 /// The members `name`, `idiom`, `screen`, `locale` and `timeZone` of the object at `reader`.
 void readDeviceFacts(const JsonReader& reader, DeviceDescription& description);
 /// The members `cellularData` and `wirelessVariant` of the object at `reader`.

@@ -104,6 +104,14 @@ std::set<std::string> readNames(const JsonReader& reader) {
     return names;
 }
 
+std::vector<std::string> readTexts(const JsonReader& reader) {
+    std::vector<std::string> texts;
+    for (const JsonReader& element : reader.elements()) {
+        texts.push_back(element.string());
+    }
+    return texts;
+}
+
 Date readInstant(const JsonReader& reader, Date fallback) {
     if (reader.isAbsent()) {
         return fallback;

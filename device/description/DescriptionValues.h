@@ -9,6 +9,7 @@
 #include <set>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace nimbra::device {
 
@@ -31,6 +32,8 @@ namespace nimbra::device {
 [[nodiscard]] std::set<std::string> readDataclasses(const JsonReader& reader);
 /// An array of strings that are not empty.
 [[nodiscard]] std::set<std::string> readNames(const JsonReader& reader);
+/// An array of any strings, in order.
+[[nodiscard]] std::vector<std::string> readTexts(const JsonReader& reader);
 /// An instant as RFC 3339 writes it.
 [[nodiscard]] Date readInstant(const JsonReader& reader, Date fallback);
 

@@ -10,10 +10,6 @@ namespace nimbra::device {
 
 namespace {
 
-void checkString(const JsonReader& reader) {
-    static_cast<void>(reader.string());
-}
-
 void checkBoolean(const JsonReader& reader) {
     static_cast<void>(reader.boolean());
 }
@@ -42,22 +38,6 @@ constexpr int highestSignal = 64;
 constexpr int highestErrno = 4095;
 
 } // namespace
-
-void checkDeviceList(const JsonReader& reader) {
-    if (reader.isNull() || (reader.isString() && reader.string() == "never")) {
-        return;
-    }
-    if (!reader.isObject()) {
-        reader.expected("an object, null or \"never\"");
-        return;
-    }
-    reader.allowOnly({"incompatible", "needUpgrade"});
-    for (const char* const key : {"incompatible", "needUpgrade"}) {
-        for (const JsonReader& name : reader.member(key).elements()) {
-            checkString(name);
-        }
-    }
-}
 
 void checkDatabaseSettings(const JsonReader& reader) {
     if (reader.isNull()) {

@@ -16,6 +16,7 @@ inline constexpr std::string_view kConsentDatabase = "/var/lib/nimbra/consent.db
 inline constexpr std::string_view kDeviceFile = "/var/lib/nimbra/device.json";
 inline constexpr std::string_view kRestrictionsFile = "/var/lib/nimbra/restrictions.json";
 inline constexpr std::string_view kDocumentsFile = "/var/lib/nimbra/documents.json";
+inline constexpr std::string_view kDeviceListFile = "/var/lib/nimbra/device-list.json";
 inline constexpr std::string_view kPreferencesDirectory = "/var/lib/nimbra/preferences";
 inline constexpr std::string_view kRunningApplicationsDirectory = "/run/nimbra";
 inline constexpr std::string_view kPriorityHintsDirectory = "/run/nimbra/priority-hints";

@@ -36,6 +36,7 @@ constexpr auto selectAccount =
     "SELECT uses_stratafile, dataclass, enabled, cellular FROM accounts "
     "LEFT JOIN account_dataclasses ON account = identifier WHERE identifier = ?";
 constexpr auto countAccount = "SELECT count(*) FROM accounts WHERE identifier = ?";
+constexpr auto writeUsesStratafile = "UPDATE accounts SET uses_stratafile = ? WHERE identifier = ?";
 constexpr auto writeEnabled =
     "INSERT INTO account_dataclasses (account, dataclass, enabled, provisioned, cellular) "
     "VALUES (?, ?, ?, 0, 0) "
@@ -122,6 +123,10 @@ std::expected<void, Error> AccountDatabase::writeChanges(const AccountIdentifier
                                                          const AccountChanges& changes) {
     return _database->transaction([this, &identifier, &changes]() -> std::expected<void, Error> {
         auto written = requireAccount(identifier);
+        if (written && changes.usesStratafile) {
+            written = _database->execute(
+                writeUsesStratafile, {std::int64_t{*changes.usesStratafile}, identifier.string()});
+        }
         if (written) {
             written = writeFlags(writeEnabled, identifier, changes.enabled);
         }

@@ -4,6 +4,7 @@
 #include "platform/values/Identifier.h"
 
 #include <map>
+#include <optional>
 #include <set>
 
 namespace nimbra::device {
@@ -19,6 +20,7 @@ struct AccountRecord {
 /// What was changed on an account: only this is written, so that two programs that change the same
 /// account do not take back each other's changes.
 struct AccountChanges {
+    std::optional<bool> usesStratafile;
     std::map<Dataclass, bool> enabled;
     std::map<Dataclass, bool> cellular;
 

@@ -2,13 +2,14 @@
 
 #include "platform/system/Bundle.h"
 
+#include <memory>
 #include <optional>
 #include <utility>
 
 namespace nimbra::device {
 
 /// An application as a consent record names it: by its identifier, if at all. What belongs to the
-/// application beyond that, string tables included, stands elsewhere. Any thread.
+/// application beyond that, string tables and images included, stands elsewhere. Any thread.
 class ConsentBundle final : public Bundle {
 public:
     explicit ConsentBundle(std::optional<BundleIdentifier> identifier)
@@ -20,6 +21,9 @@ public:
     [[nodiscard]] Text localizedStringForKeyValueTable(const Text& /*key*/, const Text& value,
                                                        const Text& /*table*/) const override {
         return value;
+    }
+    [[nodiscard]] std::shared_ptr<const Image> imageNamed(const Text& /*name*/) const override {
+        return nullptr;
     }
 
 private:

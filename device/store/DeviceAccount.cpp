@@ -51,7 +51,12 @@ void DeviceAccount::setEnabledForDataclass(bool enabled, const Dataclass& datacl
 
 bool DeviceAccount::vt_isUsingStratafile() const {
     const std::scoped_lock lock(_mutex);
-    return _record.usesStratafile;
+    return _changes.usesStratafile.value_or(_record.usesStratafile);
+}
+
+void DeviceAccount::vt_setUsesStratafile(bool usesStratafile) {
+    const std::scoped_lock lock(_mutex);
+    _changes.usesStratafile = usesStratafile;
 }
 
 bool DeviceAccount::vt_useCellularForDataclass(const Dataclass& dataclass) const {
@@ -81,6 +86,12 @@ AccountChanges DeviceAccount::changes() const {
 
 void DeviceAccount::didSave(const AccountChanges& saved) {
     const std::scoped_lock lock(_mutex);
+    if (saved.usesStratafile) {
+        _record.usesStratafile = *saved.usesStratafile;
+        if (_changes.usesStratafile == saved.usesStratafile) {
+            _changes.usesStratafile.reset();
+        }
+    }
     takeOver(saved.enabled, _record.enabled, _changes.enabled);
     takeOver(saved.cellular, _record.cellular, _changes.cellular);
 }

@@ -19,6 +19,7 @@ public:
     [[nodiscard]] bool isEnabledForDataclass(const Dataclass& dataclass) const override;
     void setEnabledForDataclass(bool enabled, const Dataclass& dataclass) override;
     [[nodiscard]] bool vt_isUsingStratafile() const override;
+    void vt_setUsesStratafile(bool usesStratafile) override;
     [[nodiscard]] bool vt_useCellularForDataclass(const Dataclass& dataclass) const override;
     void vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) override;
     void reload() override;

@@ -31,6 +31,10 @@ void DeviceAccountStore::saveVerifiedAccountWithCompletionHandler(
         [this, account, completion = std::move(completion)] { completion(save(account)); });
 }
 
+void DeviceAccountStore::saveAccount(const std::shared_ptr<Account>& account, SaveOptions options) {
+    saveVerifiedAccountWithCompletionHandler(account, std::move(options.completion));
+}
+
 std::shared_ptr<AccountOperationsHelper> DeviceAccountStore::operationsHelperWithDelegate(
     std::weak_ptr<AccountOperationsHelperDelegate> delegate) {
     return std::make_shared<DeviceAccountOperationsHelper>(
@@ -61,8 +65,9 @@ std::expected<void, Error> DeviceAccountStore::save(const std::shared_ptr<Accoun
     }
     auto written = write(account);
     if (!written) {
-        _log.write(LogLevel::error, "Can't save account " + account->identifier().string() + ": " +
-                                        written.error().description);
+        const std::string name = account ? ' ' + account->identifier().string() : std::string();
+        _log.write(LogLevel::error,
+                   "Can't save account" + name + ": " + written.error().description);
     }
     return written;
 }
@@ -89,6 +94,9 @@ Error DeviceAccountStore::asTheDeviceSaysIt(Error error) const {
 }
 
 std::expected<void, Error> DeviceAccountStore::write(const std::shared_ptr<Account>& account) {
+    if (!account) {
+        return std::unexpected(deviceError("there is no account to be saved"));
+    }
     const auto own = std::dynamic_pointer_cast<DeviceAccount>(account);
     if (!own) {
         return std::unexpected(deviceError("the account is not of this store"));

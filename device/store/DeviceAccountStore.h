@@ -32,6 +32,8 @@ public:
     accountWithIdentifier(const AccountIdentifier& identifier) override;
     void saveVerifiedAccountWithCompletionHandler(const std::shared_ptr<Account>& account,
                                                   SaveCompletion completion) override;
+    /// A device has no service of its own to ask: an account counts as verified either way.
+    void saveAccount(const std::shared_ptr<Account>& account, SaveOptions options) override;
     [[nodiscard]] std::shared_ptr<AccountOperationsHelper>
     operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) override;
 
@@ -42,9 +44,9 @@ public:
     /// be read, which is logged.
     [[nodiscard]] std::optional<AccountRecord> record(const AccountIdentifier& identifier);
 
-    /// Writes the changes of `account` in one transaction. Waits for the disk, and for another
-    /// program that is writing. An error, which calls the database by its path on the device, has
-    /// been logged, unless it was planned.
+    /// Writes the changes of `account` in one transaction; null is an error. Waits for the disk,
+    /// and for another program that is writing. An error, which calls the database by its path on
+    /// the device, has been logged, unless it was planned.
     [[nodiscard]] std::expected<void, Error> save(const std::shared_ptr<Account>& account);
 
     /// The outcomes of the next saves, used up one a save, in their order: an error is how that

@@ -15,4 +15,12 @@ Text DeviceAbilities::VariantStringKeyForKey(const Text& key) const {
     return variant ? Text(key.string() + '_' + *variant) : key;
 }
 
+UserInterfaceIdiom DeviceAbilities::userInterfaceIdiom() const {
+    return _settings.userInterfaceIdiom();
+}
+
+std::optional<Screen> DeviceAbilities::mainScreen() const {
+    return _settings.mainScreen();
+}
+
 } // namespace nimbra::device

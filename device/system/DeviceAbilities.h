@@ -14,6 +14,8 @@ public:
 
     [[nodiscard]] bool boolAnswerForQuestion(const Text& question) const override;
     [[nodiscard]] Text VariantStringKeyForKey(const Text& key) const override;
+    [[nodiscard]] UserInterfaceIdiom userInterfaceIdiom() const override;
+    [[nodiscard]] std::optional<Screen> mainScreen() const override;
 
 private:
     const DeviceSettings& _settings;

@@ -17,6 +17,8 @@ struct DeviceSettings::State {
     std::string timeZone;
     bool hasCellularData = false;
     std::optional<std::string> wirelessVariant;
+    UserInterfaceIdiom idiom = UserInterfaceIdiom::phone;
+    std::optional<Screen> screen;
     std::optional<std::string> overridingLocale;
     std::atomic<std::uint64_t> localeRevision = 1;
 };
@@ -55,6 +57,16 @@ std::optional<std::string> DeviceSettings::wirelessVariant() const {
     return _state->wirelessVariant;
 }
 
+UserInterfaceIdiom DeviceSettings::userInterfaceIdiom() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->idiom;
+}
+
+std::optional<Screen> DeviceSettings::mainScreen() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->screen;
+}
+
 void DeviceSettings::overrideLocale(const std::string& identifier) {
     const std::scoped_lock lock(_state->mutex);
     _state->overridingLocale = identifier;
@@ -72,6 +84,13 @@ std::expected<void, Error> DeviceSettings::reload() {
     _state->timeZone = std::move(description->timeZone);
     _state->hasCellularData = description->cellularData;
     _state->wirelessVariant = std::move(description->wirelessVariant);
+    _state->idiom =
+        description->idiom == "pad" ? UserInterfaceIdiom::pad : UserInterfaceIdiom::phone;
+    _state->screen.reset();
+    if (const auto& screen = description->screen) {
+        _state->screen = {.bounds = {.origin = {}, .size = {screen->width, screen->height}},
+                          .scale = screen->scale};
+    }
     return {};
 }
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "platform/system/DeviceInfo.h"
 #include "platform/values/Error.h"
 
 #include <cstdint>
@@ -11,8 +12,8 @@
 
 namespace nimbra::device {
 
-/// What `device.json` says of the device: its language, its time zone and its abilities. Copies are
-/// the same settings. Any thread.
+/// What `device.json` says of the device: its language, its time zone, its screen and its
+/// abilities. Copies are the same settings. Any thread.
 class DeviceSettings {
 public:
     [[nodiscard]] static std::expected<DeviceSettings, Error>
@@ -30,6 +31,10 @@ public:
     [[nodiscard]] bool hasCellularData() const;
     /// The name of the device's own wording of wireless networks; nothing for the usual one.
     [[nodiscard]] std::optional<std::string> wirelessVariant() const;
+
+    [[nodiscard]] UserInterfaceIdiom userInterfaceIdiom() const;
+    /// Nothing for a device without a screen.
+    [[nodiscard]] std::optional<Screen> mainScreen() const;
 
     /// Shows everything in another locale than the file's, for this process only.
     void overrideLocale(const std::string& identifier);

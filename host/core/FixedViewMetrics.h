@@ -11,10 +11,14 @@ public:
     [[nodiscard]] Font preferredFontForTextStyle(FontTextStyle style) const override;
     [[nodiscard]] double lineHeight(const Font& font) const override;
     /// Breaks at each line feed and, where a line would pass `width`, at spaces, which are dropped.
-    /// A word that is wider than `width` stands alone on its line.
-    [[nodiscard]] Size sizeOfText(const Text& text, const Font& font, double width,
+    /// A word that is wider than `width` stands alone on its line. A line is as high as the tallest
+    /// character left on it; an empty one as the line feed before it. The line spacing stands
+    /// between two lines of a paragraph, the paragraph spacing behind each paragraph but the last.
+    [[nodiscard]] Size sizeOfText(const AttributedString& text, double width,
                                   int numberOfLines) const override;
     [[nodiscard]] double progressBarHeight() const override;
+    [[nodiscard]] Size activityIndicatorSize() const override;
+    [[nodiscard]] Size sizeOfButtonAround(const Size& title) const override;
 };
 
 } // namespace nimbra::host

@@ -24,7 +24,8 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
         return std::unexpected(device.error());
     }
     session->_device = std::move(*device);
-    session->_services.emplace(session->_device->servicesFor(*session, session->_viewMetrics));
+    session->_services.emplace(
+        session->_device->servicesFor({*session, session->_viewMetrics, session->_viewAnimations}));
     if (const auto& locale = session->_configuration.locale) {
         session->_device->settings().overrideLocale(*locale);
     }
@@ -37,7 +38,12 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
 PaneSession::PaneSession(Configuration configuration)
     : _configuration(std::move(configuration)), _scope(_loop.label()),
       _listWatcher([this] { updateFootersSoon(); }) {
-    _loop.setTurnObserver([this] { updateFooters(); });
+    _loop.setTurnObserver([this] {
+        updateFooters();
+        // What is presented has been laid out before the main queue goes on: an answer that comes
+        // at once finds the screen as the user has seen it.
+        _presentations.layOut();
+    });
 }
 
 PaneSession::~PaneSession() {
@@ -66,6 +72,7 @@ void PaneSession::layOut() {
     if (_footers) {
         _footers->layOut(listWidth);
     }
+    _presentations.layOut();
 }
 
 void PaneSession::replaceTexts(std::map<std::string, std::string> texts) {
@@ -98,7 +105,7 @@ std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
     }
     _pane->setObserver(&_listWatcher);
     _footers = std::make_unique<GroupFooters>(_device->classes(), services, _device->systemLog());
-    _pane->viewDidLoad();
+    _pane->loadViewIfNeeded();
     if (_tracer) {
         _tracer->observeRefreshControl(*_pane);
     }
@@ -114,6 +121,7 @@ void PaneSession::closePane() {
     if (_isShown) {
         disappear();
     }
+    _presentations.dismissAll();
     _pane->setObserver(nullptr);
     _footers.reset();
     _pane.reset();
@@ -148,7 +156,7 @@ void PaneSession::updateFooters() {
 }
 
 void PaneSession::pullToRefresh() {
-    if (const auto& control = _pane->table().refreshControl()) {
+    if (const auto& control = _pane->table()->refreshControl()) {
         control->pull();
     }
 }
@@ -157,7 +165,7 @@ bool PaneSession::isRefreshing() {
     if (!_pane) {
         return false;
     }
-    const auto& control = _pane->table().refreshControl();
+    const auto& control = _pane->table()->refreshControl();
     return control && control->isRefreshing();
 }
 
@@ -173,8 +181,17 @@ std::expected<std::shared_ptr<Specifier>, RowRefusal> PaneSession::row(std::stri
     return findRow(rows(), name);
 }
 
+std::expected<std::shared_ptr<Specifier>, RowRefusal>
+PaneSession::uncoveredRow(std::string_view name) {
+    auto found = row(name);
+    if (found && (_presentations.alert() != nullptr || _presentations.screen())) {
+        return std::unexpected(refusalOfCoveredPage());
+    }
+    return found;
+}
+
 std::expected<void, RowRefusal> PaneSession::setRow(std::string_view name, bool isOn) {
-    const auto found = row(name);
+    const auto found = uncoveredRow(name);
     if (!found) {
         return std::unexpected(found.error());
     }
@@ -186,7 +203,7 @@ std::expected<void, RowRefusal> PaneSession::setRow(std::string_view name, bool 
 }
 
 std::expected<void, RowRefusal> PaneSession::tapRow(std::string_view name) {
-    const auto found = row(name);
+    const auto found = uncoveredRow(name);
     if (!found) {
         return std::unexpected(found.error());
     }
@@ -223,6 +240,7 @@ void PaneSession::hideActivityInProgress() {
 
 void PaneSession::setActivity(Text activity) {
     _activity = std::move(activity);
+    _presentations.setBusy(_activity.isPresent());
     if (_activityObserver) {
         _activityObserver();
     }
@@ -240,13 +258,30 @@ void PaneSession::reloadAllParentSpecifiers() {
     reloadParentSpecifier();
 }
 
-void PaneSession::dismissPresentedController(bool /*animated*/) {
-    // Nothing can be presented over the pane yet.
+void PaneSession::presentController(const std::shared_ptr<SetupController>& controller,
+                                    bool /*animated*/) {
+    _presentations.present(controller);
 }
 
-void PaneSession::dismissPane(bool /*animated*/) {
-    // Later, as the pane itself asks for it and is still at work.
-    _loop.async([this] { closePane(); });
+void PaneSession::dismissPresentedController(bool /*animated*/) {
+    _presentations.dismissScreen();
+}
+
+void PaneSession::dismissController(const ViewController& controller, bool animated) {
+    if (&controller == _pane.get()) {
+        // Later, as the pane itself asks for it and is still at work.
+        _loop.async([this] { closePane(); });
+    } else if (&controller == _presentations.screen().get()) {
+        dismissPresentedController(animated);
+    }
+}
+
+void PaneSession::presentAlert(const std::shared_ptr<AlertController>& alert, bool /*animated*/) {
+    _presentations.present(alert);
+}
+
+void PaneSession::showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) {
+    _presentations.present(alert);
 }
 
 std::expected<void, Error> PaneSession::loadBundle() {
@@ -285,11 +320,13 @@ std::expected<UserInfo, Error> PaneSession::userInfoFor(const PaneEntry& entry) 
         }
         identifier = known->front().string();
     }
-    if (entry.firstSetup.value_or(false)) {
-        const std::shared_ptr<Account> account =
-            _services->accountStore->accountWithIdentifier(AccountIdentifier(*identifier));
+    const std::shared_ptr<Account> account =
+        _services->accountStore->accountWithIdentifier(AccountIdentifier(*identifier));
+    if (account) {
         userInfo.emplace(AccountKey, _tracer ? _tracer->traced(account) : account);
-    } else {
+    }
+    // In first setup an account need not be in the store yet: the object alone stands for it.
+    if (!entry.firstSetup.value_or(false)) {
         userInfo.emplace(AccountIdentifierKey, Text(*identifier));
     }
     return userInfo;

@@ -6,10 +6,12 @@
 #include "host/core/GroupFooters.h"
 #include "host/core/HostLoop.h"
 #include "host/core/ListWatcher.h"
+#include "host/core/Presentations.h"
 #include "host/core/RowLookup.h"
 #include "platform/host/Presenter.h"
 #include "platform/host/SettingsListController.h"
 #include "platform/values/Error.h"
+#include "platform/views/ViewAnimations.h"
 
 #include <atomic>
 #include <expected>
@@ -99,6 +101,8 @@ public:
     /// The views under the groups of the list; they follow it when the main queue runs, right after
     /// the piece of work that has changed it.
     [[nodiscard]] GroupFooters& footers() { return *_footers; }
+    /// What the pane has presented over itself; it is laid out whenever the main queue runs.
+    [[nodiscard]] Presentations& presentations() { return _presentations; }
     /// The row that `name` stands for.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal> row(std::string_view name);
     [[nodiscard]] std::expected<void, RowRefusal> setRow(std::string_view name, bool isOn);
@@ -121,8 +125,15 @@ private:
     void reloadParentSpecifier() override;
     void reloadAllParentSpecifiers() override;
     void dismissPresentedController(bool animated) override;
-    void dismissPane(bool animated) override;
+    void presentController(const std::shared_ptr<SetupController>& controller,
+                           bool animated) override;
+    void dismissController(const ViewController& controller, bool animated) override;
+    void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) override;
+    void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) override;
 
+    /// The row, where the user can reach it now.
+    [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
+    uncoveredRow(std::string_view name);
     void setActivity(Text activity);
     void updateFootersSoon();
     void updateFooters();
@@ -135,6 +146,7 @@ private:
     HostLoop _loop;
     device::CurrentQueueScope _scope;
     FixedViewMetrics _viewMetrics;
+    ViewAnimations _viewAnimations;
     /// The device's own services, not traced.
     std::optional<PlatformServices> _services;
     /// Stays until the device has ended: what a view asks of a service last may still be traced.
@@ -146,6 +158,7 @@ private:
     std::shared_ptr<SettingsListController> _pane;
     ListWatcher _listWatcher;
     std::unique_ptr<GroupFooters> _footers;
+    Presentations _presentations;
     /// Set on any thread: on the one that posts, a notification can make the list anew.
     std::atomic<bool> _areFootersBehind = false;
     bool _isShown = false;

@@ -132,6 +132,10 @@ std::expected<std::shared_ptr<Specifier>, RowRefusal> findRow(const SpecifierArr
     return matches.front();
 }
 
+RowRefusal refusalOfCoveredPage() {
+    return {Reason::covered, "the list is covered by what was opened from it"};
+}
+
 std::optional<RowRefusal> refusalToRead(const Specifier& row) {
     if (row.value() != RowValue()) {
         return std::nullopt;

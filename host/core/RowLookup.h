@@ -29,6 +29,8 @@ struct RowRefusal {
         noSetter,
         /// Nothing stands behind the button.
         noAction,
+        /// Another screen or an alert stands over the list.
+        covered,
     };
 
     Reason reason;
@@ -41,6 +43,8 @@ struct RowRefusal {
 [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
 findRow(const SpecifierArray& rows, std::string_view name);
 
+/// That the rows can be read but not used while something stands over the list.
+[[nodiscard]] RowRefusal refusalOfCoveredPage();
 /// Why `row` has no value to read; nothing when it has one. Asks the getter.
 [[nodiscard]] std::optional<RowRefusal> refusalToRead(const Specifier& row);
 /// Why `row` cannot be switched on or off; nothing when it can.

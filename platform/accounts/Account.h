@@ -24,6 +24,8 @@ public:
 
     /// Whether the account has moved from the older document storage to the new document service.
     [[nodiscard]] virtual bool vt_isUsingStratafile() const = 0;
+    /// Sets the flag in this object only; nothing is written to the store.
+    virtual void vt_setUsesStratafile(bool usesStratafile) = 0;
 
     /// Whether data of this class may be synced over cellular data. False for a class that the
     /// account does not know.

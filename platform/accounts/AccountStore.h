@@ -30,6 +30,17 @@ public:
     virtual void saveVerifiedAccountWithCompletionHandler(const std::shared_ptr<Account>& account,
                                                           SaveCompletion completion) = 0;
 
+    /// How an account is saved, and who is told.
+    struct SaveOptions {
+        /// Whether the account is checked with its service before.
+        bool doVerify = false;
+        SaveCompletion completion;
+    };
+    /// Writes the changes that `account` carries, all of them or none; the data of data classes
+    /// stays as it is. Returns at once; the store holds the account until the completion has run.
+    /// A null account is one that cannot be saved. Any queue.
+    virtual void saveAccount(const std::shared_ptr<Account>& account, SaveOptions options) = 0;
+
     /// A new helper that saves accounts to this store for a page and tells `delegate`. Any queue.
     [[nodiscard]] virtual std::shared_ptr<AccountOperationsHelper>
     operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) = 0;

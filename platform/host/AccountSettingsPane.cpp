@@ -5,6 +5,33 @@
 
 namespace nimbra {
 
+void AccountSettingsPane::viewDidLoad() {
+    SettingsListController::viewDidLoad();
+    const auto calling = [this](void (AccountSettingsPane::*tapped)(const BarButtonItem&)) {
+        return [weakPage = weak_from_this(), tapped](const BarButtonItem& sender) {
+            if (const auto page = std::static_pointer_cast<AccountSettingsPane>(weakPage.lock())) {
+                ((*page).*tapped)(sender);
+            }
+        };
+    };
+    navigationItem().setLeftBarButtonItem(
+        BarButtonItem{.title = {},
+                      .systemItem = BarButtonSystemItem::cancel,
+                      .action = calling(&AccountSettingsPane::cancelButtonTapped)});
+    navigationItem().setRightBarButtonItem(
+        BarButtonItem{.title = {},
+                      .systemItem = BarButtonSystemItem::done,
+                      .action = calling(&AccountSettingsPane::doneButtonTapped)});
+}
+
+void AccountSettingsPane::cancelButtonTapped(const BarButtonItem& /*sender*/) {
+    dismissAnimated(true);
+}
+
+void AccountSettingsPane::doneButtonTapped(const BarButtonItem& /*sender*/) {
+    dismissAnimated(true);
+}
+
 // The base page has nothing of its own to do around a save.
 
 void AccountSettingsPane::operationsHelperWillSaveAccount(

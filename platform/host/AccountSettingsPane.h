@@ -15,6 +15,13 @@ class AccountSettingsPane : public SettingsListController, public AccountOperati
 public:
     using SettingsListController::SettingsListController;
 
+    /// Puts "Cancel" and "Done" into the bar, for pages that do not say otherwise.
+    void viewDidLoad() override;
+
+    /// What the bar's buttons call: by default each leaves the page.
+    virtual void cancelButtonTapped(const BarButtonItem& sender);
+    virtual void doneButtonTapped(const BarButtonItem& sender);
+
     /// The ends of a save that the page has asked its helper for. An override calls its base's.
     void operationsHelperWillSaveAccount(AccountOperationsHelper& helper,
                                          const std::shared_ptr<Account>& account) override;

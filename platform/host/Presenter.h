@@ -2,7 +2,14 @@
 
 #include "platform/values/Text.h"
 
+#include <memory>
+
 namespace nimbra {
+
+class AccountAlertView;
+class AlertController;
+class SetupController;
+class ViewController;
 
 /// What a pane may ask of the host that shows it. Main queue only.
 class Presenter {
@@ -20,11 +27,21 @@ public:
     /// Draws the rows anew that led to the pane, on every page above it.
     virtual void reloadAllParentSpecifiers() = 0;
 
-    /// Takes away the screen that the pane has presented over itself; nothing when there is none.
+    /// Shows `controller` over the pane; the host shares it while it is shown.
+    virtual void presentController(const std::shared_ptr<SetupController>& controller,
+                                   bool animated) = 0;
+    /// Takes away the controller that the pane has presented over itself, and the alerts over that;
+    /// nothing when there is none.
     virtual void dismissPresentedController(bool animated) = 0;
+    /// Takes away `controller` itself, the pane or what was presented over it, and returns to the
+    /// page that led there; nothing when it is not shown.
+    virtual void dismissController(const ViewController& controller, bool animated) = 0;
 
-    /// Takes away the pane itself and returns to the page that opened it.
-    virtual void dismissPane(bool animated) = 0;
+    /// Asks the user with an alert, over all that is shown. The host shares it until the user has
+    /// answered, takes it away and then calls the action chosen.
+    virtual void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) = 0;
+    /// The same with an alert about an account.
+    virtual void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) = 0;
 };
 
 } // namespace nimbra

@@ -11,7 +11,8 @@
 namespace nimbra {
 
 SettingsListController::SettingsListController(const PlatformServices& services)
-    : _services(services) {}
+    : ViewController(services),
+      _table(std::make_shared<Table>(services, Rect(), TableStyle::grouped)) {}
 
 SettingsListController::~SettingsListController() = default;
 
@@ -90,23 +91,16 @@ void SettingsListController::removeSpecifierAnimated(const std::shared_ptr<Speci
     removeContiguousSpecifiersAnimated({row}, animated);
 }
 
-void SettingsListController::viewDidLoad() {}
-
-void SettingsListController::viewDidAppear(bool /*animated*/) {}
-
-void SettingsListController::viewDidDisappear(bool /*animated*/) {}
+void SettingsListController::loadView() {
+    setView(_table);
+}
 
 void SettingsListController::setSpecifier(std::shared_ptr<Specifier> specifier) {
     _specifier = std::move(specifier);
 }
 
-std::shared_ptr<SettingsListController> SettingsListController::parentController() const {
-    return _parentController.lock();
-}
-
-void SettingsListController::setParentController(
-    const std::shared_ptr<SettingsListController>& parent) {
-    _parentController = parent;
+void SettingsListController::setTable(std::shared_ptr<Table> table) {
+    _table = std::move(table);
 }
 
 void SettingsListController::setObserver(SettingsListObserver* observer) {
@@ -114,19 +108,11 @@ void SettingsListController::setObserver(SettingsListObserver* observer) {
 }
 
 void SettingsListController::reloadParentSpecifier() const {
-    _services.presenter->reloadParentSpecifier();
+    services().presenter->reloadParentSpecifier();
 }
 
 void SettingsListController::reloadAllParentSpecifiers() const {
-    _services.presenter->reloadAllParentSpecifiers();
-}
-
-void SettingsListController::dismissViewControllerAnimated(bool animated) const {
-    _services.presenter->dismissPresentedController(animated);
-}
-
-void SettingsListController::dismissAnimated(bool animated) const {
-    _services.presenter->dismissPane(animated);
+    services().presenter->reloadAllParentSpecifiers();
 }
 
 std::optional<std::size_t>

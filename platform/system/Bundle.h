@@ -3,9 +3,12 @@
 #include "platform/values/Identifier.h"
 #include "platform/values/Text.h"
 
+#include <memory>
 #include <optional>
 
 namespace nimbra {
+
+struct Image;
 
 /// A folder of code and resources that belong together. Any queue.
 class Bundle {
@@ -22,6 +25,9 @@ public:
     /// for the user. Where no table has the key, `value` comes back: the very object passed in.
     [[nodiscard]] virtual Text localizedStringForKeyValueTable(const Text& key, const Text& value,
                                                                const Text& table) const = 0;
+
+    /// The image called `name` that the bundle ships; null when it has none of that name.
+    [[nodiscard]] virtual std::shared_ptr<const Image> imageNamed(const Text& name) const = 0;
 };
 
 } // namespace nimbra

@@ -3,6 +3,7 @@
 #include "platform/system/Bundle.h"
 
 #include <memory>
+#include <typeinfo>
 
 namespace nimbra {
 
@@ -14,6 +15,10 @@ public:
     /// The bundle called `identifier`; null when none of that name is known.
     [[nodiscard]] virtual std::shared_ptr<Bundle>
     bundleWithIdentifier(const BundleIdentifier& identifier) const = 0;
+
+    /// The bundle whose shared object holds `classType`; null for a class of no known bundle.
+    [[nodiscard]] virtual std::shared_ptr<Bundle>
+    bundleForClass(const std::type_info& classType) const = 0;
 };
 
 } // namespace nimbra

@@ -1,8 +1,15 @@
 #pragma once
 
 #include "platform/values/Text.h"
+#include "platform/views/Screen.h"
+
+#include <cstdint>
+#include <optional>
 
 namespace nimbra {
+
+/// What kind of device it is to its user; the numbers are the platform's.
+enum class UserInterfaceIdiom : std::uint8_t { phone = 0, pad = 1 };
 
 /// Answers questions about the device. Any queue.
 class DeviceInfo {
@@ -15,6 +22,11 @@ public:
     /// The localization key for this device's wording of wireless networks in the text under
     /// `key`; `key` itself where the device has no wording of its own.
     [[nodiscard]] virtual Text VariantStringKeyForKey(const Text& key) const = 0;
+
+    [[nodiscard]] virtual UserInterfaceIdiom userInterfaceIdiom() const = 0;
+
+    /// The screen that the user looks at; nothing on a device without one.
+    [[nodiscard]] virtual std::optional<Screen> mainScreen() const = 0;
 };
 
 } // namespace nimbra

@@ -13,9 +13,18 @@ Label::Label(const PlatformServices& services, const Rect& frame)
       _font(services.viewMetrics->preferredFontForTextStyle(FontTextStyleBody)) {}
 
 void Label::setText(Text text) {
-    const bool differs = text != _text;
+    const bool differs = text != _text || _attributedText;
     _text = std::move(text);
+    _attributedText.reset();
     if (differs) {
+        contentChanged();
+    }
+}
+
+void Label::setAttributedText(std::optional<AttributedString> text) {
+    if (text ? text != _attributedText : _text.isPresent()) {
+        _text = text ? Text(text->string()) : Text();
+        _attributedText = std::move(text);
         contentChanged();
     }
 }
@@ -40,12 +49,18 @@ double Label::lineHeight() const {
 }
 
 Size Label::intrinsicContentSize() const {
-    return services().viewMetrics->sizeOfText(_text, _font, std::numeric_limits<double>::infinity(),
+    return services().viewMetrics->sizeOfText(shownText(), std::numeric_limits<double>::infinity(),
                                               _numberOfLines);
 }
 
 double Label::heightForWidth(double width) const {
-    return services().viewMetrics->sizeOfText(_text, _font, width, _numberOfLines).height;
+    return services().viewMetrics->sizeOfText(shownText(), width, _numberOfLines).height;
+}
+
+AttributedString Label::shownText() const {
+    return _attributedText ? *_attributedText
+                           : AttributedString(_text, {.FontAttributeName = _font,
+                                                      .ParagraphStyleAttributeName = {}});
 }
 
 void Label::contentChanged() {

@@ -1,18 +1,14 @@
 #pragma once
 
 #include "platform/values/Text.h"
+#include "platform/views/AttributedString.h"
+#include "platform/views/Color.h"
 #include "platform/views/Font.h"
 #include "platform/views/View.h"
 
-#include <cstdint>
+#include <optional>
 
 namespace nimbra {
-
-/// Where lines stand between the edges; the numbers are the platform's.
-enum class TextAlignment : std::uint8_t { left = 0, center = 1, right = 2 };
-
-/// The colours of the platform that texts stand in; a host chooses their shades.
-enum class Color : std::uint8_t { black, gray };
 
 /// A text that cannot be changed by the user. A change of what it shows asks for a layout.
 class Label final : public View {
@@ -20,8 +16,15 @@ public:
     /// An empty label in the body font, black, at the left, on one line.
     Label(const PlatformServices& services, const Rect& frame);
 
+    /// The text; of a styled one its letters.
     [[nodiscard]] const Text& text() const { return _text; }
     void setText(Text text);
+    /// The text in its own attributes, where it has been given some.
+    [[nodiscard]] const std::optional<AttributedString>& attributedText() const {
+        return _attributedText;
+    }
+    /// Shows a styled text, whatever the label's own font; nothing for no text at all.
+    void setAttributedText(std::optional<AttributedString> text);
     [[nodiscard]] const Font& font() const { return _font; }
     void setFont(const Font& font);
     [[nodiscard]] Color textColor() const { return _textColor; }
@@ -42,8 +45,10 @@ public:
 private:
     /// The label has new measures, which concern the view that it stands in.
     void contentChanged();
+    [[nodiscard]] AttributedString shownText() const;
 
     Text _text;
+    std::optional<AttributedString> _attributedText;
     Font _font;
     Color _textColor = Color::black;
     TextAlignment _textAlignment = TextAlignment::left;

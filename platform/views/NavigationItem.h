@@ -2,14 +2,24 @@
 
 #include "platform/values/Text.h"
 
+#include <cstdint>
+#include <functional>
 #include <optional>
 #include <utility>
 
 namespace nimbra {
 
+/// Buttons that are the same on every screen: the host knows what they are called.
+enum class BarButtonSystemItem : std::uint8_t { done, cancel };
+
 /// A button of the bar above a screen.
 struct BarButtonItem {
+    /// Absent for a system item.
     Text title;
+    std::optional<BarButtonSystemItem> systemItem;
+    /// What a tap calls; empty for nothing. The host calls it on a copy of the item, as the screen
+    /// may take the item away, or go itself, meanwhile.
+    std::function<void(const BarButtonItem& sender)> action;
 };
 
 /// What the bar above a screen shows for it. Main queue only.

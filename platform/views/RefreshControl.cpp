@@ -6,7 +6,7 @@ namespace nimbra {
 
 void RefreshControl::addTargetActionForControlEvents(std::weak_ptr<void> target, Action action,
                                                      ControlEvent event) {
-    _targets.push_back({std::move(target), std::move(action), event});
+    _targets.add(std::move(target), std::move(action), event);
 }
 
 void RefreshControl::pull() {
@@ -14,12 +14,7 @@ void RefreshControl::pull() {
         return;
     }
     _refreshing = true;
-    for (const Target& entry : std::vector(_targets)) {
-        if (const auto alive = entry.target.lock();
-            alive && entry.event == ControlEvent::valueChanged) {
-            entry.action(shared_from_this());
-        }
-    }
+    _targets.send(shared_from_this(), ControlEvent::valueChanged);
 }
 
 void RefreshControl::endRefreshing() {

@@ -1,18 +1,16 @@
 #pragma once
 
+#include "platform/views/ControlEvents.h"
+
 #include <functional>
 #include <memory>
-#include <vector>
 
 namespace nimbra {
-
-/// What a control can tell its targets.
-enum class ControlEvent { valueChanged };
 
 /// The sign that a pulled-down list shows while its content is fetched. Main queue only.
 class RefreshControl : public std::enable_shared_from_this<RefreshControl> {
 public:
-    using Action = std::function<void(const std::shared_ptr<RefreshControl>& sender)>;
+    using Action = ControlTargets<RefreshControl>::Action;
 
     /// Calls `action` on each `event` for as long as `target`, which is held weakly, is alive.
     void addTargetActionForControlEvents(std::weak_ptr<void> target, Action action,
@@ -31,13 +29,7 @@ public:
     void setEndObserver(std::function<void()> observer);
 
 private:
-    struct Target {
-        std::weak_ptr<void> target;
-        Action action;
-        ControlEvent event;
-    };
-
-    std::vector<Target> _targets;
+    ControlTargets<RefreshControl> _targets;
     std::function<void()> _endObserver;
     bool _refreshing = false;
 };

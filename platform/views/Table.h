@@ -1,15 +1,25 @@
 #pragma once
 
 #include "platform/views/RefreshControl.h"
+#include "platform/views/View.h"
 
+#include <cstdint>
 #include <memory>
 #include <utility>
 
 namespace nimbra {
 
+/// How a table shows its groups; the numbers are the platform's.
+enum class TableStyle : std::uint8_t { plain = 0, grouped = 1 };
+
 /// The table in which the host shows a controller's rows. Main queue only.
-class Table {
+class Table final : public View {
 public:
+    Table(const PlatformServices& services, const Rect& frame, TableStyle style)
+        : View(services, frame), _style(style) {}
+
+    [[nodiscard]] TableStyle style() const { return _style; }
+
     /// The sign of a list that can be pulled down; null where it cannot.
     [[nodiscard]] const std::shared_ptr<RefreshControl>& refreshControl() const {
         return _refreshControl;
@@ -19,6 +29,7 @@ public:
     }
 
 private:
+    TableStyle _style;
     std::shared_ptr<RefreshControl> _refreshControl;
 };
 

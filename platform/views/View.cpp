@@ -2,6 +2,7 @@
 
 #include "platform/system/Syslog.h"
 #include "platform/views/ConstraintSolver.h"
+#include "platform/views/ViewAnimations.h"
 
 #include <algorithm>
 #include <cmath>
@@ -124,6 +125,27 @@ void View::setFrame(const Rect& frame) {
         setNeedsLayout();
     }
     _frame = frame;
+}
+
+void View::setAlpha(double alpha) {
+    const double opacity = std::isnan(alpha) ? 0 : std::clamp(alpha, 0.0, 1.0);
+    if (std::exchange(_alpha, opacity) == opacity) {
+        return;
+    }
+    // A view that is still being made has nothing to show over time.
+    if (auto self = weak_from_this().lock()) {
+        _services.viewAnimations->didChangeAlpha(std::move(self), opacity);
+    }
+}
+
+void View::sizeToFit() {
+    const Size fitting = intrinsicContentSize();
+    const auto orAsItIs = [](double needed, double current) {
+        return needed == ViewNoIntrinsicMetric ? current : needed;
+    };
+    setFrame({.origin = _frame.origin,
+              .size = {.width = orAsItIs(fitting.width, _frame.size.width),
+                       .height = orAsItIs(fitting.height, _frame.size.height)}});
 }
 
 Size View::intrinsicContentSize() const {

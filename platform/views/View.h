@@ -2,12 +2,16 @@
 
 #include "platform/PlatformServices.h"
 #include "platform/values/KeyValueObserver.h"
+#include "platform/views/Color.h"
 #include "platform/views/Geometry.h"
 #include "platform/views/LayoutConstraint.h"
 
 #include <array>
 #include <cstdint>
 #include <memory>
+#include <optional>
+#include <string>
+#include <utility>
 #include <vector>
 
 namespace nimbra {
@@ -24,7 +28,8 @@ inline constexpr LayoutPriority highLayoutPriority = 750;
 inline constexpr LayoutPriority lowLayoutPriority = 250;
 
 /// A rectangle in the tree of what a host shows. It draws nothing: a host looks at the tree. A view
-/// owns its subviews; views are made with `std::make_shared`. Main queue only.
+/// owns its subviews; views are made with `std::make_shared`. Main queue only, but for the release
+/// of a view that is in no window, which may happen on any queue.
 class View : public KeyValueObserver, public std::enable_shared_from_this<View> {
 public:
     /// The services outlive the view.
@@ -63,6 +68,21 @@ public:
     void setFrame(const Rect& frame);
     [[nodiscard]] bool isHidden() const { return _hidden; }
     void setHidden(bool hidden) { _hidden = hidden; }
+    /// The opacity, from 0, which cannot be seen, to 1, which hides what is behind.
+    [[nodiscard]] double alpha() const { return _alpha; }
+    /// Where an animation is being put together, the change becomes a part of it. Stays between 0
+    /// and 1.
+    void setAlpha(double alpha);
+    /// Nothing: what is behind the view shines through.
+    [[nodiscard]] std::optional<Color> backgroundColor() const { return _backgroundColor; }
+    void setBackgroundColor(Color color) { _backgroundColor = color; }
+    /// Whether the view takes touches; it does to begin with.
+    [[nodiscard]] bool isUserInteractionEnabled() const { return _takesTouches; }
+    void setUserInteractionEnabled(bool enabled) { _takesTouches = enabled; }
+
+    /// What the view is called by those who look into the tree from outside; not shown to the user.
+    [[nodiscard]] const std::string& accessibilityIdentifier() const { return _identifier; }
+    void setAccessibilityIdentifier(std::string identifier) { _identifier = std::move(identifier); }
 
     // Layout.
 
@@ -71,6 +91,10 @@ public:
     [[nodiscard]] virtual Size intrinsicContentSize() const;
     /// The height of the content where it is `width` wide; by default what it is at any width.
     [[nodiscard]] virtual double heightForWidth(double width) const;
+
+    /// Gives the view the size that its content needs, at the place where it stands; a direction
+    /// that does not matter to the content stays as it is.
+    void sizeToFit();
 
     /// Asks for a layout of this view in the next pass.
     void setNeedsLayout() { _needsLayout = true; }
@@ -118,7 +142,11 @@ private:
     std::vector<std::shared_ptr<View>> _subviews;
     std::vector<LayoutConstraint> _constraints;
     std::array<LayoutPriority, 2> _compressionResistance{highLayoutPriority, highLayoutPriority};
+    std::string _identifier;
+    std::optional<Color> _backgroundColor;
+    double _alpha = 1;
     bool _hidden = false;
+    bool _takesTouches = true;
     bool _needsLayout = true;
     bool _translates = true;
 };

@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/values/Text.h"
+#include "platform/views/AttributedString.h"
 #include "platform/views/Font.h"
 #include "platform/views/Geometry.h"
 
@@ -17,12 +17,16 @@ public:
     /// The height of one line of text.
     [[nodiscard]] virtual double lineHeight(const Font& font) const = 0;
 
-    /// The room that `text` takes when its lines are broken to be at most `width` wide, in at most
-    /// `numberOfLines` lines (0: as many as it takes). An absent or empty text takes none.
-    [[nodiscard]] virtual Size sizeOfText(const Text& text, const Font& font, double width,
+    /// The room that `text` takes, from the top of its first line to the bottom of its last, when
+    /// they are broken to be at most `width` points wide, in at most `numberOfLines` lines (0: as
+    /// many as it takes). An empty text takes none. A width below 0, or of no number, is one of 0.
+    [[nodiscard]] virtual Size sizeOfText(const AttributedString& text, double width,
                                           int numberOfLines) const = 0;
 
     [[nodiscard]] virtual double progressBarHeight() const = 0;
+    [[nodiscard]] virtual Size activityIndicatorSize() const = 0;
+    /// A button around a title of this size.
+    [[nodiscard]] virtual Size sizeOfButtonAround(const Size& title) const = 0;
 };
 
 } // namespace nimbra

@@ -42,6 +42,10 @@ TEST(DeviceDescriptionTest, ADeviceThatNobodyDescribedHasTheDefaults) {
     EXPECT_TRUE(description.appCellularDataModificationAllowed);
     EXPECT_EQ(description.identity, std::nullopt);
     EXPECT_TRUE(description.containers.empty());
+    EXPECT_TRUE(description.deviceList.incompatible.empty());
+    EXPECT_TRUE(description.deviceList.needUpgrade.empty());
+    EXPECT_EQ(description.deviceList.outcome, DeviceDescription::DeviceList::Outcome::answers);
+    EXPECT_EQ(description.deviceList.delay, 0);
     EXPECT_EQ(description.strings, std::nullopt);
     EXPECT_TRUE(description.paneBundleRegistered);
 
@@ -192,6 +196,29 @@ TEST(DeviceDescriptionTest, ConsentIsReadInItsOrderWithWhatIsLacking) {
     EXPECT_EQ(description.consent[3].granted, std::nullopt);
 }
 
+TEST(DeviceDescriptionTest, TheListOfDevicesIsReadInItsOrder) {
+    const auto list = given(R"({"deviceList": {"incompatible": ["b", "", "a", "b"],
+                                               "needUpgrade": [" {0}\n "]}})")
+                          .description.deviceList;
+    const auto onlyOne = given(R"({"deviceList": {"needUpgrade": ["x"]}})").description.deviceList;
+
+    EXPECT_EQ(list.incompatible, (Strings{"b", "", "a", "b"}));
+    EXPECT_EQ(list.needUpgrade, Strings{" {0}\n "});
+    EXPECT_EQ(list.outcome, DeviceDescription::DeviceList::Outcome::answers);
+    EXPECT_TRUE(onlyOne.incompatible.empty());
+    EXPECT_EQ(onlyOne.needUpgrade, Strings{"x"});
+}
+
+TEST(DeviceDescriptionTest, AListOfDevicesMayFailOrNeverCome) {
+    using Outcome = DeviceDescription::DeviceList::Outcome;
+
+    EXPECT_EQ(given(R"({"deviceList": null})").description.deviceList.outcome, Outcome::fails);
+    EXPECT_EQ(given(R"({"deviceList": "never"})").description.deviceList.outcome,
+              Outcome::neverAnswers);
+    EXPECT_EQ(given(R"({"deviceList": {}})").description.deviceList.outcome, Outcome::answers);
+    EXPECT_EQ(given(R"({"deviceList": null})").keys, std::set<std::string>{"deviceList"});
+}
+
 TEST(DeviceDescriptionTest, FaultsAreReadInTheirOrder) {
     const auto description = given(R"({"faults": {
         "save": [null, {"domain": "D", "code": 1, "description": "d"}],
@@ -217,14 +244,14 @@ TEST(DeviceDescriptionTest, PartsThatNothingUsesYetAreCheckedAndNamed) {
                    "consentSet": [false, null], "removeItem": [], "createDirectory": [null],
                    "spawn": [2, null]}})");
     EXPECT_EQ(keysWithoutEffect(everything),
-              (Strings{"deviceList", "databaseSettings", "tool", "faults/createDirectory",
-                       "faults/removeItem", "faults/spawn"}));
+              (Strings{"databaseSettings", "tool", "faults/createDirectory", "faults/removeItem",
+                       "faults/spawn"}));
 
     const auto others =
         given(R"({"deviceList": null, "databaseSettings": null, "tool": null, "name": "x"})");
-    EXPECT_EQ(keysWithoutEffect(others), (Strings{"deviceList", "databaseSettings", "tool"}));
+    EXPECT_EQ(keysWithoutEffect(others), (Strings{"databaseSettings", "tool"}));
     EXPECT_EQ(keysWithoutEffect(given(R"({"deviceList": "never", "tool": "real"})")),
-              (Strings{"deviceList", "tool"}));
+              (Strings{"tool"}));
     EXPECT_TRUE(keysWithoutEffect(given(R"({"name": "x", "accounts": []})")).empty());
 }
 

@@ -53,6 +53,7 @@ TEST_F(DeviceDirectoryTest, EveryPartOfADescriptionGetsItsFile) {
     description.cloudSyncDenied = {"com.a"};
     description.identity = "token";
     description.containers = {{.identifier = "c", .isPublic = true}};
+    description.deviceList = {.incompatible = {"b", "", "\"a\"\n"}, .needUpgrade = {"c"}};
     description.preferences["com.vantrel.marrow"] = {{"log.level", 1}};
 
     create(description);
@@ -87,6 +88,19 @@ TEST_F(DeviceDirectoryTest, EveryPartOfADescriptionGetsItsFile) {
   ],
   "lastSyncDate": null,
   "lastSyncText": null
+}
+)");
+    EXPECT_EQ(contentOf(state("device-list.json")), R"({
+  "incompatible": [
+    "b",
+    "",
+    "\"a\"\n"
+  ],
+  "needUpgrade": [
+    "c"
+  ],
+  "outcome": "answers",
+  "delay": 0.0
 }
 )");
     EXPECT_EQ(contentOf(state("preferences/com.vantrel.marrow.json")),
@@ -124,9 +138,9 @@ TEST_F(DeviceDirectoryTest, NothingButTheDeviceIsLeft) {
     EXPECT_EQ(names, (std::set<std::string>{"device", "device/usr", "device/usr/share",
                                             "device/usr/share/applications", "device/var",
                                             "device/var/lib", base, base + "/accounts.db",
-                                            base + "/consent.db", base + "/device.json",
-                                            base + "/documents.json", base + "/preferences",
-                                            base + "/restrictions.json"}));
+                                            base + "/consent.db", base + "/device-list.json",
+                                            base + "/device.json", base + "/documents.json",
+                                            base + "/preferences", base + "/restrictions.json"}));
 }
 
 TEST_F(DeviceDirectoryTest, DirectoriesAboveTheRootAreMade) {

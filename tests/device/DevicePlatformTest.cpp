@@ -10,6 +10,7 @@
 #include "device/system/DeviceWorkQueues.h"
 #include "device/system/StandingTime.h"
 #include "platform/accounts/AccountStore.h"
+#include "platform/accounts/DeviceListRequests.h"
 #include "platform/apps/Applications.h"
 #include "platform/documents/DaemonConnection.h"
 #include "platform/documents/DocumentContainers.h"
@@ -19,6 +20,7 @@
 #include "platform/system/FileManager.h"
 #include "platform/system/Localization.h"
 #include "platform/system/SystemLog.h"
+#include "platform/views/ViewAnimations.h"
 #include "tests/device/TestFiles.h"
 #include "tests/support/FakeViewMetrics.h"
 #include "tests/support/PumpedQueue.h"
@@ -68,6 +70,11 @@ protected:
     [[nodiscard]] test::PumpedQueue& mainQueue() { return _mainQueue; }
     [[nodiscard]] test::RecordingPresenter& presenter() { return _presenter; }
     [[nodiscard]] test::FakeViewMetrics& viewMetrics() { return _viewMetrics; }
+    [[nodiscard]] DevicePlatform::HostServices host() {
+        return {.presenter = _presenter,
+                .viewMetrics = _viewMetrics,
+                .viewAnimations = _viewAnimations};
+    }
 
 private:
     test::TemporaryDirectory _directory;
@@ -75,15 +82,17 @@ private:
     std::vector<std::string> _calls;
     test::RecordingPresenter _presenter{_calls};
     test::FakeViewMetrics _viewMetrics;
+    ViewAnimations _viewAnimations;
 };
 
 TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
     const auto platform = open();
 
-    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
+    const PlatformServices services = platform->servicesFor(host());
 
     EXPECT_EQ(services.presenter.operator->(), &presenter());
     EXPECT_EQ(services.viewMetrics.operator->(), &viewMetrics());
+    EXPECT_EQ(services.viewAnimations.operator->(), &host().viewAnimations);
     EXPECT_TRUE(services.accountStore->accountWithIdentifier(AccountIdentifier("primary")));
     EXPECT_EQ(services.fileManager->tidewaterIdentityToken(), Text("token"));
     EXPECT_EQ(services.documentContainers->allContainers().size(), 1U);
@@ -107,7 +116,7 @@ TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
     const auto platform = DevicePlatform::open(place, mainQueue());
     ASSERT_TRUE(platform) << platform.error();
 
-    const PlatformServices services = (*platform)->servicesFor(presenter(), viewMetrics());
+    const PlatformServices services = (*platform)->servicesFor(host());
     const auto first =
         services.applications->applicationProxyForIdentifier(BundleIdentifier("com/a"));
     const auto second =
@@ -131,7 +140,7 @@ TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
     const auto platform = DevicePlatform::open(root(), mainQueue(), time);
     ASSERT_TRUE(platform) << platform.error();
     Date fired;
-    const PlatformServices services = (*platform)->servicesFor(presenter(), viewMetrics());
+    const PlatformServices services = (*platform)->servicesFor(host());
     const auto timer = services.workQueues->timerSourceOnQueue(mainQueue());
     timer->setEventHandler([&] { fired = services.clock->now(); });
     timer->setTimer(std::chrono::seconds(60), std::chrono::seconds(60),
@@ -148,7 +157,7 @@ TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
 TEST_F(DevicePlatformTest, WhatTimersAndDistributedNotificationsHoldGoesWithThePlatform) {
     const auto held = std::make_shared<int>(0);
     auto platform = open();
-    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
+    const PlatformServices services = platform->servicesFor(host());
     auto timer = services.workQueues->timerSourceOnQueue(mainQueue());
     timer->setEventHandler([held, timer] { ++*held; });
     timer->setTimer(std::chrono::hours(1), std::chrono::hours(1), std::chrono::nanoseconds(0));
@@ -173,7 +182,7 @@ TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
     std::vector<std::string> seen;
     const auto held = std::make_shared<int>();
     auto platform = open();
-    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
+    const PlatformServices services = platform->servicesFor(host());
     const auto subscribe = [&] {
         return services.progressReports->_addSubscriberForFileURLWithPublishingHandler(
             services.daemonConnection->mobileDocumentsURL(),
@@ -197,20 +206,75 @@ TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
     EXPECT_EQ(held.use_count(), 1);
 }
 
+TEST_F(DevicePlatformTest, TheDevicesOfAnAccountAreThoseOfItsFile) {
+    test::writeTestFile(state("device-list.json"), R"({"needUpgrade": ["Pad"]})");
+    const auto platform = open();
+    const PlatformServices services = platform->servicesFor(host());
+    std::promise<DeviceListResponse> answered;
+
+    services.deviceListRequests
+        ->initWithAccount(
+            services.accountStore->accountWithIdentifier(AccountIdentifier("primary")))
+        ->performRequestWithHandler([&answered](const auto&, const auto& response) {
+            answered.set_value(response.value_or(DeviceListResponse()));
+        });
+
+    const DeviceListResponse response = answered.get_future().get();
+    EXPECT_EQ(response.incompatibleDeviceNames, std::vector<Text>());
+    EXPECT_EQ(response.needUpgradeDeviceNames, std::vector<Text>{"Pad"});
+}
+
+TEST_F(DevicePlatformTest, ADeviceWithABrokenListOfDevicesOpensAndAnswersWithNone) {
+    test::writeTestFile(state("device-list.json"), "{");
+    const auto platform = open();
+    const PlatformServices services = platform->servicesFor(host());
+    std::promise<bool> answered;
+
+    services.deviceListRequests
+        ->initWithAccount(
+            services.accountStore->accountWithIdentifier(AccountIdentifier("primary")))
+        ->performRequestWithHandler([&answered](const auto&, const auto& response) {
+            answered.set_value(response.has_value());
+        });
+
+    EXPECT_FALSE(answered.get_future().get());
+}
+
+TEST_F(DevicePlatformTest, HandlersThatWaitForDevicesGoWhileTheServicesAreStillThere) {
+    for (const char* const text : {R"({"outcome": "never answers"})", R"({"delay": 1000})"}) {
+        test::writeTestFile(state("device-list.json"), text);
+        auto platform = open();
+        const PlatformServices services = platform->servicesFor(host());
+        std::size_t found = 0;
+        // Asks a service when it goes, as a screen may.
+        std::shared_ptr<void> farewell(nullptr, [&found, services](const void*) {
+            found = services.documentContainers->allContainers().size();
+        });
+        const auto account =
+            services.accountStore->accountWithIdentifier(AccountIdentifier("primary"));
+        services.deviceListRequests->initWithAccount(account)->performRequestWithHandler(
+            [farewell = std::move(farewell)](const auto&, const auto&) { FAIL(); });
+
+        platform.reset();
+
+        EXPECT_EQ(found, 1U) << text;
+        EXPECT_EQ(account.use_count(), 1) << text;
+    }
+}
+
 TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
     const auto platform = open();
     std::promise<void> completed;
 
-    platform->servicesFor(presenter(), viewMetrics())
-        .documentContainers->forceRefreshAllContainersWithCompletion(
-            [&completed] { completed.set_value(); });
+    platform->servicesFor(host()).documentContainers->forceRefreshAllContainersWithCompletion(
+        [&completed] { completed.set_value(); });
 
     completed.get_future().wait();
 }
 
 TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
     auto platform = open();
-    const PlatformServices services = platform->servicesFor(presenter(), viewMetrics());
+    const PlatformServices services = platform->servicesFor(host());
     const auto queue = services.workQueues->serialQueueWithLabel("late");
     std::promise<void> start;
     std::size_t found = 0;
@@ -236,8 +300,7 @@ TEST_F(DevicePlatformTest, OpeningAndReadingLeavesTheDirectoryAsItWas) {
 TEST_F(DevicePlatformTest, ADeviceOfAnEarlierVersionHasNoConsentUntilSomeIsGiven) {
     std::filesystem::remove(state("consent.db"));
     const auto platform = open();
-    PrivacyConsentStore& store =
-        platform->servicesFor(presenter(), viewMetrics()).privacyConsentStore;
+    PrivacyConsentStore& store = platform->servicesFor(host()).privacyConsentStore;
     const ConsentBundle bundle{BundleIdentifier("a")};
 
     const auto before = store.PRVAccessCopyInformation(kPRVServiceTidewater);

@@ -65,7 +65,7 @@ TEST_F(Footer, TheHeightIsTheSameInEveryWidthAndForSeveralLines) {
     const double expected =
         view->statusLabel()->lineHeight() + platform.viewMetrics.progressBarHeight() + 5;
     view->statusLabel()->setText("one\ntwo\nthree and a fourth that is too long for the width");
-    const Table table;
+    const Table table(platform.services(), {}, TableStyle::grouped);
 
     for (const double width :
          {-1.0, 0.0, 10.0, 320.0, 1000.0, std::numeric_limits<double>::infinity()}) {

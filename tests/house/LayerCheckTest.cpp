@@ -126,12 +126,14 @@ TEST_F(LayerCheck, ALibraryMayStandInItsLayersOnly) {
     tree.write("host/cli/Main.cpp", "#include <QObject>\n");
     tree.write("device/store/Store.h", "#include <CLI/CLI.hpp>\n");
     tree.write("tools/Tool.cpp", "#include <spdlog/spdlog.h>\n");
+    tree.write("host/core/Picture.cpp", "#include <png.h>\n");
 
     expectFault("host/core/Session.h:1",
                 "includes <SQLiteCpp/SQLiteCpp.h>, which may stand in dev");
     expectFault("host/cli/Main.cpp:1", "includes <QObject>, which may stand in host/qt only");
     expectFault("device/store/Store.h:1", "includes <CLI/CLI.hpp>, which may stand in host/cli");
     expectFault("tools/Tool.cpp:1", "includes <spdlog/spdlog.h>, which may stand in device only");
+    expectFault("host/core/Picture.cpp:1", "includes <png.h>, which may stand in device only");
 }
 
 TEST_F(LayerCheck, ThePanesSideUsesTheStandardLibraryAndPosixOnly) {

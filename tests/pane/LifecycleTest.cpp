@@ -73,12 +73,12 @@ TEST_F(LifecycleTest, LoadingClearsTheBarAndInstallsTheRefreshControl) {
 
     EXPECT_FALSE(pane->navigationItem().leftBarButtonItem());
     EXPECT_FALSE(pane->navigationItem().rightBarButtonItem());
-    EXPECT_NE(pane->table().refreshControl(), nullptr);
+    EXPECT_NE(pane->table()->refreshControl(), nullptr);
 }
 
 TEST_F(LifecycleTest, APullRefreshesAllContainersAndEndsOnTheMainQueue) {
     pane->viewDidLoad();
-    const auto control = pane->table().refreshControl();
+    const auto control = pane->table()->refreshControl();
 
     control->pull();
     ASSERT_EQ(platform.documentContainers.refreshes.size(), 1U);
@@ -92,7 +92,7 @@ TEST_F(LifecycleTest, APullRefreshesAllContainersAndEndsOnTheMainQueue) {
 
 TEST_F(LifecycleTest, ARefreshThatEndsAfterThePaneHasGoneDoesNoHarm) {
     pane->viewDidLoad();
-    pane->table().refreshControl()->pull();
+    pane->table()->refreshControl()->pull();
     pane.reset();
 
     platform.documentContainers.refreshes.front()();
@@ -162,13 +162,13 @@ TEST_F(LifecycleTest, SuccessReloadsTheParentThenClosesTheScreenThenThePane) {
     pane->upgradeViewControllerDidSucceed(nullptr);
 
     EXPECT_EQ(platform.calls,
-              Calls({"reload ", "dismiss presented, animated", "dismiss pane, animated"}));
+              Calls({"reload ", "dismiss presented, animated", "dismiss itself, animated"}));
 }
 
 TEST_F(LifecycleTest, SuccessWithoutAParentStillCloses) {
     pane->upgradeViewControllerDidSucceed(nullptr);
 
-    EXPECT_EQ(platform.calls, Calls({"dismiss presented, animated", "dismiss pane, animated"}));
+    EXPECT_EQ(platform.calls, Calls({"dismiss presented, animated", "dismiss itself, animated"}));
 }
 
 } // namespace

@@ -15,6 +15,7 @@ using testing::Test;
 class LetterPage final : public SettingsListController {
 public:
     using SettingsListController::indexOfSpecifier;
+    using SettingsListController::setTable;
     using SettingsListController::SettingsListController;
 
     const SpecifierArray& specifiers() override {
@@ -174,6 +175,25 @@ TEST_F(SettingsListControllerTest, WithoutAnObserverTheListChangesAllTheSame) {
 
     EXPECT_EQ(rows(), "A X C Y");
     EXPECT_EQ(told(), Calls());
+}
+
+TEST_F(SettingsListControllerTest, APageShowsItselfInAGroupedTable) {
+    EXPECT_EQ(page->table()->style(), TableStyle::grouped);
+
+    page->loadViewIfNeeded();
+
+    EXPECT_EQ(page->view(), page->table());
+}
+
+TEST_F(SettingsListControllerTest, AnotherTableLeavesTheViewAsItIs) {
+    page->loadViewIfNeeded();
+    const auto first = page->table();
+    const auto other = std::make_shared<Table>(platform.services(), Rect(), TableStyle::plain);
+
+    page->setTable(other);
+
+    EXPECT_EQ(page->table(), other);
+    EXPECT_EQ(page->view(), first);
 }
 
 TEST_F(SettingsListControllerTest, TheParentIsHeldWeakly) {

@@ -20,8 +20,13 @@ public:
     }
     void setEnabledForDataclass(bool enabled, const Dataclass& dataclass) override {
         set(flags.enabled, dataclass, enabled);
+        changes.push_back((enabled ? "enable " : "disable ") + dataclass.string());
     }
     [[nodiscard]] bool vt_isUsingStratafile() const override { return flags.usesStratafile; }
+    void vt_setUsesStratafile(bool usesStratafile) override {
+        flags.usesStratafile = usesStratafile;
+        changes.emplace_back("uses stratafile: " + std::string(usesStratafile ? "yes" : "no"));
+    }
     [[nodiscard]] bool vt_useCellularForDataclass(const Dataclass& dataclass) const override {
         cellularReads.push_back(dataclass);
         return flags.cellular.contains(dataclass);
@@ -43,6 +48,8 @@ public:
     /// What a reload brings back; owned by the store that gave the account out.
     const Flags* stored = nullptr;
     int reloads = 0;
+    /// What was changed of its services, in order.
+    std::vector<std::string> changes;
     /// The data classes of which it was asked whether they may use cellular data, in order.
     mutable std::vector<Dataclass> cellularReads;
 

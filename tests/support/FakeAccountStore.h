@@ -35,6 +35,14 @@ public:
             {.operation = "saveVerifiedAccount", .account = account, .end = std::move(completion)});
     }
 
+    void saveAccount(const std::shared_ptr<Account>& account, SaveOptions options) override {
+        saves.push_back({.operation = options.doVerify
+                                          ? "saveAccount, with completion, verified"
+                                          : "saveAccount, with completion, not verified",
+                         .account = account,
+                         .end = std::move(options.completion)});
+    }
+
     [[nodiscard]] std::shared_ptr<AccountOperationsHelper>
     operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) override {
         return std::make_shared<Helper>(*this, std::move(delegate));

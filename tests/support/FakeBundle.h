@@ -1,15 +1,17 @@
 #pragma once
 
 #include "platform/system/Bundle.h"
+#include "platform/views/Image.h"
 
 #include <map>
+#include <memory>
 #include <optional>
 #include <string>
 #include <utility>
 
 namespace nimbra::test {
 
-/// A bundle with the one string table "Localizable" that a test gives it.
+/// A bundle with the one string table "Localizable" and the images that a test gives it.
 class FakeBundle final : public Bundle {
 public:
     /// The pane's bundle.
@@ -27,6 +29,12 @@ public:
         const auto entry = _texts.find(key.string());
         return table == Text("Localizable") && entry != _texts.end() ? entry->second : value;
     }
+    [[nodiscard]] std::shared_ptr<const Image> imageNamed(const Text& name) const override {
+        const auto entry = images.find(name.string());
+        return entry != images.end() ? entry->second : nullptr;
+    }
+
+    std::map<std::string, std::shared_ptr<const Image>> images;
 
 private:
     std::optional<BundleIdentifier> _identifier;

@@ -4,6 +4,7 @@
 #include "tests/support/FakeBundle.h"
 
 #include <memory>
+#include <string>
 #include <vector>
 
 namespace nimbra::test {
@@ -16,9 +17,15 @@ public:
         ++lookups;
         return paneBundle && paneBundle->identifier() == identifier ? paneBundle : nullptr;
     }
+    [[nodiscard]] std::shared_ptr<Bundle>
+    bundleForClass(const std::type_info& classType) const override {
+        classesAskedFor.emplace_back(classType.name());
+        return bundleOfClasses;
+    }
 
     std::shared_ptr<FakeBundle> paneBundle = std::make_shared<FakeBundle>(
         std::map<std::string, Text>{{"CLOUD_DRIVE", "Nimbra Drive"},
+                                    {"CLOUD_DRIVE_UPGRADE_LINK", "Upgrade"},
                                     {"CLOUD_DRIVE_EXPLANATION", "Keeps your documents."},
                                     {"TURNING_ON_CLOUD_DRIVE", "Turning on"},
                                     {"TURNING_OFF_CLOUD_DRIVE", "Turning off"},
@@ -27,6 +34,10 @@ public:
                                     {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI_WLAN", "Over WLAN."}});
     /// How often a bundle was looked up.
     mutable int lookups = 0;
+    /// The bundle that every class belongs to.
+    std::shared_ptr<FakeBundle> bundleOfClasses;
+    /// The classes whose bundle was looked up, by their mangled names.
+    mutable std::vector<std::string> classesAskedFor;
 };
 
 } // namespace nimbra::test

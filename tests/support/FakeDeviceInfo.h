@@ -2,6 +2,7 @@
 
 #include "platform/system/DeviceInfo.h"
 
+#include <optional>
 #include <string>
 
 namespace nimbra::test {
@@ -15,9 +16,18 @@ public:
     [[nodiscard]] Text VariantStringKeyForKey(const Text& key) const override {
         return variant.empty() ? key : Text(key.string() + "_" + variant);
     }
+    [[nodiscard]] UserInterfaceIdiom userInterfaceIdiom() const override {
+        ++idiomQuestions;
+        return idiom;
+    }
+    [[nodiscard]] std::optional<Screen> mainScreen() const override { return screen; }
 
     bool hasCellularData = false;
     std::string variant;
+    UserInterfaceIdiom idiom = UserInterfaceIdiom::phone;
+    std::optional<Screen> screen = Screen{.bounds = {.origin = {}, .size = {390, 844}}, .scale = 2};
+    /// How often the idiom was asked for.
+    mutable int idiomQuestions = 0;
 };
 
 } // namespace nimbra::test

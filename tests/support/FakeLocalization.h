@@ -22,8 +22,7 @@ public:
         locales.push_back(locale);
         std::string filled = format.string();
         if (const auto place = filled.find("{0}"); place != std::string::npos) {
-            filled.replace(place, std::string_view("{0}").size(),
-                           std::to_string(std::get<std::int64_t>(arguments.front())));
+            filled.replace(place, std::string_view("{0}").size(), asString(arguments.front()));
         }
         return Text(filled);
     }
@@ -39,6 +38,11 @@ public:
     mutable std::vector<Locale> locales;
 
 private:
+    static std::string asString(const FormatArgument& argument) {
+        const auto* text = std::get_if<Text>(&argument);
+        return text != nullptr ? text->string() : std::to_string(std::get<std::int64_t>(argument));
+    }
+
     static std::string lowered(const Text& text) {
         std::string letters = text.string();
         for (char& letter : letters) {

@@ -2,6 +2,7 @@
 
 #include "platform/system/SystemLog.h"
 
+#include <functional>
 #include <set>
 #include <string>
 #include <utility>
@@ -16,11 +17,14 @@ public:
 
     [[nodiscard]] bool isEnabled(LogLevel level) const override { return enabled.contains(level); }
     void write(LogLevel level, const std::string& message) override {
+        onWrite();
         lines.emplace_back(level, message);
     }
 
     std::set<LogLevel> enabled{LogLevel::debug, LogLevel::standard, LogLevel::error};
     Lines lines;
+    /// Called before a line is kept.
+    std::function<void()> onWrite = [] {};
 };
 
 } // namespace nimbra::test

@@ -1,7 +1,11 @@
 #pragma once
 
+#include "platform/host/AccountAlertView.h"
+#include "platform/host/AlertController.h"
 #include "platform/host/Presenter.h"
+#include "platform/host/SetupController.h"
 
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -21,9 +25,30 @@ public:
     void dismissPresentedController(bool animated) override {
         _calls.emplace_back(animated ? "dismiss presented, animated" : "dismiss presented");
     }
-    void dismissPane(bool animated) override {
-        _calls.emplace_back(animated ? "dismiss pane, animated" : "dismiss pane");
+    void dismissController(const ViewController& controller, bool animated) override {
+        _calls.emplace_back(animated ? "dismiss itself, animated" : "dismiss itself");
+        dismissed = &controller;
     }
+    void presentController(const std::shared_ptr<SetupController>& controller,
+                           bool animated) override {
+        _calls.emplace_back(animated ? "present controller, animated" : "present controller");
+        presented = controller;
+    }
+    void presentAlert(const std::shared_ptr<AlertController>& shown, bool animated) override {
+        _calls.push_back((animated ? "alert, animated: " : "alert: ") + shown->title().string());
+        alert = shown;
+    }
+    void showAccountAlert(const std::shared_ptr<AccountAlertView>& shown) override {
+        _calls.push_back("account alert: " + shown->title().string());
+        accountAlert = shown;
+    }
+
+    /// What was presented last; a test lets it go, as a host does at its end.
+    std::shared_ptr<SetupController> presented;
+    std::shared_ptr<AlertController> alert;
+    std::shared_ptr<AccountAlertView> accountAlert;
+    /// Who wanted to be dismissed last; not to be used but for its identity.
+    const ViewController* dismissed = nullptr;
 
 private:
     std::vector<std::string>& _calls;

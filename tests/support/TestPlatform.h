@@ -2,6 +2,7 @@
 
 #include "device/system/DeviceNotificationCenter.h"
 #include "platform/PlatformServices.h"
+#include "platform/views/ViewAnimations.h"
 #include "tests/support/FakeAccountStore.h"
 #include "tests/support/FakeAppTerminator.h"
 #include "tests/support/FakeApplications.h"
@@ -9,6 +10,7 @@
 #include "tests/support/FakeClock.h"
 #include "tests/support/FakeDaemonConnection.h"
 #include "tests/support/FakeDeviceInfo.h"
+#include "tests/support/FakeDeviceListRequests.h"
 #include "tests/support/FakeDistributedNotificationCenter.h"
 #include "tests/support/FakeDocumentContainers.h"
 #include "tests/support/FakeFileManager.h"
@@ -51,6 +53,8 @@ struct TestPlatform {
     FakeLastSync lastSync{calls};
     FakeClock clock;
     FakeViewMetrics viewMetrics;
+    ViewAnimations viewAnimations;
+    FakeDeviceListRequests deviceListRequests;
 
     [[nodiscard]] PlatformServices services() {
         return {.presenter = presenter,
@@ -72,7 +76,9 @@ struct TestPlatform {
                 .progressReports = progressReports,
                 .lastSync = lastSync,
                 .clock = clock,
-                .viewMetrics = viewMetrics};
+                .viewMetrics = viewMetrics,
+                .viewAnimations = viewAnimations,
+                .deviceListRequests = deviceListRequests};
     }
 };
 

@@ -24,6 +24,7 @@ BEGIN {
     library("sqlite|SQLiteCpp/", "device")
     library("unicode/", "device host/cli")
     library("archive", "device tools")
+    library("png[.]h", "device")
     library("spdlog/|fmt/", "device")
     library("systemd/|sdbus-c[+][+]/", "device")
     library("nlohmann/", "device host/core host/cli host/qt")

@@ -4,6 +4,7 @@
 #include "device/documents/ProgressValues.h"
 #include "host/core/AccountPage.h"
 #include "platform/system/NotificationCenter.h"
+#include "platform/views/Geometry.h"
 
 #include <chrono>
 #include <string>
@@ -46,6 +47,16 @@ struct AdvanceArguments {
     std::chrono::nanoseconds duration{0};
 };
 
+/// A size for the presented screen.
+struct LayoutArguments {
+    Size size;
+};
+
+/// A button or an answer by its title.
+struct TitleArgument {
+    std::string title;
+};
+
 struct ChangeArguments {
     device::GivenDescription device;
 };
@@ -55,7 +66,8 @@ struct ScenarioStep {
     /// The word under `do`.
     std::string name;
     std::variant<std::monostate, RowArgument, SetArguments, PostArguments, ProgressArguments,
-                 MoveFooterArguments, AdvanceArguments, ChangeArguments>
+                 MoveFooterArguments, AdvanceArguments, LayoutArguments, TitleArgument,
+                 ChangeArguments>
         arguments;
 };
 

@@ -50,10 +50,10 @@ const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& nam
         Handler{.name = "footer", .perform = &ScenarioPlayer::footer, .needsPane = true},
         Handler{.name = "moveFooter", .perform = &ScenarioPlayer::moveFooter, .needsPane = true},
         Handler{.name = "advance", .perform = &ScenarioPlayer::advance},
-        Handler{.name = "layout", .missing = "no screen to lay out"},
-        Handler{.name = "views", .missing = "no screen with views"},
-        Handler{.name = "tapButton", .missing = "no screen with buttons"},
-        Handler{.name = "alert", .missing = "no alerts"},
+        Handler{.name = "layout", .perform = &ScenarioPlayer::layout},
+        Handler{.name = "views", .perform = &ScenarioPlayer::views},
+        Handler{.name = "tapButton", .perform = &ScenarioPlayer::tapButton},
+        Handler{.name = "alert", .perform = &ScenarioPlayer::alert},
         Handler{.name = "share", .missing = "no share sheet"},
     };
     const auto* const handler = std::ranges::find(handlers, name, &Handler::name);

@@ -66,6 +66,10 @@ private:
     Outcome footer(const ScenarioStep& step);
     Outcome moveFooter(const ScenarioStep& step);
     Outcome advance(const ScenarioStep& step);
+    Outcome layout(const ScenarioStep& step);
+    Outcome views(const ScenarioStep& step);
+    Outcome tapButton(const ScenarioStep& step);
+    Outcome alert(const ScenarioStep& step);
     Outcome close(const ScenarioStep& step);
 
     const Scenario& _scenario;

@@ -156,26 +156,32 @@ Arguments advance(const JsonReader& step) {
         std::chrono::round<std::chrono::nanoseconds>(std::chrono::duration<double>(seconds))};
 }
 
-// What follows is checked only: nothing in this version uses it.
+double requiredLength(const JsonReader& step, const std::string& key) {
+    const JsonReader reader = required(step, key, "a number");
+    const double length = reader.number();
+    if (length < 0) {
+        reader.expected("a number from 0 up");
+    }
+    return length;
+}
 
 Arguments layout(const JsonReader& step) {
     step.allowOnly({"do", "width", "height"});
-    static_cast<void>(required(step, "width", "a number").number());
-    static_cast<void>(required(step, "height", "a number").number());
-    return {};
+    return LayoutArguments{
+        {.width = requiredLength(step, "width"), .height = requiredLength(step, "height")}};
 }
 
 Arguments tapButton(const JsonReader& step) {
     step.allowOnly({"do", "title"});
-    static_cast<void>(requiredString(step, "title", "a button's title"));
-    return {};
+    return TitleArgument{requiredString(step, "title", "a button's title")};
 }
 
 Arguments alert(const JsonReader& step) {
     step.allowOnly({"do", "choose"});
-    static_cast<void>(requiredString(step, "choose", "an action's title"));
-    return {};
+    return TitleArgument{requiredString(step, "choose", "an action's title")};
 }
+
+// This one is checked only: nothing in this version uses it.
 
 Arguments share(const JsonReader& step) {
     step.allowOnly({"do", "outcome"});

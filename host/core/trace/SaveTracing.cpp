@@ -5,13 +5,20 @@
 
 namespace nimbra::host {
 
-void traceSaveStart(Trace& trace, const char* operation, const Account& account) {
-    trace.write(
-        "save",
-        {{"phase", "start"}, {"account", account.identifier().string()}, {"op", operation}});
+namespace {
+
+nlohmann::ordered_json identifierOf(const std::shared_ptr<Account>& account) {
+    return account ? nlohmann::ordered_json(account->identifier().string()) : nullptr;
 }
 
-void traceSaveEnd(Trace& trace, const char* operation, const Account& account,
+} // namespace
+
+void traceSaveStart(Trace& trace, const char* operation, const std::shared_ptr<Account>& account) {
+    trace.write("save",
+                {{"phase", "start"}, {"account", identifierOf(account)}, {"op", operation}});
+}
+
+void traceSaveEnd(Trace& trace, const char* operation, const std::shared_ptr<Account>& account,
                   const std::expected<void, Error>& saved) {
     nlohmann::ordered_json error;
     if (!saved) {
@@ -20,7 +27,7 @@ void traceSaveEnd(Trace& trace, const char* operation, const Account& account,
                  {"description", saved.error().description}};
     }
     trace.write("save", {{"phase", "end"},
-                         {"account", account.identifier().string()},
+                         {"account", identifierOf(account)},
                          {"op", operation},
                          {"success", saved.has_value()},
                          {"error", std::move(error)}});

@@ -1,12 +1,29 @@
 #include "host/core/trace/SessionTracer.h"
 
+#include "host/core/RowDescription.h"
 #include "host/core/trace/Trace.h"
 #include "platform/host/SettingsListController.h"
+#include "platform/views/ViewAnimations.h"
 
 #include <string>
 #include <utility>
 
 namespace nimbra::host {
+
+namespace {
+
+void traceAnimation(const ViewAnimation& animation, Trace& trace) {
+    auto changes = nlohmann::ordered_json::array();
+    for (const ViewAnimation::Change& change : animation.changes) {
+        changes.push_back(nlohmann::ordered_json{{"view", change.view->accessibilityIdentifier()},
+                                                 {"alpha", change.alpha}});
+    }
+    trace.write("animation", {{"name", jsonOf(animation.name)},
+                              {"duration", animation.duration.count()},
+                              {"changes", std::move(changes)}});
+}
+
+} // namespace
 
 SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
     : _services(services), _trace(trace), _presenter(services.presenter, trace),
@@ -17,12 +34,17 @@ SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
       _privacyConsentStore(services.privacyConsentStore, trace),
       _appTerminator(services.appTerminator, trace), _systemLog(trace),
       _distributedNotificationCenter(services.distributedNotificationCenter, trace),
-      _progressReports(services.progressReports, trace), _table(trace), _parent(trace),
+      _progressReports(services.progressReports, trace),
+      _deviceListRequests(services.deviceListRequests, trace), _table(trace), _parent(trace),
       _earlierSyslogSink(replaceSyslogSink([&trace](int priority, const std::string& message) {
           trace.write("syslog", {{"priority", priority}, {"message", message}});
-      })) {}
+      })) {
+    services.viewAnimations->setObserver(
+        [&trace](const ViewAnimation& animation) { traceAnimation(animation, trace); });
+}
 
 SessionTracer::~SessionTracer() {
+    _services.viewAnimations->setObserver({});
     replaceSyslogSink(std::move(_earlierSyslogSink));
 }
 
@@ -38,6 +60,7 @@ PlatformServices SessionTracer::services() {
     services.workQueues = _workQueues;
     services.distributedNotificationCenter = _distributedNotificationCenter;
     services.progressReports = _progressReports;
+    services.deviceListRequests = _deviceListRequests;
     return services;
 }
 
@@ -46,7 +69,7 @@ std::shared_ptr<Account> SessionTracer::traced(std::shared_ptr<Account> account)
 }
 
 void SessionTracer::observeRefreshControl(SettingsListController& pane) {
-    if (const auto& control = pane.table().refreshControl()) {
+    if (const auto& control = pane.table()->refreshControl()) {
         control->setEndObserver(
             [&trace = _trace] { trace.write("refreshControl", {{"op", "endRefreshing"}}); });
     }

@@ -4,6 +4,7 @@
 #include "host/core/trace/TableTracer.h"
 #include "host/core/trace/TracingAccountStore.h"
 #include "host/core/trace/TracingAppTerminator.h"
+#include "host/core/trace/TracingDeviceListRequests.h"
 #include "host/core/trace/TracingDistributedNotificationCenter.h"
 #include "host/core/trace/TracingDocumentContainers.h"
 #include "host/core/trace/TracingNotificationCenter.h"
@@ -62,6 +63,7 @@ private:
     TracingSystemLog _systemLog;
     TracingDistributedNotificationCenter _distributedNotificationCenter;
     TracingProgressReports _progressReports;
+    TracingDeviceListRequests _deviceListRequests;
     TableTracer _table;
     ParentTracer _parent;
     SyslogSink _earlierSyslogSink;

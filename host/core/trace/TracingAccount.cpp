@@ -31,6 +31,13 @@ bool TracingAccount::vt_isUsingStratafile() const {
     return _account->vt_isUsingStratafile();
 }
 
+void TracingAccount::vt_setUsesStratafile(bool usesStratafile) {
+    _trace.write("account", {{"op", "vt_setUsesStratafile:"},
+                             {"account", identifier().string()},
+                             {"value", usesStratafile}});
+    _account->vt_setUsesStratafile(usesStratafile);
+}
+
 bool TracingAccount::vt_useCellularForDataclass(const Dataclass& dataclass) const {
     return _account->vt_useCellularForDataclass(dataclass);
 }

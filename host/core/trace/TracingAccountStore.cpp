@@ -17,14 +17,28 @@ TracingAccountStore::accountWithIdentifier(const AccountIdentifier& identifier) 
 
 void TracingAccountStore::saveVerifiedAccountWithCompletionHandler(
     const std::shared_ptr<Account>& account, SaveCompletion completion) {
-    static constexpr auto operation = "saveVerifiedAccount:withCompletionHandler:";
-    traceSaveStart(_trace, operation, *account);
-    _store.saveVerifiedAccountWithCompletionHandler(
-        TracingAccount::original(account),
-        [&trace = _trace, account, completion = std::move(completion)](const auto& saved) {
-            traceSaveEnd(trace, operation, *account, saved);
-            completion(saved);
-        });
+    SaveCompletion traced =
+        traceSave("saveVerifiedAccount:withCompletionHandler:", account, std::move(completion));
+    _store.saveVerifiedAccountWithCompletionHandler(TracingAccount::original(account),
+                                                    std::move(traced));
+}
+
+void TracingAccountStore::saveAccount(const std::shared_ptr<Account>& account,
+                                      SaveOptions options) {
+    options.completion = traceSave("saveAccount:withDataclassActions:doVerify:completion:", account,
+                                   std::move(options.completion));
+    _store.saveAccount(TracingAccount::original(account), std::move(options));
+}
+
+AccountStore::SaveCompletion TracingAccountStore::traceSave(const char* operation,
+                                                            const std::shared_ptr<Account>& account,
+                                                            SaveCompletion completion) const {
+    traceSaveStart(_trace, operation, account);
+    return [&trace = _trace, operation, account,
+            completion = std::move(completion)](const std::expected<void, Error>& saved) {
+        traceSaveEnd(trace, operation, account, saved);
+        completion(saved);
+    };
 }
 
 std::shared_ptr<AccountOperationsHelper> TracingAccountStore::operationsHelperWithDelegate(

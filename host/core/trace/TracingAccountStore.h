@@ -19,6 +19,7 @@ public:
 
     void saveVerifiedAccountWithCompletionHandler(const std::shared_ptr<Account>& account,
                                                   SaveCompletion completion) override;
+    void saveAccount(const std::shared_ptr<Account>& account, SaveOptions options) override;
     [[nodiscard]] std::shared_ptr<AccountOperationsHelper>
     operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) override;
 
@@ -26,6 +27,11 @@ public:
     [[nodiscard]] std::shared_ptr<Account> traced(std::shared_ptr<Account> account) const;
 
 private:
+    /// Traces the start of a save, and makes of `completion` one that traces its end.
+    [[nodiscard]] SaveCompletion traceSave(const char* operation,
+                                           const std::shared_ptr<Account>& account,
+                                           SaveCompletion completion) const;
+
     AccountStore& _store;
     Trace& _trace;
 };

@@ -28,7 +28,7 @@ TracingOperationsHelper::TracingOperationsHelper(
 
 void TracingOperationsHelper::saveAccountRequireVerification(
     const std::shared_ptr<Account>& account, bool requireVerification) {
-    traceSaveStart(_trace, operation, *account);
+    traceSaveStart(_trace, operation, account);
     _helper->saveAccountRequireVerification(TracingAccount::original(account), requireVerification);
 }
 
@@ -44,7 +44,7 @@ void TracingOperationsHelper::operationsHelperWillSaveAccount(
 void TracingOperationsHelper::operationsHelperDidSaveAccountWithSuccessError(
     AccountOperationsHelper& /*helper*/, const std::shared_ptr<Account>& account,
     const std::expected<void, Error>& saved) {
-    traceSaveEnd(_trace, operation, *account, saved);
+    traceSaveEnd(_trace, operation, account, saved);
     if (const auto delegate = std::exchange(_told, nullptr)) {
         delegate->operationsHelperDidSaveAccountWithSuccessError(
             *this, std::make_shared<TracingAccount>(account, _trace), saved);

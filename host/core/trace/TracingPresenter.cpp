@@ -2,8 +2,23 @@
 
 #include "host/core/RowDescription.h"
 #include "host/core/trace/Trace.h"
+#include "platform/host/AccountAlertView.h"
+#include "platform/host/AlertController.h"
+#include "platform/host/SettingsListController.h"
+#include "platform/host/SetupController.h"
+
+#include <utility>
 
 namespace nimbra::host {
+
+namespace {
+
+nlohmann::ordered_json actionJson(const Text& title, AlertActionStyle style) {
+    return {{"title", jsonOf(title)},
+            {"style", style == AlertActionStyle::cancel ? "cancel" : "default"}};
+}
+
+} // namespace
 
 void TracingPresenter::showActivityInProgress(const Text& message) {
     _trace.write("busy", {{"shown", true}, {"message", jsonOf(message)}});
@@ -25,14 +40,49 @@ void TracingPresenter::reloadAllParentSpecifiers() {
     _presenter.reloadAllParentSpecifiers();
 }
 
+void TracingPresenter::presentController(const std::shared_ptr<SetupController>& controller,
+                                         bool animated) {
+    _presented = controller->rootViewController();
+    _trace.write("present", {{"what", "upgrade"},
+                             {"animated", animated},
+                             {"style", static_cast<int>(controller->modalPresentationStyle())}});
+    _presenter.presentController(controller, animated);
+}
+
 void TracingPresenter::dismissPresentedController(bool animated) {
-    // Nothing can be presented over a pane, so there is nothing that the trace could name.
+    _trace.write("dismiss", {{"what", "upgrade"}, {"animated", animated}});
     _presenter.dismissPresentedController(animated);
 }
 
-void TracingPresenter::dismissPane(bool animated) {
-    _trace.write("dismiss", {{"what", "pane"}, {"animated", animated}});
-    _presenter.dismissPane(animated);
+void TracingPresenter::dismissController(const ViewController& controller, bool animated) {
+    _trace.write("dismiss", {{"what", &controller == _presented.lock().get() ? "upgrade" : "pane"},
+                             {"animated", animated}});
+    _presenter.dismissController(controller, animated);
+}
+
+void TracingPresenter::presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) {
+    auto actions = nlohmann::ordered_json::array();
+    for (const AlertAction& action : alert->actions()) {
+        actions.push_back(actionJson(action.title, action.style));
+    }
+    _trace.write("present", {{"what", "alert"},
+                             {"animated", animated},
+                             {"title", jsonOf(alert->title())},
+                             {"message", jsonOf(alert->message())},
+                             {"actions", std::move(actions)}});
+    _presenter.presentAlert(alert, animated);
+}
+
+void TracingPresenter::showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) {
+    // Such an alert always comes with an animation.
+    _trace.write("present",
+                 {{"what", "accountAlert"},
+                  {"animated", true},
+                  {"title", jsonOf(alert->title())},
+                  {"message", jsonOf(alert->content().message)},
+                  {"actions", nlohmann::ordered_json::array({actionJson(
+                                  alert->content().buttonTitle, AlertActionStyle::standard)})}});
+    _presenter.showAccountAlert(alert);
 }
 
 } // namespace nimbra::host

@@ -17,11 +17,17 @@ public:
     void reloadParentSpecifier() override;
     void reloadAllParentSpecifiers() override;
     void dismissPresentedController(bool animated) override;
-    void dismissPane(bool animated) override;
+    void presentController(const std::shared_ptr<SetupController>& controller,
+                           bool animated) override;
+    void dismissController(const ViewController& controller, bool animated) override;
+    void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) override;
+    void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) override;
 
 private:
     Presenter& _presenter;
     Trace& _trace;
+    /// What was presented last, to know it again.
+    std::weak_ptr<const ViewController> _presented;
 };
 
 } // namespace nimbra::host

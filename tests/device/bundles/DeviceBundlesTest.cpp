@@ -1,9 +1,27 @@
+#include "platform/host/SettingsListController.h"
 #include "tests/device/bundles/TestBundles.h"
+#include "tests/support/TestPlatform.h"
+
+#include <typeinfo>
 
 namespace nimbra::device {
 namespace {
 
-using DeviceBundlesTest = BundlesFixture;
+class DeviceBundlesTest : public BundlesFixture {
+protected:
+    /// An object of the class that the shared object of `bundle` has registered.
+    [[nodiscard]] std::shared_ptr<SettingsListController> objectOf(const DeviceBundle& bundle) {
+        return bundle.principalClass().create(_platform.services());
+    }
+    /// The bundle of that class.
+    [[nodiscard]] std::shared_ptr<Bundle> bundleOfClassIn(const DeviceBundle& bundle) {
+        const auto object = objectOf(bundle);
+        return bundles().bundleForClass(typeid(*object));
+    }
+
+private:
+    test::TestPlatform _platform;
+};
 
 TEST_F(DeviceBundlesTest, ALoadedBundleIsFoundByItsIdentifier) {
     makeBundle(folder());
@@ -31,7 +49,7 @@ TEST_F(DeviceBundlesTest, AnotherPlatformOfTheProcessLoadsTheSameFolderForItself
     makeBundle(folder());
     const auto bundle = load();
     ClassRegistry otherClasses;
-    DeviceBundles others(settings(), otherClasses);
+    DeviceBundles others(settings(), otherClasses, log());
 
     const auto other = others.load(folder());
 
@@ -50,6 +68,60 @@ TEST_F(DeviceBundlesTest, ABundleCanBeHiddenFromTheLookup) {
 
     bundles().setFindable(identifier, true);
     EXPECT_EQ(bundles().bundleWithIdentifier(identifier), bundle);
+}
+
+TEST_F(DeviceBundlesTest, AClassBelongsToTheBundleWhoseObjectHoldsIt) {
+    makeBundle(folder());
+    const auto second = folder().parent_path() / "B.bundle";
+    makeBundle(second, "test-object-second", "com.example.b", "SecondController");
+
+    const auto bundle = load();
+    const auto other = bundles().load(second);
+
+    ASSERT_TRUE(other) << other.error();
+    EXPECT_EQ(bundleOfClassIn(*bundle), bundle);
+    EXPECT_EQ(bundleOfClassIn(**other), *other);
+}
+
+TEST_F(DeviceBundlesTest, AClassFindsABundleThatIsHiddenFromTheLookup) {
+    makeBundle(folder());
+    bundles().setFindable(BundleIdentifier("com.example.a"), false);
+
+    const auto bundle = load();
+
+    EXPECT_EQ(bundleOfClassIn(*bundle), bundle);
+}
+
+TEST_F(DeviceBundlesTest, AClassFindsABundleThatWasLoadedOnAnotherWay) {
+    makeBundle(folder());
+    const auto link = folder().parent_path() / "link";
+    std::filesystem::create_directory_symlink(folder(), link);
+    const auto before = std::filesystem::current_path();
+
+    const auto linked = bundles().load(link);
+    ASSERT_TRUE(linked) << linked.error();
+    EXPECT_EQ(bundleOfClassIn(**linked), *linked);
+
+    const auto second = folder().parent_path() / "B.bundle";
+    makeBundle(second, "test-object-second", "com.example.b", "SecondController");
+    std::filesystem::current_path(folder().parent_path());
+    const auto relative = bundles().load("B.bundle");
+    std::filesystem::current_path(before);
+    ASSERT_TRUE(relative) << relative.error();
+    EXPECT_EQ(bundleOfClassIn(**relative), *relative);
+}
+
+TEST_F(DeviceBundlesTest, AClassOfNoLoadedBundleHasNone) {
+    makeBundle(folder());
+    const auto bundle = load();
+    ClassRegistry otherClasses;
+    const DeviceBundles others(settings(), otherClasses, log());
+    const auto object = objectOf(*bundle);
+
+    EXPECT_EQ(bundles().bundleForClass(typeid(DeviceBundles)), nullptr);
+    EXPECT_EQ(bundles().bundleForClass(typeid(SettingsListController)), nullptr);
+    EXPECT_EQ(bundles().bundleForClass(typeid(int)), nullptr);
+    EXPECT_EQ(others.bundleForClass(typeid(*object)), nullptr);
 }
 
 TEST_F(DeviceBundlesTest, WhatIsNoFolderIsNoBundle) {

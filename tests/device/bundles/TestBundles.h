@@ -4,6 +4,7 @@
 #include "device/bundles/DeviceBundles.h"
 #include "device/system/DeviceSettings.h"
 #include "platform/system/ClassRegistry.h"
+#include "tests/device/RecordingLog.h"
 #include "tests/device/TestFiles.h"
 #include "tests/support/TemporaryDirectory.h"
 
@@ -22,15 +23,18 @@ protected:
     [[nodiscard]] DeviceSettings& settings() { return _settings; }
     [[nodiscard]] DeviceBundles& bundles() { return _bundles; }
     [[nodiscard]] ClassRegistry& classes() { return _classes; }
+    /// What the log was told.
+    [[nodiscard]] test::RecordingLog& log() { return _log; }
 
     /// A whole bundle in `folder`, whose shared object is the test's `object`.
     static void makeBundle(const std::filesystem::path& folder,
                            const std::string& object = "test-object-first",
-                           const std::string& identifier = "com.example.a") {
+                           const std::string& identifier = "com.example.a",
+                           const std::string& principalClass = "FirstController") {
         test::writeTestFile(folder / "manifest.json",
                             R"({"identifier": ")" + identifier +
-                                R"(", "executable": "A.so", "principalClass": "FirstController",
-                                    "developmentLanguage": "en"})");
+                                R"(", "executable": "A.so", "principalClass": ")" + principalClass +
+                                R"(", "developmentLanguage": "en"})");
         std::filesystem::copy_file(std::filesystem::path(NIMBRA_TEST_OBJECTS) / (object + ".so"),
                                    folder / "A.so",
                                    std::filesystem::copy_options::overwrite_existing);
@@ -61,7 +65,8 @@ private:
     test::TemporaryDirectory _directory;
     DeviceSettings _settings;
     ClassRegistry _classes;
-    DeviceBundles _bundles{_settings, _classes};
+    test::RecordingLog _log;
+    DeviceBundles _bundles{_settings, _classes, _log};
 };
 
 } // namespace nimbra::device

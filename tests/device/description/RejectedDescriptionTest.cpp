@@ -160,12 +160,26 @@ INSTANTIATE_TEST_SUITE_P(
                   R"(found "a")"}));
 
 INSTANTIATE_TEST_SUITE_P(
-    LaterParts, RejectedDescriptionTest,
+    DeviceList, RejectedDescriptionTest,
     testing::Values(
         std::pair{R"({"deviceList": "always"})",
                   R"(/deviceList: expected an object, null or "never", found "always")"},
         std::pair{R"({"deviceList": {"incompatible": [1]}})",
                   "/deviceList/incompatible/0: expected a string, found 1"},
+        std::pair{R"({"deviceList": []})",
+                  R"(/deviceList: expected an object, null or "never", found [])"},
+        std::pair{R"({"deviceList": {"needUpgrade": "a"}})",
+                  R"(/deviceList/needUpgrade: expected an array, found "a")"},
+        std::pair{R"({"deviceList": {"needUpgrade": [null]}})",
+                  "/deviceList/needUpgrade/0: expected a string, found null"},
+        std::pair{R"({"deviceList": {"outcome": "fails"}})",
+                  "/deviceList/outcome: unknown key; expected one of incompatible, needUpgrade"},
+        std::pair{R"({"deviceList": {"delay": 1}})",
+                  "/deviceList/delay: unknown key; expected one of incompatible, needUpgrade"}));
+
+INSTANTIATE_TEST_SUITE_P(
+    LaterParts, RejectedDescriptionTest,
+    testing::Values(
         std::pair{R"({"databaseSettings": 3})",
                   "/databaseSettings: expected an object or null, found 3"},
         std::pair{R"({"databaseSettings": {"numAppGroups": "many"}})",

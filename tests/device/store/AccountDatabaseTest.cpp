@@ -142,6 +142,37 @@ TEST_F(AccountDatabaseTest, ReplacedAccountsTakeTheirDataclassesWithThem) {
     EXPECT_EQ(database.execAndGet("SELECT count(*) FROM account_dataclasses").getInt(), 0);
 }
 
+TEST_F(AccountDatabaseTest, WhichDocumentStorageAnAccountUsesIsWrittenOnlyWhereItChanged) {
+    create({{.identifier = "a"}, {.identifier = "b", .usesStratafile = true}});
+    AccountDatabase database = open();
+    const auto uses = [&database](const char* identifier) {
+        return database.account(AccountIdentifier(identifier)).value()->usesStratafile;
+    };
+
+    ASSERT_TRUE(database.writeChanges(AccountIdentifier("a"), {.usesStratafile = true}));
+    EXPECT_TRUE(uses("a"));
+    ASSERT_TRUE(database.writeChanges(AccountIdentifier("b"), {.usesStratafile = false}));
+    EXPECT_FALSE(uses("b"));
+    ASSERT_TRUE(database.writeChanges(AccountIdentifier("a"),
+                                      {.enabled = {{kAccountDataclassTidewater, true}}}));
+    EXPECT_TRUE(uses("a"));
+    EXPECT_FALSE(uses("b"));
+}
+
+TEST_F(AccountDatabaseTest, ChangesThatCannotAllBeWrittenLeaveTheOldState) {
+    create({{.identifier = "a"}});
+    AccountDatabase database = open();
+    execute("CREATE TRIGGER refusal BEFORE INSERT ON account_dataclasses "
+            "BEGIN SELECT RAISE(ABORT, 'refused'); END");
+
+    const auto written = database.writeChanges(
+        AccountIdentifier("a"),
+        {.usesStratafile = true, .enabled = {{kAccountDataclassTidewater, true}}});
+
+    EXPECT_FALSE(written);
+    EXPECT_FALSE(database.account(AccountIdentifier("a")).value()->usesStratafile);
+}
+
 TEST_F(AccountDatabaseTest, ChangesOfAnotherProcessAreSeen) {
     create({{.identifier = "a"}});
     AccountDatabase database = open();

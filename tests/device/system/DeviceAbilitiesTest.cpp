@@ -58,6 +58,32 @@ TEST_F(DeviceAbilitiesTest, AVariantsNameIsPutBehindTheKey) {
     EXPECT_EQ(DeviceAbilities(made).VariantStringKeyForKey("KEY"), Text("KEY_WLAN"));
 }
 
+TEST_F(DeviceAbilitiesTest, TheIdiomIsThatOfTheDevicesFile) {
+    const DeviceSettings phone = settings();
+    EXPECT_EQ(DeviceAbilities(phone).userInterfaceIdiom(), UserInterfaceIdiom::phone);
+
+    description.idiom = "pad";
+    ASSERT_TRUE(changeDeviceDirectory(root(), {description, {"idiom"}}));
+    auto pad = DeviceSettings::open(root());
+    ASSERT_TRUE(pad);
+    EXPECT_EQ(DeviceAbilities(*pad).userInterfaceIdiom(), UserInterfaceIdiom::pad);
+}
+
+TEST_F(DeviceAbilitiesTest, TheMainScreenIsThatOfTheDevicesFile) {
+    description.screen = {.width = 820, .height = 1180.5, .scale = 3};
+    const DeviceSettings made = settings();
+
+    EXPECT_EQ(DeviceAbilities(made).mainScreen(),
+              (Screen{.bounds = {.origin = {}, .size = {820, 1180.5}}, .scale = 3}));
+}
+
+TEST_F(DeviceAbilitiesTest, ADeviceMayHaveNoMainScreen) {
+    description.screen = std::nullopt;
+    const DeviceSettings made = settings();
+
+    EXPECT_EQ(DeviceAbilities(made).mainScreen(), std::nullopt);
+}
+
 TEST_F(DeviceAbilitiesTest, RestrictionsFollowAChangeOfTheDevice) {
     static_cast<void>(settings());
     const DeviceRestrictions restrictions(DevicePaths(root()), log);

@@ -38,6 +38,9 @@ TEST_F(DeviceSettingsTest, WhatTheFileLeavesOutHasItsDefault) {
     ASSERT_TRUE(settings) << settings.error();
     EXPECT_EQ(settings->localeIdentifier(), "en-US");
     EXPECT_EQ(settings->timeZone(), "UTC");
+    EXPECT_EQ(settings->userInterfaceIdiom(), UserInterfaceIdiom::phone);
+    EXPECT_EQ(settings->mainScreen(),
+              (Screen{.bounds = {.origin = {}, .size = {390, 844}}, .scale = 2}));
 }
 
 TEST_F(DeviceSettingsTest, AChangeOfTheFileShowsAfterReloading) {
@@ -49,6 +52,29 @@ TEST_F(DeviceSettingsTest, AChangeOfTheFileShowsAfterReloading) {
     ASSERT_TRUE(settings->reload());
 
     EXPECT_EQ(settings->localeIdentifier(), "fr");
+}
+
+TEST_F(DeviceSettingsTest, AnotherKindOfDeviceAndScreenShowAfterReloading) {
+    write(R"({"idiom": "pad", "screen": {"width": 820, "height": 1180}})");
+    auto settings = DeviceSettings::open(root());
+    const Screen large{.bounds = {.origin = {}, .size = {820, 1180}}, .scale = 2};
+    write(R"({"screen": null})");
+    EXPECT_EQ(settings->userInterfaceIdiom(), UserInterfaceIdiom::pad);
+    EXPECT_EQ(settings->mainScreen(), large);
+
+    ASSERT_TRUE(settings->reload());
+    EXPECT_EQ(settings->userInterfaceIdiom(), UserInterfaceIdiom::phone);
+    EXPECT_EQ(settings->mainScreen(), std::nullopt);
+
+    write(R"({"screen": {"scale": 1.5}})");
+    ASSERT_TRUE(settings->reload());
+    EXPECT_EQ(settings->mainScreen(),
+              (Screen{.bounds = {.origin = {}, .size = {390, 844}}, .scale = 1.5}));
+
+    write(R"({"idiom": "watch", "screen": null})");
+    EXPECT_FALSE(settings->reload());
+    EXPECT_EQ(settings->userInterfaceIdiom(), UserInterfaceIdiom::phone);
+    EXPECT_TRUE(settings->mainScreen());
 }
 
 TEST_F(DeviceSettingsTest, AReloadThatFailsChangesNothing) {

@@ -2,18 +2,22 @@
 
 #include <gtest/gtest.h>
 #include <limits>
+#include <string>
 
 namespace nimbra::host {
 namespace {
 
 constexpr double kUnlimited = std::numeric_limits<double>::infinity();
+constexpr double kNoNumber = std::numeric_limits<double>::quiet_NaN();
 
 struct FixedViewMetricsTest : testing::Test {
     FixedViewMetrics metrics;
     Font caption = metrics.preferredFontForTextStyle(FontTextStyleCaption1);
 
     [[nodiscard]] Size sizeOf(const Text& text, double width, int numberOfLines = 0) const {
-        return metrics.sizeOfText(text, caption, width, numberOfLines);
+        return metrics.sizeOfText(AttributedString(text, {.FontAttributeName = caption,
+                                                          .ParagraphStyleAttributeName = {}}),
+                                  width, numberOfLines);
     }
 };
 
@@ -25,6 +29,8 @@ TEST_F(FixedViewMetricsTest, TheFontsAndControlsAreFixed) {
     EXPECT_EQ(metrics.lineHeight(body), 20.4);
     EXPECT_EQ(metrics.lineHeight(caption), 14.4);
     EXPECT_EQ(metrics.progressBarHeight(), 4);
+    EXPECT_EQ(metrics.activityIndicatorSize(), (Size{20, 20}));
+    EXPECT_EQ(metrics.sizeOfButtonAround({50, 22.5}), (Size{50, 34.5}));
 }
 
 TEST_F(FixedViewMetricsTest, EveryCodePointIsHalfAsWideAsTheFontIsLarge) {
@@ -53,6 +59,8 @@ TEST_F(FixedViewMetricsTest, AWordThatIsTooLongStandsAlone) {
     EXPECT_EQ(sizeOf("a wonderful day", 24), (Size{54, 43.2}));
     EXPECT_EQ(sizeOf("a wonderful day", 0), (Size{54, 43.2}));
     EXPECT_EQ(sizeOf("a wonderful day", -5), (Size{54, 43.2}));
+    EXPECT_EQ(sizeOf("a wonderful day", -kUnlimited), (Size{54, 43.2}));
+    EXPECT_EQ(sizeOf("a wonderful day", kNoNumber), (Size{54, 43.2}));
 }
 
 TEST_F(FixedViewMetricsTest, BlanksThatPassTheEdgeAreDropped) {
@@ -61,9 +69,26 @@ TEST_F(FixedViewMetricsTest, BlanksThatPassTheEdgeAreDropped) {
     EXPECT_EQ(sizeOf("one   two", 18), (Size{18, 28.8}));
 }
 
+TEST_F(FixedViewMetricsTest, TheSmallRoundingOfALayoutBreaksNoLine) {
+    EXPECT_EQ(sizeOf("one two six", 42 - 1e-6), (Size{42, 28.8}));
+    EXPECT_EQ(sizeOf("one two six", 42 - 1e-4), (Size{18, 43.2}));
+}
+
+TEST_F(FixedViewMetricsTest, BytesThatBelongToNoCharacterTakeNoRoom) {
+    EXPECT_EQ(sizeOf("one \x80", 18), (Size{18, 14.4}));
+    EXPECT_EQ(sizeOf("\x80", kUnlimited), (Size{0, 14.4}));
+}
+
 TEST_F(FixedViewMetricsTest, LinesBeyondTheNumberAreLeftOut) {
     EXPECT_EQ(sizeOf("one two three", 20, 2), (Size{18, 28.8}));
     EXPECT_EQ(sizeOf("one two three", 20, 5), (Size{30, 43.2}));
+    EXPECT_EQ(sizeOf("one two three", 20, -1), (Size{30, 43.2}));
+}
+
+TEST_F(FixedViewMetricsTest, ALineFeedAtTheEndBeginsAnotherLine) {
+    EXPECT_EQ(sizeOf("one\n", kUnlimited), (Size{18, 28.8}));
+    EXPECT_EQ(sizeOf("\n", kUnlimited), (Size{0, 28.8}));
+    EXPECT_EQ(sizeOf("\n\none", kUnlimited), (Size{18, 43.2}));
 }
 
 } // namespace

@@ -1,10 +1,7 @@
 #include "host/core/AccountPage.h"
-#include "host/core/trace/SessionTracer.h"
-#include "host/core/trace/Trace.h"
 #include "platform/host/SettingsListController.h"
 #include "platform/system/ClassRegistry.h"
-#include "tests/support/SyslogCapture.h"
-#include "tests/support/TestPlatform.h"
+#include "tests/host/core/TracersFixture.h"
 
 #include <gtest/gtest.h>
 #include <string>
@@ -12,29 +9,6 @@
 
 namespace nimbra::host {
 namespace {
-
-using Lines = std::vector<std::string>;
-
-class Tracers : public testing::Test {
-protected:
-    /// What was traced since the last call, without the queue, which is the same everywhere.
-    Lines takeLines() {
-        Lines lines;
-        for (std::string line : std::exchange(_lines, {})) {
-            const std::string queue = R"("queue":"other",)";
-            line.erase(line.find(queue), queue.size());
-            lines.push_back(line);
-        }
-        return lines;
-    }
-
-    test::SyslogCapture _syslog;
-    test::TestPlatform _platform;
-    Lines _lines;
-    Trace _trace{[this](const std::string& line) { _lines.push_back(line); }};
-    SessionTracer _tracer{_platform.services(), _trace};
-    PlatformServices _services = _tracer.services();
-};
 
 TEST_F(Tracers, TellWhichAccountIsFetchedAndWhatIsChangedOnIt) {
     _platform.accountStore.stored.usesStratafile = false;
@@ -213,14 +187,6 @@ TEST_F(Tracers, TellOfConsentAndTerminationBeforeTheyHappen) {
                                       "terminate notes for 3, not reported"}));
 }
 
-TEST_F(Tracers, TellThatThePaneIsDismissedButNotWhereThereIsNothingToDismiss) {
-    _services.presenter->dismissPresentedController(true);
-    _services.presenter->dismissPane(false);
-
-    EXPECT_EQ(_platform.calls, (Lines{"dismiss presented, animated", "dismiss pane"}));
-    EXPECT_EQ(takeLines(), Lines{R"({"event":"dismiss","what":"pane","animated":false})"});
-}
-
 TEST_F(Tracers, TellThatTheParentIsBuiltAnew) {
     const ControllerClass paneClass{.name = "Pane", .create = {}};
     const auto page = std::make_shared<AccountPage>(_services, "Drive", paneClass, UserInfo());
@@ -265,7 +231,7 @@ TEST_F(Tracers, TellThatARefreshHasEnded) {
     const auto page = std::make_shared<AccountPage>(_services, "Drive", paneClass, UserInfo());
     _tracer.observeRefreshControl(*page);
     const auto control = std::make_shared<RefreshControl>();
-    page->table().setRefreshControl(control);
+    page->table()->setRefreshControl(control);
     _tracer.observeRefreshControl(*page);
 
     control->endRefreshing();

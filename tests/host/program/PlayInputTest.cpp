@@ -119,7 +119,6 @@ TEST(ScenarioInput, KeysWithoutEffectAreNamedOnceEach) {
 
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.messages,
-              "settingsctl: note: /device/deviceList has no effect in this version\n"
               "settingsctl: note: /device/tool has no effect in this version\n"
               "settingsctl: note: /steps/1/device/databaseSettings has no effect in this "
               "version\n");

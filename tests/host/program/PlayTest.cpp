@@ -141,8 +141,6 @@ TEST(Play, APaneThatIsOpenIsNotOpenedAgain) {
 
 TEST(Play, WhatThisVersionLacksIsSaidInOneLine) {
     const std::vector<std::string> steps{
-        R"({"do": "layout", "width": 10, "height": 10})", R"({"do": "views"})",
-        R"({"do": "tapButton", "title": "a"})",           R"({"do": "alert", "choose": "a"})",
         R"({"do": "share", "outcome": "sent"})",
     };
     for (const std::string& step : steps) {

@@ -1,0 +1,31 @@
+#pragma once
+
+#include <memory>
+
+namespace nimbra {
+
+/// A page, or what holds a page, as the one that it leads to knows it. Main queue only, but for its
+/// release.
+class Controller {
+public:
+    Controller() = default;
+    Controller(const Controller&) = delete;
+    Controller& operator=(const Controller&) = delete;
+    virtual ~Controller() = default;
+
+    /// Builds anew the rows from which one came here.
+    virtual void reloadSpecifiers() = 0;
+
+    /// What led here, held weakly; null when there is none or it has gone.
+    [[nodiscard]] std::shared_ptr<Controller> parentController() const {
+        return _parentController.lock();
+    }
+    void setParentController(const std::shared_ptr<Controller>& parent) {
+        _parentController = parent;
+    }
+
+private:
+    std::weak_ptr<Controller> _parentController;
+};
+
+} // namespace nimbra
