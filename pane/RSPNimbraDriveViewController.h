@@ -50,7 +50,7 @@ public:
 protected:
     // Where the rows come from that stand around the master switch.
 
-    /// The row that starts the move to the new document service; null for none.
+    /// The row that starts the move to the new document service.
     [[nodiscard]] virtual std::shared_ptr<Specifier> _createSpecifierForUpgradeButton();
     /// One row an application, unsorted; empty for none.
     [[nodiscard]] virtual SpecifierArray _appSpecifiersForPRVServices();
@@ -102,6 +102,8 @@ private:
 
     [[nodiscard]] RowValue _useCellular(const Specifier& row);
     void _setUseCellularForSpecifier(const RowValue& value, const std::shared_ptr<Specifier>& row);
+
+    void _upgradeButtonWasTapped(const std::shared_ptr<Specifier>& row);
 
     void _refresh(const std::shared_ptr<RefreshControl>& sender);
     [[nodiscard]] std::shared_ptr<ObserverToken>

@@ -110,12 +110,7 @@ void RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndData
     }
 }
 
-// Until the diagnostics, the upgrade and the cloud database have rows of their
-// own, these answer with nothing.
-
-std::shared_ptr<Specifier> RSPNimbraDriveViewController::_createSpecifierForUpgradeButton() {
-    return nullptr;
-}
+// Until diagnostics and the cloud database have rows of their own, these answer with nothing.
 
 std::shared_ptr<Specifier> RSPNimbraDriveViewController::_specifierForTessary() {
     return nullptr;

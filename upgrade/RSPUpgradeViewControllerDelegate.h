@@ -6,13 +6,14 @@ namespace nimbra {
 
 class RSPUpgradeViewController;
 
-/// Is told how the screen that moves an account to the new document service has ended. Exactly one
-/// of the two is called for a screen, on the main queue.
+/// Is told how the screen that moves an account to the new document service has ended: at most one
+/// of the two is called for a screen, on the main queue, and none where the screen ends with the
+/// page that it was opened from.
 class RSPUpgradeViewControllerDelegate {
 public:
     virtual ~RSPUpgradeViewControllerDelegate() = default;
 
-    /// The user left `screen`, or the upgrade failed and the user has seen why.
+    /// The user left `screen`, or the upgrade failed and the user has been told so.
     virtual void
     upgradeViewControllerDidCancel(const std::shared_ptr<RSPUpgradeViewController>& screen) = 0;
     /// The account has moved.

@@ -39,6 +39,8 @@ public:
     }
 
     std::shared_ptr<Specifier> upgrade;
+    /// Whether the upgrade row is the page's own instead.
+    bool makesUpgradeRow = false;
     /// Absent: the rows that the page itself makes of the consent records.
     std::optional<SpecifierArray> apps = SpecifierArray();
     std::shared_ptr<Specifier> tessary;
@@ -50,7 +52,8 @@ public:
 protected:
     std::shared_ptr<Specifier> _createSpecifierForUpgradeButton() override {
         asked.emplace_back("upgrade");
-        return upgrade;
+        return makesUpgradeRow ? RSPNimbraDriveViewController::_createSpecifierForUpgradeButton()
+                               : upgrade;
     }
     std::shared_ptr<Specifier> _specifierForTessary() override {
         asked.emplace_back("tessary");

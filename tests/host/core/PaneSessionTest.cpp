@@ -5,10 +5,12 @@
 #include "device/apps/ProcessRecord.h"
 #include "device/files/Files.h"
 #include "device/json/JsonReader.h"
+#include "device/system/StandingTime.h"
 #include "host/core/RowDescription.h"
 #include "host/core/scenario/RunningApplications.h"
 #include "host/core/trace/Trace.h"
 #include "platform/system/NotificationCenter.h"
+#include "tests/device/TestFiles.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <algorithm>
@@ -51,6 +53,26 @@ protected:
     std::vector<std::string> _lines;
     Trace _trace{[this](const std::string& line) { _lines.push_back(line); }};
 };
+
+TEST_F(PaneSessionTest, AnAnswerThatComesAtTheEndFindsNobody) {
+    makeDevice(R"({"accounts": [{"identifier": "primary", "usesStratafile": false}]})");
+    test::writeTestFile(root() / "var/lib/nimbra/device-list.json", R"({"delay": 1})");
+    const auto time = std::make_shared<device::StandingTime>(Date());
+    auto session = PaneSession::start(
+        {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &_trace, .timeSource = time});
+    ASSERT_TRUE(session);
+    ASSERT_TRUE((*session)->openPane({}));
+    ASSERT_TRUE((*session)->tapRow("Upgrade to Nimbra Drive"));
+    (*session)->settle();
+    ASSERT_EQ(tracedLinesWith(R"("op":"request")"), 1);
+    // The answer falls due while the session ends: what watches the page goes in between.
+    (*session)->setActivityObserver([atTheEnd = std::shared_ptr<void>(nullptr, [&time](void*) {
+                                         time->advanceTo(std::chrono::seconds(2));
+                                     })] {});
+    session->reset();
+
+    EXPECT_EQ(tracedLinesWith(R"("op":"response")"), 0);
+}
 
 constexpr const char* deviceWithContainer = R"({"documents": {
     "identity": "token", "containers": [{"identifier": "com.example.notes", "public": true}]}})";
