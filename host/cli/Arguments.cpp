@@ -132,6 +132,9 @@ private:
 
         CLI::App* tap = add(Command::tap, "tap", "Press a button");
         addRow(tap);
+        tap->add_flag("-y,--yes", _arguments.saysYes, "Answer yes to what the page asks");
+        tap->footer("Where the button opens a screen, it is shown as text, and what it asks is\n"
+                    "asked. Exit status: 1 when it failed or you did not want it.");
 
         add(Command::watch, "watch", "Show the status of the sync as it changes")
             ->footer(

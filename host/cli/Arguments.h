@@ -38,6 +38,8 @@ struct Arguments {
     bool json = false;
     /// get, set, tap.
     std::string row;
+    /// tap: every question is answered with yes.
+    bool saysYes = false;
     /// set: "on" or "off".
     std::string value;
     /// init.

@@ -13,6 +13,7 @@
 #include <histedit.h>
 #include <poll.h>
 #include <system_error>
+#include <termios.h>
 #include <unistd.h>
 #include <utility>
 
@@ -63,7 +64,26 @@ public:
         ::history_end(_history);
     }
 
-    std::optional<std::string> readLine() {
+    std::optional<std::string> readCommand() {
+        auto line = readLine(_configuration.prompt);
+        if (line) {
+            remember(*line);
+        }
+        return line;
+    }
+
+    std::optional<std::string> readAnswer(const std::string& prompt) {
+        _isAnswer = true;
+        // What was typed before the question is no answer to it.
+        ::tcflush(STDIN_FILENO, TCIFLUSH);
+        auto line = readLine(prompt);
+        _isAnswer = false;
+        return line;
+    }
+
+private:
+    std::optional<std::string> readLine(const std::string& prompt) {
+        _prompt = prompt;
         // ^C gives a line up, and does not end the program.
         const Interruption interruption({SIGINT});
         _isInterrupted = false;
@@ -78,11 +98,9 @@ public:
         }
         std::string line(read, static_cast<std::size_t>(length));
         line.erase(line.find_last_not_of("\r\n") + 1);
-        remember(line);
         return line;
     }
 
-private:
     void remember(const std::string& line) {
         if (line.empty()) {
             return;
@@ -99,7 +117,7 @@ private:
         return *static_cast<Library*>(library);
     }
 
-    static char* prompt(EditLine* editor) { return of(editor)._configuration.prompt.data(); }
+    static char* prompt(EditLine* editor) { return of(editor)._prompt.data(); }
 
     static int readCharacterFor(EditLine* editor, wchar_t* character) {
         return of(editor).readCharacter(character);
@@ -171,6 +189,9 @@ private:
     }
 
     unsigned char complete() {
+        if (_isAnswer) {
+            return CC_REFRESH_BEEP;
+        }
         const LineInfo* line = ::el_line(_editor);
         const std::string_view before(line->buffer,
                                       static_cast<std::size_t>(line->cursor - line->buffer));
@@ -201,6 +222,9 @@ private:
     }
 
     Configuration _configuration;
+    /// Of the line that is being read.
+    std::string _prompt;
+    bool _isAnswer = false;
     bool _isInterrupted = false;
     HistEvent _event{};
     History* _history;
@@ -213,7 +237,11 @@ LineEditor::LineEditor(Configuration configuration)
 LineEditor::~LineEditor() = default;
 
 std::optional<std::string> LineEditor::readLine() {
-    return _library->readLine();
+    return _library->readCommand();
+}
+
+std::optional<std::string> LineEditor::readAnswer(const std::string& prompt) {
+    return _library->readAnswer(prompt);
 }
 
 } // namespace nimbra::cli

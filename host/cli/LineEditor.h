@@ -41,6 +41,8 @@ public:
     /// The next line without its end; empty when the user gave it up with ^C, nothing at the end
     /// of the input.
     [[nodiscard]] std::optional<std::string> readLine();
+    /// The same behind another prompt, for an answer: without completion, and not remembered.
+    [[nodiscard]] std::optional<std::string> readAnswer(const std::string& prompt);
 
 private:
     class Library;

@@ -85,11 +85,11 @@ PaneCommands::Outcome PaneCommands::set(std::string_view row, std::string_view v
     return {};
 }
 
-PaneCommands::Outcome PaneCommands::tap(std::string_view row) {
+PaneCommands::Outcome PaneCommands::tap(std::string_view row, const Ask& ask) {
     if (const auto done = _session.tapRow(row); !done) {
         return refused(done.error());
     }
-    return {};
+    return Dialog(_session, _out, Terminal::ofStandardOutput(), ask).lead();
 }
 
 std::string PaneCommands::takeChanges() {

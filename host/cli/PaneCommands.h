@@ -1,5 +1,6 @@
 #pragma once
 
+#include "host/cli/Dialog.h"
 #include "host/cli/Failure.h"
 #include "host/cli/ListText.h"
 #include "host/core/RowDescription.h"
@@ -29,7 +30,8 @@ public:
     [[nodiscard]] Outcome listAsJson() const;
     [[nodiscard]] Outcome get(std::string_view row) const;
     [[nodiscard]] Outcome set(std::string_view row, std::string_view value);
-    [[nodiscard]] Outcome tap(std::string_view row);
+    /// Taps the row, and goes through what it opens over the page with the user's answers.
+    [[nodiscard]] Outcome tap(std::string_view row, const Ask& ask);
 
     /// How the rows differ now from how they were when the commands were made, or when this was
     /// asked last: a row a line, empty where nothing is different. The page may have closed.

@@ -53,7 +53,7 @@ const std::vector<Shell::Command>& Shell::commands() {
         {"list", Arguments::json, "list [--json]", "show the rows", &Shell::list},
         {"get", Arguments::row, "get ROW", "print a row's value", &Shell::get},
         {"set", Arguments::rowAndValue, "set ROW on|off", "turn a switch on or off", &Shell::set},
-        {"tap", Arguments::row, "tap ROW", "press a button", &Shell::tap},
+        {"tap", Arguments::row, "tap [--yes] ROW", "press a button", &Shell::tap},
         {"refresh", Arguments::none, "refresh",
          "pull the list down to look for changes in the cloud", &Shell::refresh},
         {"active", Arguments::none, "active", "come back from another application",
@@ -78,6 +78,10 @@ int Shell::runAtTerminal() {
                        .wakeUpDescriptor = _session.loop().wakeUpDescriptor(),
                        .whenWoken = [this] { return takeChanges(); },
                        .complete = [this](std::string_view line) { return completionsFor(line); }});
+    _ask = [this, &editor](const std::string& prompt) {
+        _out << std::flush;
+        return editor.readAnswer(prompt);
+    };
     while (!isDone()) {
         const auto line = editor.readLine();
         // The pane may have closed while the user typed.
@@ -92,6 +96,7 @@ int Shell::runAtTerminal() {
 
 int Shell::runLineByLine() {
     int exitStatus = exitDone;
+    _ask = askingStandardInput(_out);
     std::string line;
     while (!isDone() && std::getline(std::cin, line)) {
         if (const int status = perform(line); status != exitDone) {
@@ -196,7 +201,9 @@ Shell::Outcome Shell::set(const Words& arguments) {
 }
 
 Shell::Outcome Shell::tap(const Words& arguments) {
-    return _commands.tap(joined(arguments, arguments.size()));
+    const bool saysYes = arguments.size() > 1 && arguments.front() == "--yes";
+    const Words row(arguments.begin() + (saysYes ? 1 : 0), arguments.end());
+    return _commands.tap(joined(row, row.size()), saysYes ? Ask() : _ask);
 }
 
 Shell::Outcome Shell::refresh(const Words& /*arguments*/) {

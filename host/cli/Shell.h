@@ -55,6 +55,8 @@ private:
     std::ostream& _out;
     std::ostream& _messages;
     PaneCommands _commands;
+    /// How the user is asked where the commands come from.
+    Ask _ask;
     bool _isRefreshing = false;
     bool _hasQuit = false;
 };

@@ -22,6 +22,18 @@ std::string encoded(const icu::UnicodeString& text) {
     return text.toUTF8String(utf8);
 }
 
+/// Control characters, line ends, and what turns the direction of all that follows round.
+bool movesTheCursor(char16_t character) {
+    switch (u_charType(character)) {
+    case U_CONTROL_CHAR:
+    case U_LINE_SEPARATOR:
+    case U_PARAGRAPH_SEPARATOR:
+        return true;
+    default:
+        return character >= u'\u202A' && character <= u'\u202E';
+    }
+}
+
 std::size_t columnsOf(UChar32 character) {
     switch (u_charType(character)) {
     case U_NON_SPACING_MARK:
@@ -78,15 +90,20 @@ std::size_t displayWidth(std::string_view text) {
 }
 
 std::string printable(std::string_view text) {
-    std::string result(text);
-    std::ranges::replace_if(
-        result,
-        [](char character) {
-            const auto byte = static_cast<unsigned char>(character);
-            return byte < 0x20 || byte == 0x7f;
-        },
-        ' ');
-    return result;
+    const auto isPlain = [](char character) {
+        const auto byte = static_cast<unsigned char>(character);
+        return byte >= 0x20 && byte < 0x7f;
+    };
+    if (std::ranges::all_of(text, isPlain)) {
+        return std::string(text);
+    }
+    icu::UnicodeString shown = decoded(text);
+    for (std::int32_t index = 0; index < shown.length(); ++index) {
+        if (movesTheCursor(shown.charAt(index))) {
+            shown.setCharAt(index, u' ');
+        }
+    }
+    return encoded(shown);
 }
 
 std::vector<std::string> wrapped(std::string_view text, std::size_t width) {

@@ -11,7 +11,8 @@ namespace nimbra::cli {
 /// accents that stand over another character.
 [[nodiscard]] std::size_t displayWidth(std::string_view text);
 
-/// `text` as a terminal may get it: control characters, which could move its cursor, are blanks.
+/// `text` as a terminal may get it: control characters, which could move its cursor, and what turns
+/// the direction of writing round are blanks.
 [[nodiscard]] std::string printable(std::string_view text);
 
 /// `text` in lines of at most `width` columns, broken where its language allows it and at its own

@@ -3,6 +3,7 @@
 #include "host/cli/Arguments.h"
 #include "host/cli/Completion.h"
 #include "host/cli/DeviceLocation.h"
+#include "host/cli/Dialog.h"
 #include "host/cli/Failure.h"
 #include "host/cli/PaneCommands.h"
 #include "host/cli/PlayCommand.h"
@@ -101,7 +102,8 @@ Outcome runOnPane(const Arguments& arguments) {
     case Command::set:
         return withChanges(commands.set(arguments.row, arguments.value));
     case Command::tap:
-        return withChanges(commands.tap(arguments.row));
+        return withChanges(commands.tap(
+            arguments.row, arguments.saysYes ? Ask() : askingStandardInput(std::cout)));
     case Command::watch:
         return watch(**session, std::cout, Terminal::ofStandardOutput(),
                      ::isatty(STDOUT_FILENO) != 0);

@@ -95,6 +95,7 @@ _settingsctl() {
     if [[ $current == -* ]]; then
         case $command in
         list) options+=" --json" ;;
+        tap) options+=" --yes" ;;
         init) options+=" --from" ;;
         play) options+=" --keep" ;;
         esac

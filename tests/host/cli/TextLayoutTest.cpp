@@ -49,6 +49,12 @@ TEST(TextLayout, BreaksTextWithoutBlanksWhereItsLanguageDoes) {
 TEST(TextLayout, LetsNoControlCharacterThrough) {
     EXPECT_EQ(printable("a\x1b[2Jb\tc\x7f"), "a [2Jb c ");
     EXPECT_EQ(wrapped("a\x1b[2Jb", 80), Lines{"a [2Jb"});
+    // The same in other clothes, line ends, and what turns the direction round.
+    EXPECT_EQ(printable("\u009b31mä\u009d0;é"), " 31mä 0;é");
+    EXPECT_EQ(printable("a\u2028b\u2029c\u0085d"), "a b c d");
+    EXPECT_EQ(printable("\u202eabc\u202c"), " abc ");
+    // What keeps names of other scripts apart stays.
+    EXPECT_EQ(printable("\u2068مكتبة\u2069 日記 📷"), "\u2068مكتبة\u2069 日記 📷");
 }
 
 } // namespace

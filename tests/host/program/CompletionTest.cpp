@@ -38,6 +38,7 @@ TEST(Completion, OffersCommandsAndOptionsInBash) {
     EXPECT_EQ(bashOffers(program, {"s"}), "set\nshell\n");
     EXPECT_EQ(bashOffers(program, {"--lo"}), "--locale\n");
     EXPECT_EQ(bashOffers(program, {"list", "--j"}), "--json\n");
+    EXPECT_EQ(bashOffers(program, {"tap", "--y"}), "--yes\n");
     EXPECT_EQ(bashOffers(program, {"--locale", "d"}), "de-DE\n");
     EXPECT_EQ(bashOffers(program, {"set", "Nimbra Drive", "o"}), "on\noff\n");
     EXPECT_EQ(bashOffers(program, {"completion", "z"}), "zsh\n");
