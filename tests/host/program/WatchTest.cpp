@@ -136,8 +136,7 @@ TEST_F(Watch, AnOutputThatCannotBeWrittenIsAFailure) {
     const std::string device = makeDevice(R"("Synced at two.")");
 
     const auto result = _program.runOther(
-        {"/bin/sh", "-c",
-         std::string(NIMBRA_SETTINGSCTL) + " --root " + device + " list >/dev/full"});
+        {"/bin/sh", "-c", R"("$0" --root "$1" list >/dev/full)", NIMBRA_SETTINGSCTL, device});
 
     EXPECT_EQ(result.status, 1);
     EXPECT_EQ(result.messages, "settingsctl: the output cannot be written\n");
