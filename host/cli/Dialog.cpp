@@ -106,8 +106,9 @@ bool Dialog::waitForButton() {
     if (_presentations.usableButton()) {
         return true;
     }
-    _out << "Waiting for an answer; ^C gives up.\n" << std::flush;
+    // Before it is told that it works.
     const Interruption interruption({SIGINT});
+    _out << "Waiting for an answer; ^C gives up.\n" << std::flush;
     while (_presentations.screen() && !_presentations.usableButton()) {
         if (!waitForWork(_session)) {
             return false;
