@@ -2,6 +2,7 @@
 #include "device/DevicePlatform.h"
 #include "device/documents/ProgressPublisher.h"
 #include "device/json/JsonReader.h"
+#include "device/system/StandingTime.h"
 #include "host/core/FooterDescription.h"
 #include "host/core/PaneSession.h"
 #include "host/core/trace/Trace.h"
@@ -11,6 +12,7 @@
 
 #include <algorithm>
 #include <gtest/gtest.h>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -33,8 +35,12 @@ protected:
         EXPECT_FALSE(reader->problem());
         const auto root = _directory.path() / "device";
         EXPECT_TRUE(device::createDeviceDirectory(root, given.description));
-        auto session =
-            PaneSession::start({.root = root, .bundle = NIMBRA_PANE_BUNDLE, .trace = &_trace});
+        // The minute of the footers' timers does not end while the test runs.
+        auto session = PaneSession::start(
+            {.root = root,
+             .bundle = NIMBRA_PANE_BUNDLE,
+             .trace = &_trace,
+             .timeSource = std::make_shared<device::StandingTime>(given.description.now)});
         EXPECT_TRUE(session) << session.error();
         _session = std::move(*session);
     }
