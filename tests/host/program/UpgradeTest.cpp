@@ -90,7 +90,7 @@ TEST_F(Upgrade, TakesAYesHoweverItIsWritten) {
 }
 
 TEST_F(Upgrade, WhatWasTypedBeforeTheQuestionIsNoAnswer) {
-    program.write("device/var/lib/nimbra/device-list.json", R"({"delay": 1})");
+    program.write("device/var/lib/nimbra/device-list.json", R"({"delay": 3})");
     TypedProgram terminal(program, onDevice({"tap", row}));
     ASSERT_TRUE(terminal.shows("Waiting for an answer; ^C gives up."));
     terminal.type("y\r");
@@ -186,7 +186,7 @@ TEST_F(Upgrade, WaitsForTheDevicesAsLongAsTheUserDoes) {
 
 TEST_F(Upgrade, ComesWhenTheAnswerDoes) {
     program.write("device/var/lib/nimbra/device-list.json",
-                  R"({"needUpgrade": ["Late"], "delay": 0.2})");
+                  R"({"needUpgrade": ["Late"], "delay": 2})");
 
     const auto result = run({"tap", "--yes", row});
 
