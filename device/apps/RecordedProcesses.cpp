@@ -44,12 +44,23 @@ public:
     [[nodiscard]] Nanoseconds written() const { return _stamp.modified; }
     /// Removes it, unless another has come into its place since.
     [[nodiscard]] std::expected<void, Error> remove() const;
+    [[nodiscard]] const std::string& devicePath() const { return _devicePath; }
 
 private:
     std::filesystem::path _path;
     std::string _devicePath;
     FileStamp _stamp;
 };
+
+std::expected<RecordFile, Error> recordFileOf(const DevicePaths& paths,
+                                              const BundleIdentifier& application) {
+    const std::string name = applicationFileName(application.string(), ".pid");
+    const auto directory = paths.resolve(kRunningApplicationsDirectory);
+    if (!directory) {
+        return std::unexpected(directory.error());
+    }
+    return RecordFile(*directory / name, std::string(kRunningApplicationsDirectory) + '/' + name);
+}
 
 std::expected<std::optional<ProcessRecord>, Error> RecordFile::read() {
     std::error_code failure;
@@ -135,15 +146,31 @@ RecordedProcesses::askToEnd(const BundleIdentifier& application) {
     return std::move(*asked);
 }
 
+std::expected<bool, Error> RecordedProcesses::isRunning(const BundleIdentifier& application) const {
+    auto file = recordFileOf(_paths, application);
+    if (!file) {
+        return std::unexpected(file.error());
+    }
+    const auto record = file->read();
+    if (!record) {
+        return std::unexpected(record.error());
+    }
+    if (!*record || (*record)->process < 1) {
+        return false;
+    }
+    const auto process = Process::withNumber((*record)->process);
+    const auto startTime = process ? process->startTime() : std::nullopt;
+    return startTime && !process->awaitEnd(std::chrono::milliseconds(0)) &&
+           isRecorded(*startTime, **record, file->written());
+}
+
 std::expected<std::unique_ptr<EndingApplication>, Error>
 RecordedProcesses::ask(const BundleIdentifier& application) const {
-    const std::string name = applicationFileName(application.string(), ".pid");
-    const auto directory = _paths.resolve(kRunningApplicationsDirectory);
-    if (!directory) {
-        return std::unexpected(directory.error());
+    auto found = recordFileOf(_paths, application);
+    if (!found) {
+        return std::unexpected(found.error());
     }
-    const std::string devicePath = std::string(kRunningApplicationsDirectory) + '/' + name;
-    RecordFile file(*directory / name, devicePath);
+    RecordFile& file = *found;
     const auto read = file.read();
     if (!read) {
         return std::unexpected(read.error());
@@ -171,7 +198,7 @@ RecordedProcesses::ask(const BundleIdentifier& application) const {
             return nullptr;
         }
         return std::unexpected(
-            fileError(devicePath, "its process cannot be asked to end", sent.error()));
+            fileError(file.devicePath(), "its process cannot be asked to end", sent.error()));
     }
     return std::make_unique<EndingProcess>(std::move(*process), std::move(file), _log);
 }

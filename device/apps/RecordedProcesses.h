@@ -28,6 +28,9 @@ public:
     [[nodiscard]] std::unique_ptr<EndingApplication>
     askToEnd(const BundleIdentifier& application) override;
 
+    /// Whether the process that is recorded of `application` runs; nothing is changed or asked.
+    [[nodiscard]] std::expected<bool, Error> isRunning(const BundleIdentifier& application) const;
+
 private:
     [[nodiscard]] std::expected<std::unique_ptr<EndingApplication>, Error>
     ask(const BundleIdentifier& application) const;

@@ -41,6 +41,12 @@ std::unexpected<Error> inOneLine(Error error) {
 
 } // namespace
 
+bool isProgressFileName(std::string_view name) {
+    constexpr std::string_view suffix = ".json";
+    return name.size() > suffix.size() && name.ends_with(suffix) && !name.starts_with('.') &&
+           oneLine(name) == name;
+}
+
 std::expected<ProgressValues, Error> parseProgressFile(std::string_view text,
                                                        const std::string& name) {
     const auto reader = JsonReader::parse(text, name);

@@ -28,14 +28,6 @@ namespace nimbra::device {
 
 namespace {
 
-/// Whether a file of this name tells of a progress. Those that begin with a dot are on their way to
-/// another name; a name with control characters could not be told of in a line.
-bool isProgressName(std::string_view name) {
-    constexpr std::string_view suffix = ".json";
-    return name.size() > suffix.size() && name.ends_with(suffix) && !name.starts_with('.') &&
-           oneLine(name) == name;
-}
-
 bool isThere(const std::filesystem::path& path) {
     std::error_code failure;
     return std::filesystem::exists(std::filesystem::symlink_status(path, failure));
@@ -177,7 +169,7 @@ void ProgressFolder::readAll(const std::set<std::string>& names) {
 }
 
 void ProgressFolder::fileChanged(const std::string& name) {
-    if (!isProgressName(name)) {
+    if (!isProgressFileName(name)) {
         return;
     }
     const std::filesystem::path path = _directory / name;

@@ -35,6 +35,10 @@ constexpr auto selectIdentifiers = "SELECT identifier FROM accounts ORDER BY pos
 constexpr auto selectAccount =
     "SELECT uses_stratafile, dataclass, enabled, cellular FROM accounts "
     "LEFT JOIN account_dataclasses ON account = identifier WHERE identifier = ?";
+constexpr auto selectAccounts =
+    "SELECT identifier, is_primary, uses_stratafile, tessary_account, dataclass, enabled, "
+    "provisioned, cellular FROM accounts "
+    "LEFT JOIN account_dataclasses ON account = identifier ORDER BY position, identifier";
 constexpr auto countAccount = "SELECT count(*) FROM accounts WHERE identifier = ?";
 constexpr auto writeUsesStratafile = "UPDATE accounts SET uses_stratafile = ? WHERE identifier = ?";
 constexpr auto writeEnabled =
@@ -80,6 +84,44 @@ std::expected<AccountDatabase, Error> AccountDatabase::open(const std::filesyste
         return std::unexpected(database.error());
     }
     return AccountDatabase(std::move(*database));
+}
+
+std::expected<AccountDatabase, Error>
+AccountDatabase::openForReading(const std::filesystem::path& path) {
+    auto database = schema.openForReading(path);
+    if (!database) {
+        return std::unexpected(database.error());
+    }
+    return AccountDatabase(std::move(*database));
+}
+
+std::expected<std::vector<DeviceDescription::AccountDescription>, Error>
+AccountDatabase::accounts() {
+    std::vector<DeviceDescription::AccountDescription> accounts;
+    const auto read = _database->query(selectAccounts, {}, [&accounts](const Database::Row& row) {
+        // A row for each data class: those of one account stand together.
+        if (accounts.empty() || accounts.back().identifier != row.text(0)) {
+            accounts.push_back(
+                {.identifier = row.text(0),
+                 .primary = row.integer(1) != 0,
+                 .usesStratafile = row.integer(2) != 0,
+                 .tessaryAccount = row.isNull(3) ? std::nullopt : std::optional(row.text(3))});
+        }
+        if (row.isNull(4)) {
+            return;
+        }
+        auto& account = accounts.back();
+        int column = 5;
+        for (auto* const names : {&account.enabled, &account.provisioned, &account.cellular}) {
+            if (row.integer(column++) != 0) {
+                names->insert(row.text(4));
+            }
+        }
+    });
+    if (!read) {
+        return std::unexpected(read.error());
+    }
+    return accounts;
 }
 
 std::expected<std::vector<AccountIdentifier>, Error> AccountDatabase::accountIdentifiers() {

@@ -30,8 +30,19 @@ public:
     open(const std::filesystem::path& path,
          std::chrono::milliseconds patience = Database::patience);
 
+    /// The same only to look at it: nothing is written.
+    [[nodiscard]] static std::expected<AccountDatabase, Error>
+    openForReading(const std::filesystem::path& path);
+
     /// The file.
     [[nodiscard]] const std::filesystem::path& path() const { return _database->path(); }
+
+    /// The version of the database's form.
+    [[nodiscard]] std::expected<std::int64_t, Error> version() { return _database->version(); }
+
+    /// Everything that is kept of the accounts, in their order.
+    [[nodiscard]] std::expected<std::vector<DeviceDescription::AccountDescription>, Error>
+    accounts();
 
     /// The accounts in their order.
     [[nodiscard]] std::expected<std::vector<AccountIdentifier>, Error> accountIdentifiers();

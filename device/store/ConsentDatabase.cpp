@@ -28,6 +28,7 @@ constexpr std::array migrations{
 
 constexpr auto selectRecords =
     "SELECT bundle, granted FROM consent WHERE service = ? ORDER BY position";
+constexpr auto selectAllRecords = "SELECT bundle, granted, service FROM consent ORDER BY position";
 constexpr auto updateRecords = "UPDATE consent SET granted = ?3 WHERE service = ?1 AND bundle = ?2";
 constexpr auto insertMissingRecord =
     "INSERT INTO consent (service, bundle, granted) SELECT ?1, ?2, ?3 "
@@ -37,6 +38,23 @@ constexpr auto insertRecord = "INSERT INTO consent (service, bundle, granted) VA
 constexpr std::array readings{selectRecords};
 constexpr Schema schema{
     .kind = "a consent database", .migrations = migrations, .readings = readings};
+
+bool stands(const std::filesystem::path& path) {
+    std::error_code failure;
+    return std::filesystem::status(path, failure).type() != std::filesystem::file_type::not_found;
+}
+
+/// The record in a row that begins with its bundle and what was granted.
+ConsentDatabase::Record recordIn(const Database::Row& row) {
+    ConsentDatabase::Record record;
+    if (!row.isNull(0)) {
+        record.bundle.emplace(row.text(0));
+    }
+    if (!row.isNull(1)) {
+        record.granted = row.integer(1) != 0;
+    }
+    return record;
+}
 
 /// A directory beside `target` in which something is built; goes with everything in it.
 class Workshop {
@@ -107,8 +125,7 @@ std::expected<ConsentDatabase, Error> ConsentDatabase::create(const std::filesys
 
 std::expected<std::optional<ConsentDatabase>, Error>
 ConsentDatabase::open(const std::filesystem::path& path, std::chrono::milliseconds patience) {
-    std::error_code failure;
-    if (std::filesystem::status(path, failure).type() == std::filesystem::file_type::not_found) {
+    if (!stands(path)) {
         return std::nullopt;
     }
     auto database = schema.open(path, patience);
@@ -118,18 +135,38 @@ ConsentDatabase::open(const std::filesystem::path& path, std::chrono::millisecon
     return ConsentDatabase(std::move(*database));
 }
 
+std::expected<std::optional<ConsentDatabase>, Error>
+ConsentDatabase::openForReading(const std::filesystem::path& path) {
+    if (!stands(path)) {
+        return std::nullopt;
+    }
+    auto database = schema.openForReading(path);
+    if (!database) {
+        return std::unexpected(database.error());
+    }
+    return ConsentDatabase(std::move(*database));
+}
+
+std::expected<std::vector<DeviceDescription::ConsentRecord>, Error> ConsentDatabase::allRecords() {
+    std::vector<DeviceDescription::ConsentRecord> records;
+    const auto read = _database->query(selectAllRecords, {}, [&records](const Database::Row& row) {
+        const auto [bundle, granted] = recordIn(row);
+        records.push_back({.service = row.text(2),
+                           .bundle = bundle ? std::optional(bundle->string()) : std::nullopt,
+                           .granted = granted});
+    });
+    if (!read) {
+        return std::unexpected(read.error());
+    }
+    return records;
+}
+
 std::expected<std::vector<ConsentDatabase::Record>, Error>
 ConsentDatabase::records(const PrivacyService& service) {
     std::vector<Record> records;
     const auto read =
         _database->query(selectRecords, {service.string()}, [&records](const Database::Row& row) {
-            Record& record = records.emplace_back();
-            if (!row.isNull(0)) {
-                record.bundle.emplace(row.text(0));
-            }
-            if (!row.isNull(1)) {
-                record.granted = row.integer(1) != 0;
-            }
+            records.push_back(recordIn(row));
         });
     if (!read) {
         return std::unexpected(read.error());

@@ -40,6 +40,16 @@ public:
     open(const std::filesystem::path& path,
          std::chrono::milliseconds patience = Database::patience);
 
+    /// The same only to look at it: nothing is written.
+    [[nodiscard]] static std::expected<std::optional<ConsentDatabase>, Error>
+    openForReading(const std::filesystem::path& path);
+
+    /// The version of the database's form.
+    [[nodiscard]] std::expected<std::int64_t, Error> version() { return _database->version(); }
+
+    /// The records of all services in the order in which they came.
+    [[nodiscard]] std::expected<std::vector<DeviceDescription::ConsentRecord>, Error> allRecords();
+
     /// The records of `service` in the order in which they came.
     [[nodiscard]] std::expected<std::vector<Record>, Error> records(const PrivacyService& service);
 

@@ -69,6 +69,27 @@ SQLite::Database openExisting(const std::filesystem::path& path, int busyTimeout
     }
 }
 
+/// Opens a database only to look at it. Where no changes stand beside it, no file is made there for
+/// them; where another program is at work or has left some, they are read with it.
+SQLite::Database openForReading(const std::filesystem::path& path, int busyTimeout) {
+    return hasPendingChanges(path)
+               ? SQLite::Database(path.string(), SQLite::OPEN_READONLY, busyTimeout)
+               : openAsItStands(path);
+}
+
+SQLite::Database openWith(Database::Access access, const std::filesystem::path& path,
+                          int busyTimeout) {
+    switch (access) {
+    case Database::Access::create:
+        return {path.string(), SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE, busyTimeout};
+    case Database::Access::reading:
+        return openForReading(path, busyTimeout);
+    case Database::Access::existing:
+        break;
+    }
+    return openExisting(path, busyTimeout);
+}
+
 /// Brings a kept statement back to its beginning for whoever uses it next.
 class StatementUse {
 public:
@@ -131,18 +152,14 @@ std::expected<std::unique_ptr<Database>, Error> Database::open(const std::filesy
                                                                Access access,
                                                                std::chrono::milliseconds patience) {
     std::error_code failure;
-    if (access == Access::existing && !std::filesystem::is_regular_file(path, failure)) {
+    if (access != Access::create && !std::filesystem::is_regular_file(path, failure)) {
         return std::unexpected(
             fileError(path, "cannot be read", failure ? failure.value() : EISDIR));
     }
     const int busyTimeout = static_cast<int>(patience.count());
     const bool foundPendingChanges = hasPendingChanges(path);
     try {
-        SQLite::Database database =
-            access == Access::existing
-                ? openExisting(path, busyTimeout)
-                : SQLite::Database(path.string(), SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE,
-                                   busyTimeout);
+        SQLite::Database database = openWith(access, path, busyTimeout);
         database.exec("PRAGMA foreign_keys = ON");
         return std::unique_ptr<Database>(new Database(
             std::make_unique<Connection>(path, foundPendingChanges, std::move(database),
@@ -196,6 +213,16 @@ Database::transaction(const std::function<std::expected<void, Error>()>& write) 
     return written ? ended : written;
 }
 
+std::expected<std::int64_t, Error> Database::version() {
+    std::int64_t version = 0;
+    const auto read =
+        query("PRAGMA user_version", {}, [&version](const Row& row) { version = row.integer(0); });
+    if (!read) {
+        return std::unexpected(read.error());
+    }
+    return version;
+}
+
 void Database::leaveAsFound() {
     if (_connection->foundPendingChanges) {
         static_cast<void>(::sqlite3_db_config(_connection->database.getHandle(),
@@ -205,6 +232,10 @@ void Database::leaveAsFound() {
 
 const std::filesystem::path& Database::path() const {
     return _connection->path;
+}
+
+std::string Database::libraryVersion() {
+    return SQLite::getLibVersion();
 }
 
 } // namespace nimbra::device

@@ -38,13 +38,14 @@ public:
         SQLite::Statement& _statement;
     };
 
-    enum class Access { existing, create };
+    enum class Access { existing, create, reading };
 
     /// How long a statement waits for another program that is using the file.
     static constexpr std::chrono::milliseconds patience{5000};
 
     /// Opens the file at `path`; with `create` it is made where it does not exist. Where the file
-    /// can only be read, reading works and writing fails.
+    /// can only be read, reading works and writing fails. With `reading` nothing can be written,
+    /// and neither the file nor the changes that stand beside it are touched.
     [[nodiscard]] static std::expected<std::unique_ptr<Database>, Error>
     open(const std::filesystem::path& path, Access access,
          std::chrono::milliseconds patience = Database::patience);
@@ -67,11 +68,17 @@ public:
     [[nodiscard]] std::expected<void, Error>
     transaction(const std::function<std::expected<void, Error>()>& write);
 
+    /// The version of its form, which whoever made it has set; 0 where nobody has.
+    [[nodiscard]] std::expected<std::int64_t, Error> version();
+
     /// Leaves the files as they were found when the connection ends: changes that another process
     /// left beside the database are not moved into it.
     void leaveAsFound();
 
     [[nodiscard]] const std::filesystem::path& path() const;
+
+    /// The version of the library that reads and writes databases.
+    [[nodiscard]] static std::string libraryVersion();
 
 private:
     struct Connection;

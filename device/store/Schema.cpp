@@ -14,19 +14,8 @@ std::int64_t currentVersion(const Schema& schema) {
     return static_cast<std::int64_t>(schema.migrations.size());
 }
 
-std::expected<std::int64_t, Error> versionOf(Database& database) {
-    std::int64_t version = 0;
-    const auto read =
-        database.query("PRAGMA user_version", {},
-                       [&version](const Database::Row& row) { version = row.integer(0); });
-    if (!read) {
-        return std::unexpected(read.error());
-    }
-    return version;
-}
-
 std::expected<void, Error> checkVersion(const Schema& schema, Database& database) {
-    const auto found = versionOf(database);
+    const auto found = database.version();
     if (!found) {
         return std::unexpected(found.error());
     }
@@ -60,7 +49,7 @@ std::expected<void, Error> check(const Schema& schema, Database& database) {
 }
 
 std::expected<void, Error> migrate(const Schema& schema, Database& database) {
-    const auto before = versionOf(database);
+    const auto before = database.version();
     if (!before) {
         return std::unexpected(before.error());
     }
@@ -69,7 +58,7 @@ std::expected<void, Error> migrate(const Schema& schema, Database& database) {
     }
     return database.transaction([&schema, &database]() -> std::expected<void, Error> {
         // Another program may have been faster since.
-        const auto found = versionOf(database);
+        const auto found = database.version();
         if (!found) {
             return std::unexpected(found.error());
         }
@@ -123,6 +112,18 @@ Schema::open(const std::filesystem::path& path, std::chrono::milliseconds patien
     }
     if (auto migrated = migrate(*this, **database); !migrated) {
         return std::unexpected(migrated.error());
+    }
+    return database;
+}
+
+std::expected<std::unique_ptr<Database>, Error>
+Schema::openForReading(const std::filesystem::path& path) const {
+    auto database = Database::open(path, Database::Access::reading);
+    if (!database) {
+        return std::unexpected(notOfKind(*this, path, database.error()));
+    }
+    if (const auto checked = check(*this, **database); !checked) {
+        return std::unexpected(notOfKind(*this, path, checked.error()));
     }
     return database;
 }

@@ -30,6 +30,10 @@ struct Schema {
     [[nodiscard]] std::expected<std::unique_ptr<Database>, Error>
     open(const std::filesystem::path& path,
          std::chrono::milliseconds patience = Database::patience) const;
+
+    /// The same only to look at it: nothing is written, and one of an earlier version stays so.
+    [[nodiscard]] std::expected<std::unique_ptr<Database>, Error>
+    openForReading(const std::filesystem::path& path) const;
 };
 
 } // namespace nimbra::device

@@ -311,5 +311,81 @@ TEST_F(AccountDatabaseTest, WhereNothingCanBeWrittenTheAccountsAreStillListed) {
     ASSERT_EQ(::chmod(directory().c_str(), 0755), 0);
 }
 
+TEST_F(AccountDatabaseTest, EverythingThatIsKeptCanBeReadBack) {
+    create({{.identifier = "z",
+             .primary = true,
+             .usesStratafile = true,
+             .enabled = {"a", "b"},
+             .provisioned = {"b"},
+             .cellular = {"c"},
+             .tessaryAccount = "t"},
+            {.identifier = "y"}});
+
+    const auto accounts = open().accounts();
+
+    ASSERT_TRUE(accounts) << accounts.error();
+    ASSERT_EQ(accounts->size(), 2U);
+    const auto& first = accounts->front();
+    EXPECT_EQ(first.identifier, "z");
+    EXPECT_TRUE(first.primary);
+    EXPECT_TRUE(first.usesStratafile);
+    EXPECT_EQ(first.enabled, (std::set<std::string>{"a", "b"}));
+    EXPECT_EQ(first.provisioned, std::set<std::string>{"b"});
+    EXPECT_EQ(first.cellular, std::set<std::string>{"c"});
+    EXPECT_EQ(first.tessaryAccount, "t");
+    const auto& last = accounts->back();
+    EXPECT_EQ(last.identifier, "y");
+    EXPECT_FALSE(last.primary);
+    EXPECT_TRUE(last.enabled.empty());
+    EXPECT_EQ(last.tessaryAccount, std::nullopt);
+}
+
+TEST_F(AccountDatabaseTest, WhoOnlyReadsMakesNoFilesAndCannotWrite) {
+    create({{.identifier = "z"}});
+    const auto before = test::treeOf(directory());
+
+    {
+        auto database = AccountDatabase::openForReading(path());
+        ASSERT_TRUE(database) << database.error();
+        EXPECT_EQ(database->version(), 1);
+        EXPECT_EQ(database->accounts()->size(), 1U);
+        const auto written =
+            database->writeChanges(AccountIdentifier("z"), {.usesStratafile = true});
+        ASSERT_FALSE(written);
+        EXPECT_EQ(written.error().description, path().string() + ": it can only be read");
+        EXPECT_EQ(test::treeOf(directory()), before);
+    }
+
+    EXPECT_EQ(test::treeOf(directory()), before);
+}
+
+TEST_F(AccountDatabaseTest, WhoOnlyReadsLeavesTheChangesOfOthersWhereTheyAre) {
+    create({{.identifier = "z"}});
+    SQLite::Database other(path().string(), SQLite::OPEN_READWRITE);
+    other.exec("UPDATE accounts SET uses_stratafile = 1");
+    const std::string changes = test::contentOf(path().string() + "-wal");
+
+    {
+        auto database = AccountDatabase::openForReading(path());
+        ASSERT_TRUE(database) << database.error();
+        EXPECT_TRUE(database->accounts()->front().usesStratafile);
+    }
+
+    EXPECT_EQ(test::contentOf(path().string() + "-wal"), changes);
+}
+
+TEST_F(AccountDatabaseTest, WhatIsNoDatabaseIsNotReadEither) {
+    test::writeTestFile(path(), "no database");
+    const auto before = test::treeOf(directory());
+
+    const auto database = AccountDatabase::openForReading(path());
+
+    ASSERT_FALSE(database);
+    EXPECT_TRUE(
+        database.error().description.starts_with(path().string() + ": not an account database: "));
+    EXPECT_FALSE(AccountDatabase::openForReading(directory() / "missing.db"));
+    EXPECT_EQ(test::treeOf(directory()), before);
+}
+
 } // namespace
 } // namespace nimbra::device

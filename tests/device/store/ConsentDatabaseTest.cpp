@@ -277,5 +277,37 @@ TEST_F(ConsentDatabaseTest, ADamagedDatabaseIsReportedAndLeftAsItWas) {
     expectRefusal("it is damaged: ");
 }
 
+TEST_F(ConsentDatabaseTest, TheRecordsOfAllServicesCanBeReadWithoutWriting) {
+    create({{.service = tidewater, .bundle = "com.example.a", .granted = true},
+            {.service = brackwater, .bundle = std::nullopt, .granted = std::nullopt}});
+    const auto before = test::treeOf(directory());
+
+    {
+        auto database = ConsentDatabase::openForReading(path());
+        ASSERT_TRUE(database && *database);
+        ConsentDatabase& opened = **database;
+        const auto records = opened.allRecords();
+        ASSERT_TRUE(records) << records.error();
+        ASSERT_EQ(records->size(), 2U);
+        EXPECT_EQ(records->front().service, tidewater);
+        EXPECT_EQ(records->front().bundle, "com.example.a");
+        EXPECT_EQ(records->front().granted, true);
+        EXPECT_EQ(records->back().service, brackwater);
+        EXPECT_EQ(records->back().bundle, std::nullopt);
+        EXPECT_EQ(records->back().granted, std::nullopt);
+        EXPECT_EQ(opened.version(), 1);
+    }
+
+    EXPECT_EQ(test::treeOf(directory()), before);
+}
+
+TEST_F(ConsentDatabaseTest, WhereNoneStandsNoneIsRead) {
+    const auto database = ConsentDatabase::openForReading(path());
+
+    ASSERT_TRUE(database);
+    EXPECT_FALSE(database->has_value());
+    EXPECT_TRUE(std::filesystem::is_empty(directory()));
+}
+
 } // namespace
 } // namespace nimbra::device
