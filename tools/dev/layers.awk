@@ -27,7 +27,7 @@ BEGIN {
     library("png[.]h", "device")
     library("spdlog/|fmt/", "device")
     library("systemd/|sdbus-c[+][+]/", "device")
-    library("nlohmann/", "device host/core host/cli host/qt")
+    library("nlohmann/", "device host/core host/cli host/qt tools")
     library("CLI/", "host/cli tools")
     library("histedit|editline/", "host/cli")
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "tests/support/ProgramRun.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <filesystem>
@@ -8,14 +9,6 @@
 #include <vector>
 
 namespace nimbra::test {
-
-/// What a program left behind when it ended.
-struct ProgramResult {
-    /// Its exit status; minus the signal's number where a signal ended it.
-    int status = 0;
-    std::string output;
-    std::string messages;
-};
 
 /// The program under test, with a home and a directory for temporary files of its own.
 class Program {
@@ -52,9 +45,6 @@ public:
 private:
     TemporaryDirectory _directory;
 };
-
-/// The exit status in what waitpid said, or minus the signal's number.
-[[nodiscard]] int exitStatusOf(int waited);
 
 /// The names and contents of all files below `directory`, to see whether any has changed.
 [[nodiscard]] std::string contentsOf(const std::filesystem::path& directory);

@@ -1,0 +1,53 @@
+#include "tests/tools/mrctl/Diagnosis.h"
+
+#include <algorithm>
+#include <gtest/gtest.h>
+
+namespace nimbra::test {
+namespace {
+
+using Strings = std::vector<std::string>;
+
+ProgramResult run(std::vector<std::string> arguments) {
+    arguments.insert(arguments.begin(), NIMBRA_MRCTL);
+    return runProgram(arguments, {});
+}
+
+TEST(MrctlUsageTest, BadArgumentsAreOneLineAndStatusTwo) {
+    const std::vector<std::vector<std::string>> lines{
+        {},          {"diagnose"},        {"diagnose", ""},           {"diagnose", "a", "b"},
+        {"unknown"}, {"status", "extra"}, {"status", "--no"},         {"status", "--no-logarchive"},
+        {"--root"},  {"--wrong\nline"},   {"diagnose", "--json", "a"}};
+    for (const auto& line : lines) {
+        const ProgramResult result = run(line);
+        EXPECT_EQ(result.status, 2) << result.messages;
+        EXPECT_EQ(result.output, "");
+        EXPECT_TRUE(result.messages.starts_with("mrctl: ")) << result.messages;
+        EXPECT_EQ(std::ranges::count(result.messages, '\n'), 1) << result.messages;
+    }
+}
+
+TEST(MrctlUsageTest, HelpAndVersionGoToStandardOutput) {
+    EXPECT_EQ(run({"--version"}).output, "mrctl " NIMBRA_VERSION "\n");
+    for (const auto& line : {std::vector<std::string>{"--help"}, {"diagnose", "--help"}}) {
+        const ProgramResult result = run(line);
+        EXPECT_EQ(result.status, 0);
+        EXPECT_NE(result.output.find("diagnose"), std::string::npos);
+        EXPECT_EQ(result.messages, "");
+    }
+}
+
+TEST(MrctlUsageTest, ADirectoryThatIsNoDeviceHasNoStatus) {
+    const TemporaryDirectory directory;
+    for (const std::string& root :
+         Strings{directory.path().string(), directory.path().string() + "/no"}) {
+        const ProgramResult result = run({"--root", root, "status"});
+        EXPECT_EQ(result.status, 1);
+        EXPECT_EQ(result.output, "");
+        EXPECT_TRUE(result.messages.starts_with("mrctl: " + root + ": ")) << result.messages;
+        EXPECT_EQ(std::ranges::count(result.messages, '\n'), 1);
+    }
+}
+
+} // namespace
+} // namespace nimbra::test

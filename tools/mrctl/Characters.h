@@ -1,0 +1,40 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace nimbra::mrctl {
+
+// Characters of ASCII, whatever the locale; bytes of other characters are none of them.
+
+[[nodiscard]] constexpr bool isDigit(char character) {
+    return character >= '0' && character <= '9';
+}
+[[nodiscard]] constexpr bool isLower(char character) {
+    return character >= 'a' && character <= 'z';
+}
+[[nodiscard]] constexpr bool isUpper(char character) {
+    return character >= 'A' && character <= 'Z';
+}
+[[nodiscard]] constexpr bool isWord(char character) {
+    return isDigit(character) || isLower(character) || isUpper(character);
+}
+[[nodiscard]] constexpr bool isBeyondAscii(char character) {
+    return static_cast<unsigned char>(character) >= 0x80U;
+}
+[[nodiscard]] constexpr bool isBlank(char character) {
+    return character == ' ' || (character >= '\t' && character <= '\r');
+}
+[[nodiscard]] constexpr bool isQuote(char character) {
+    return character == '"' || character == '\'' || character == '`';
+}
+
+[[nodiscard]] inline std::string lowerCase(std::string_view text) {
+    std::string lower(text);
+    for (char& character : lower) {
+        character = isUpper(character) ? static_cast<char>(character - 'A' + 'a') : character;
+    }
+    return lower;
+}
+
+} // namespace nimbra::mrctl
