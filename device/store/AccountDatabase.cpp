@@ -4,6 +4,7 @@
 #include "device/store/Schema.h"
 
 #include <array>
+#include <cstdint>
 #include <set>
 #include <string>
 #include <utility>
@@ -33,8 +34,9 @@ constexpr std::array migrations{
 constexpr auto selectIdentifiers = "SELECT identifier FROM accounts ORDER BY position";
 // One statement sees one state, whatever another process writes meanwhile.
 constexpr auto selectAccount =
-    "SELECT uses_stratafile, dataclass, enabled, cellular FROM accounts "
-    "LEFT JOIN account_dataclasses ON account = identifier WHERE identifier = ?";
+    "SELECT is_primary, uses_stratafile, tessary_account, dataclass, enabled, provisioned, "
+    "cellular FROM accounts LEFT JOIN account_dataclasses ON account = identifier "
+    "WHERE identifier = ?";
 constexpr auto selectAccounts =
     "SELECT identifier, is_primary, uses_stratafile, tessary_account, dataclass, enabled, "
     "provisioned, cellular FROM accounts "
@@ -62,6 +64,42 @@ constexpr Schema schema{
 
 Database::Value orNull(const std::optional<std::string>& text) {
     return text ? Database::Value(*text) : Database::Value(nullptr);
+}
+
+// The columns of `selectAccount`.
+enum Column : std::uint8_t {
+    primaryColumn,
+    stratafileColumn,
+    tessaryColumn,
+    dataclassColumn,
+    enabledColumn,
+    provisionedColumn,
+    cellularColumn
+};
+
+AccountRecord accountOf(const Database::Row& row, const AccountIdentifier& identifier) {
+    AccountRecord record{.identifier = identifier,
+                         .isPrimary = row.integer(primaryColumn) != 0,
+                         .usesStratafile = row.integer(stratafileColumn) != 0};
+    if (!row.isNull(tessaryColumn)) {
+        record.tessaryAccount.emplace(row.text(tessaryColumn));
+    }
+    return record;
+}
+
+/// Adds what the row says of one data class to the account; an account may have none.
+void addDataclass(const Database::Row& row, AccountRecord& record) {
+    if (row.isNull(dataclassColumn)) {
+        return;
+    }
+    const auto addTo = [&row](std::set<Dataclass>& classes, Column flag) {
+        if (row.integer(flag) != 0) {
+            classes.emplace(row.text(dataclassColumn));
+        }
+    };
+    addTo(record.enabled, enabledColumn);
+    addTo(record.provisioned, provisionedColumn);
+    addTo(record.cellular, cellularColumn);
 }
 
 } // namespace
@@ -139,22 +177,13 @@ std::expected<std::vector<AccountIdentifier>, Error> AccountDatabase::accountIde
 std::expected<std::optional<AccountRecord>, Error>
 AccountDatabase::account(const AccountIdentifier& identifier) {
     std::optional<AccountRecord> record;
-    const auto read = _database->query(
-        selectAccount, {identifier.string()}, [&record, &identifier](const Database::Row& row) {
-            if (!record) {
-                record.emplace(
-                    AccountRecord{.identifier = identifier, .usesStratafile = row.integer(0) != 0});
-            }
-            if (row.isNull(1)) {
-                return;
-            }
-            if (row.integer(2) != 0) {
-                record->enabled.emplace(row.text(1));
-            }
-            if (row.integer(3) != 0) {
-                record->cellular.emplace(row.text(1));
-            }
-        });
+    const auto read = _database->query(selectAccount, {identifier.string()},
+                                       [&record, &identifier](const Database::Row& row) {
+                                           if (!record) {
+                                               record = accountOf(row, identifier);
+                                           }
+                                           addDataclass(row, *record);
+                                       });
     if (!read) {
         return std::unexpected(read.error());
     }

@@ -12,8 +12,12 @@ namespace nimbra::device {
 /// What the store keeps of an account.
 struct AccountRecord {
     AccountIdentifier identifier;
+    bool isPrimary = false;
     bool usesStratafile = false;
+    /// The account of the cloud database, which the store need not hold.
+    std::optional<AccountIdentifier> tessaryAccount;
     std::set<Dataclass> enabled;
+    std::set<Dataclass> provisioned;
     std::set<Dataclass> cellular;
 };
 

@@ -39,6 +39,28 @@ const AccountIdentifier& DeviceAccount::identifier() const {
     return _identifier;
 }
 
+bool DeviceAccount::vt_isPrimaryAccount() const {
+    const std::scoped_lock lock(_mutex);
+    return _record.isPrimary;
+}
+
+bool DeviceAccount::isProvisionedForDataclass(const Dataclass& dataclass) const {
+    const std::scoped_lock lock(_mutex);
+    return _record.provisioned.contains(dataclass);
+}
+
+std::shared_ptr<Account> DeviceAccount::vt_tessaryAccount() const {
+    std::unique_lock lock(_mutex);
+    const std::optional<AccountIdentifier> tessaryAccount = _record.tessaryAccount;
+    lock.unlock();
+    if (!tessaryAccount) {
+        return nullptr;
+    }
+    auto stored = _store.record(*tessaryAccount);
+    return std::make_shared<DeviceAccount>(
+        stored ? std::move(*stored) : AccountRecord{.identifier = *tessaryAccount}, _store);
+}
+
 bool DeviceAccount::isEnabledForDataclass(const Dataclass& dataclass) const {
     const std::scoped_lock lock(_mutex);
     return flag(_record.enabled, _changes.enabled, dataclass);

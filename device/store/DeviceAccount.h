@@ -3,6 +3,7 @@
 #include "device/store/AccountRecord.h"
 #include "platform/accounts/Account.h"
 
+#include <memory>
 #include <mutex>
 
 namespace nimbra::device {
@@ -16,6 +17,10 @@ public:
     DeviceAccount(AccountRecord record, DeviceAccountStore& store);
 
     [[nodiscard]] const AccountIdentifier& identifier() const override;
+    [[nodiscard]] bool vt_isPrimaryAccount() const override;
+    [[nodiscard]] bool isProvisionedForDataclass(const Dataclass& dataclass) const override;
+    /// As the store has it; one that the store does not hold has its identifier and nothing more.
+    [[nodiscard]] std::shared_ptr<Account> vt_tessaryAccount() const override;
     [[nodiscard]] bool isEnabledForDataclass(const Dataclass& dataclass) const override;
     void setEnabledForDataclass(bool enabled, const Dataclass& dataclass) override;
     [[nodiscard]] bool vt_isUsingStratafile() const override;

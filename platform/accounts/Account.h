@@ -3,6 +3,8 @@
 #include "platform/accounts/Dataclass.h"
 #include "platform/values/Identifier.h"
 
+#include <memory>
+
 namespace nimbra {
 
 /// A cloud account as the pane shows and edits it: a copy in memory of what the store holds.
@@ -16,6 +18,15 @@ public:
     virtual ~Account() = default;
 
     [[nodiscard]] virtual const AccountIdentifier& identifier() const = 0;
+
+    /// Whether it is the account of the device's user; any other one was added beside it.
+    [[nodiscard]] virtual bool vt_isPrimaryAccount() const = 0;
+    /// Whether the account's service offers data of this class, switched on or not. False for a
+    /// class that the account does not know.
+    [[nodiscard]] virtual bool isProvisionedForDataclass(const Dataclass& dataclass) const = 0;
+    /// The account under which the service of the cloud database knows the user; null for none.
+    /// Each call may give another object.
+    [[nodiscard]] virtual std::shared_ptr<Account> vt_tessaryAccount() const = 0;
 
     /// Whether the account carries data of this class. False for a class it does not know.
     [[nodiscard]] virtual bool isEnabledForDataclass(const Dataclass& dataclass) const = 0;

@@ -2,6 +2,7 @@
 
 #include "platform/accounts/Account.h"
 
+#include <memory>
 #include <set>
 #include <string>
 #include <utility>
@@ -15,6 +16,14 @@ public:
     explicit FakeAccount(std::string identifier) : _identifier(std::move(identifier)) {}
 
     [[nodiscard]] const AccountIdentifier& identifier() const override { return _identifier; }
+    [[nodiscard]] bool vt_isPrimaryAccount() const override { return flags.isPrimary; }
+    [[nodiscard]] bool isProvisionedForDataclass(const Dataclass& dataclass) const override {
+        return flags.provisioned.contains(dataclass);
+    }
+    [[nodiscard]] std::shared_ptr<Account> vt_tessaryAccount() const override {
+        return flags.tessaryAccount.empty() ? nullptr
+                                            : std::make_shared<FakeAccount>(flags.tessaryAccount);
+    }
     [[nodiscard]] bool isEnabledForDataclass(const Dataclass& dataclass) const override {
         return flags.enabled.contains(dataclass);
     }
@@ -43,6 +52,10 @@ public:
         std::set<Dataclass> enabled;
         std::set<Dataclass> cellular;
         bool usesStratafile = true;
+        std::set<Dataclass> provisioned;
+        bool isPrimary = false;
+        /// The identifier of its account of the cloud database; empty for none.
+        std::string tessaryAccount;
     };
     Flags flags;
     /// What a reload brings back; owned by the store that gave the account out.

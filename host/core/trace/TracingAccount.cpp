@@ -18,6 +18,19 @@ const AccountIdentifier& TracingAccount::identifier() const {
     return _account->identifier();
 }
 
+bool TracingAccount::vt_isPrimaryAccount() const {
+    return _account->vt_isPrimaryAccount();
+}
+
+bool TracingAccount::isProvisionedForDataclass(const Dataclass& dataclass) const {
+    return _account->isProvisionedForDataclass(dataclass);
+}
+
+std::shared_ptr<Account> TracingAccount::vt_tessaryAccount() const {
+    auto account = _account->vt_tessaryAccount();
+    return account ? std::make_shared<TracingAccount>(std::move(account), _trace) : nullptr;
+}
+
 bool TracingAccount::isEnabledForDataclass(const Dataclass& dataclass) const {
     return _account->isEnabledForDataclass(dataclass);
 }

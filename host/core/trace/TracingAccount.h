@@ -18,6 +18,10 @@ public:
     [[nodiscard]] static std::shared_ptr<Account> original(const std::shared_ptr<Account>& account);
 
     [[nodiscard]] const AccountIdentifier& identifier() const override;
+    [[nodiscard]] bool vt_isPrimaryAccount() const override;
+    [[nodiscard]] bool isProvisionedForDataclass(const Dataclass& dataclass) const override;
+    /// Traced as well.
+    [[nodiscard]] std::shared_ptr<Account> vt_tessaryAccount() const override;
     [[nodiscard]] bool isEnabledForDataclass(const Dataclass& dataclass) const override;
     void setEnabledForDataclass(bool enabled, const Dataclass& dataclass) override;
     [[nodiscard]] bool vt_isUsingStratafile() const override;
