@@ -35,7 +35,8 @@ void openingTheBundle(benchmark::State& state) {
         state.ResumeTiming();
 
         ClassRegistry classes;
-        device::DeviceBundles bundles(device.platform().settings(), classes,
+        device::DeviceBundles bundles(device::DevicePaths(device.root()),
+                                      device.platform().settings(), classes,
                                       device.platform().systemLog());
         const auto bundle = bundles.load(copy);
         if (!bundle) {

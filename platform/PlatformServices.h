@@ -8,6 +8,7 @@ class AccountStore;
 class AppTerminator;
 class Applications;
 class Bundles;
+class ClassRegistry;
 class Clock;
 class DaemonConnection;
 class DeviceInfo;
@@ -38,6 +39,8 @@ struct PlatformServices {
     ServiceReference<WorkQueues> workQueues;
     ServiceReference<FileManager> fileManager;
     ServiceReference<Bundles> bundles;
+    /// The classes of the loaded bundles, to be looked up by name.
+    ServiceReference<const ClassRegistry> classes;
     ServiceReference<Localization> localization;
     ServiceReference<DeviceInfo> deviceInfo;
     ServiceReference<RestrictionsProfile> restrictions;

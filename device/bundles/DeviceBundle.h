@@ -28,6 +28,7 @@ public:
         std::string developmentLanguage;
         LanguageTables tables;
         BundleImages images;
+        /// Null for a bundle whose classes are found by their names only.
         const ControllerClass* principalClass;
         const DeviceSettings* settings;
     };
@@ -38,8 +39,12 @@ public:
     [[nodiscard]] Text localizedStringForKeyValueTable(const Text& key, const Text& value,
                                                        const Text& table) const override;
     [[nodiscard]] std::shared_ptr<const Image> imageNamed(const Text& name) const override;
+    [[nodiscard]] bool isLoaded() const override { return true; }
+    std::expected<void, Error> load() override { return {}; }
 
-    /// The class that the manifest names as the bundle's first; owned by the class registry.
+    [[nodiscard]] bool hasPrincipalClass() const { return _parts.principalClass != nullptr; }
+    /// The class that the manifest names as the bundle's first, which it has; owned by the class
+    /// registry.
     [[nodiscard]] const ControllerClass& principalClass() const;
 
     /// Uses `texts` as the table `table` in every language from now on, instead of the bundle's

@@ -1,6 +1,8 @@
 #include "device/bundles/DeviceBundles.h"
 
 #include "device/DeviceError.h"
+#include "device/bundles/BundleAtPath.h"
+#include "device/bundles/BundleCode.h"
 #include "device/bundles/BundleImages.h"
 #include "device/bundles/DeviceBundle.h"
 #include "device/bundles/Manifest.h"
@@ -8,49 +10,15 @@
 #include "platform/system/ClassRegistry.h"
 
 #include <algorithm>
-#include <cerrno>
 #include <dlfcn.h>
 #include <system_error>
 #include <utility>
 
 namespace nimbra::device {
 
-namespace {
-
-std::string linkerError() {
-    const char* const message = ::dlerror();
-    return message != nullptr ? message : "unknown reason";
-}
-
-/// The function under which the shared object at `path` registers its classes. The object stays
-/// loaded: rows and classes point into it for as long as the process runs.
-std::expected<BundleEntryPoint*, Error> entryPoint(const std::filesystem::path& path) {
-    std::error_code failure;
-    if (!std::filesystem::exists(path, failure)) {
-        return std::unexpected(fileError(path, "the bundle's shared object cannot be loaded",
-                                         failure ? failure.value() : ENOENT));
-    }
-    // The linker keeps the path as it is given, for whoever asks later where a class comes from.
-    void* const object =
-        ::dlopen(std::filesystem::absolute(path, failure).c_str(), RTLD_NOW | RTLD_LOCAL);
-    if (object == nullptr) {
-        return std::unexpected(deviceError(
-            path.string() + ": the bundle's shared object cannot be loaded: " + linkerError()));
-    }
-    void* const symbol = ::dlsym(object, kBundleEntryPoint);
-    if (symbol == nullptr) {
-        return std::unexpected(deviceError(path.string() +
-                                           ": the bundle's shared object lacks its entry point " +
-                                           kBundleEntryPoint));
-    }
-    // NOLINTNEXTLINE(cppcoreguidelines-pro-type-reinterpret-cast): dlsym knows objects only
-    return reinterpret_cast<BundleEntryPoint*>(symbol);
-}
-
-} // namespace
-
-DeviceBundles::DeviceBundles(const DeviceSettings& settings, ClassRegistry& classes, SystemLog& log)
-    : _settings(settings), _classes(classes), _log(log) {}
+DeviceBundles::DeviceBundles(DevicePaths paths, const DeviceSettings& settings,
+                             ClassRegistry& classes, SystemLog& log)
+    : _paths(std::move(paths)), _settings(settings), _classes(classes), _log(log) {}
 
 DeviceBundles::~DeviceBundles() = default;
 
@@ -66,6 +34,32 @@ DeviceBundles::bundleWithIdentifier(const BundleIdentifier& identifier) const {
     return entry != _bundles.end() ? entry->second : nullptr;
 }
 
+std::shared_ptr<Bundle> DeviceBundles::bundleWithPath(const Text& path) {
+    if (path.string().empty()) {
+        return nullptr;
+    }
+    const auto resolved = _paths.resolve(path.string());
+    std::error_code failure;
+    const std::filesystem::path folder =
+        resolved ? std::filesystem::weakly_canonical(*resolved, failure) : std::filesystem::path();
+    if (folder.empty() || failure) {
+        return nullptr;
+    }
+    if (auto loaded = bundleLoadedFrom(folder)) {
+        return loaded;
+    }
+    return std::filesystem::is_directory(folder, failure)
+               ? std::make_shared<BundleAtPath>(path, folder, *this, _log)
+               : nullptr;
+}
+
+std::shared_ptr<DeviceBundle>
+DeviceBundles::bundleLoadedFrom(const std::filesystem::path& folder) const {
+    const std::scoped_lock lock(_mutex);
+    const auto loaded = _bundles.find(folder);
+    return loaded != _bundles.end() ? loaded->second : nullptr;
+}
+
 std::shared_ptr<Bundle> DeviceBundles::bundleForClass(const std::type_info& classType) const {
     Dl_info object{};
     if (::dladdr(&classType, &object) == 0 || object.dli_fname == nullptr) {
@@ -74,13 +68,21 @@ std::shared_ptr<Bundle> DeviceBundles::bundleForClass(const std::type_info& clas
     std::error_code failure;
     const std::filesystem::path folder =
         std::filesystem::canonical(std::filesystem::path(object.dli_fname).parent_path(), failure);
-    const std::scoped_lock lock(_mutex);
-    const auto loaded = failure ? _bundles.end() : _bundles.find(folder);
-    return loaded != _bundles.end() ? loaded->second : nullptr;
+    return failure ? nullptr : bundleLoadedFrom(folder);
 }
 
 std::expected<std::shared_ptr<DeviceBundle>, Error>
 DeviceBundles::load(const std::filesystem::path& path) {
+    return load(path, FirstClass::needed);
+}
+
+std::expected<std::shared_ptr<DeviceBundle>, Error>
+DeviceBundles::loadClasses(const std::filesystem::path& path) {
+    return load(path, FirstClass::notNeeded);
+}
+
+std::expected<std::shared_ptr<DeviceBundle>, Error>
+DeviceBundles::load(const std::filesystem::path& path, FirstClass firstClass) {
     std::error_code failure;
     const std::filesystem::path folder = std::filesystem::canonical(path, failure);
     if (!failure && !std::filesystem::is_directory(folder, failure) && !failure) {
@@ -89,11 +91,12 @@ DeviceBundles::load(const std::filesystem::path& path) {
     if (failure) {
         return std::unexpected(fileError(path, "is not a bundle", failure.value()));
     }
-    {
-        const std::scoped_lock lock(_mutex);
-        if (const auto loaded = _bundles.find(folder); loaded != _bundles.end()) {
-            return loaded->second;
+    if (auto loaded = bundleLoadedFrom(folder)) {
+        if (firstClass == FirstClass::needed && !loaded->hasPrincipalClass()) {
+            return std::unexpected(
+                deviceError(path.string() + ": its first class was not there when it was loaded"));
         }
+        return loaded;
     }
     auto manifest = Manifest::read(path);
     if (!manifest) {
@@ -103,18 +106,16 @@ DeviceBundles::load(const std::filesystem::path& path) {
     if (!tables) {
         return std::unexpected(tables.error());
     }
-    const auto principalClass =
-        registerClasses(path / manifest->executable, manifest->principalClass);
-    if (!principalClass) {
-        return std::unexpected(principalClass.error());
+    if (auto registered = registerClasses(path, *manifest, firstClass); !registered) {
+        return std::unexpected(std::move(registered.error()));
     }
-    auto bundle = std::make_shared<DeviceBundle>(
-        DeviceBundle::Parts{.identifier = std::move(manifest->identifier),
-                            .developmentLanguage = std::move(manifest->developmentLanguage),
-                            .tables = std::move(*tables),
-                            .images = BundleImages::read(path, _log),
-                            .principalClass = *principalClass,
-                            .settings = &_settings});
+    auto bundle = std::make_shared<DeviceBundle>(DeviceBundle::Parts{
+        .identifier = std::move(manifest->identifier),
+        .developmentLanguage = std::move(manifest->developmentLanguage),
+        .tables = std::move(*tables),
+        .images = BundleImages::read(path, _log),
+        .principalClass = _classes.classNamed(manifest->principalClass.value_or("")),
+        .settings = &_settings});
     const std::scoped_lock lock(_mutex);
     _bundles.emplace(folder, bundle);
     return bundle;
@@ -129,23 +130,30 @@ void DeviceBundles::setFindable(const BundleIdentifier& identifier, bool findabl
     }
 }
 
-std::expected<const ControllerClass*, Error>
-DeviceBundles::registerClasses(const std::filesystem::path& executable,
-                               const std::string& principalClass) {
-    const auto registerBundle = entryPoint(executable);
-    if (!registerBundle) {
-        return std::unexpected(registerBundle.error());
+std::expected<void, Error> DeviceBundles::registerClasses(const std::filesystem::path& path,
+                                                          const Manifest& manifest,
+                                                          FirstClass firstClass) {
+    const std::filesystem::path executable = path / manifest.executable;
+    auto classes = classesIn(executable);
+    if (!classes) {
+        return std::unexpected(std::move(classes.error()));
     }
-    if (!(*registerBundle)(_classes)) {
+    if (firstClass == FirstClass::needed) {
+        if (!manifest.principalClass) {
+            return std::unexpected(
+                deviceError((path / "manifest.json").string() + ": names no principalClass"));
+        }
+        if (classes->classNamed(*manifest.principalClass) == nullptr) {
+            return std::unexpected(deviceError(executable.string() + ": registers no class named " +
+                                               *manifest.principalClass +
+                                               ", the manifest's principalClass"));
+        }
+    }
+    if (!_classes.takeClassesOf(*classes)) {
         return std::unexpected(
             deviceError(executable.string() + ": the name of one of its classes is taken"));
     }
-    const ControllerClass* const first = _classes.classNamed(principalClass);
-    if (first == nullptr) {
-        return std::unexpected(deviceError(executable.string() + ": registers no class named " +
-                                           principalClass + ", the manifest's principalClass"));
-    }
-    return first;
+    return {};
 }
 
 } // namespace nimbra::device

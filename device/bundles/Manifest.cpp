@@ -11,11 +11,13 @@ std::expected<Manifest, Error> Manifest::read(const std::filesystem::path& bundl
         return std::unexpected(reader.error());
     }
     reader->allowOnly({"identifier", "executable", "principalClass", "developmentLanguage"});
-    Manifest manifest{.identifier = BundleIdentifier(readName(reader->member("identifier"))),
-                      .executable = readName(reader->member("executable")),
-                      .principalClass = readName(reader->member("principalClass")),
-                      .developmentLanguage =
-                          readLocale(reader->member("developmentLanguage"), "en")};
+    const JsonReader principalClass = reader->member("principalClass");
+    Manifest manifest{
+        .identifier = BundleIdentifier(readName(reader->member("identifier"))),
+        .executable = readName(reader->member("executable")),
+        .principalClass =
+            principalClass.isAbsent() ? std::nullopt : std::optional(readName(principalClass)),
+        .developmentLanguage = readLocale(reader->member("developmentLanguage"), "en")};
     if (manifest.executable.find('/') != std::string::npos) {
         reader->member("executable").expected("the name of a file beside the manifest");
     }

@@ -5,6 +5,7 @@
 
 #include <expected>
 #include <filesystem>
+#include <optional>
 #include <string>
 
 namespace nimbra::device {
@@ -14,8 +15,8 @@ struct Manifest {
     BundleIdentifier identifier;
     /// The file name of the shared object beside the manifest.
     std::string executable;
-    /// The class of the shared object that a host creates first.
-    std::string principalClass;
+    /// The class of the shared object that a host creates first; absent where it creates none.
+    std::optional<std::string> principalClass;
     /// The language to which texts fall back in the end.
     std::string developmentLanguage;
 

@@ -10,6 +10,7 @@ class DeviceFileManager final : public FileManager {
 public:
     explicit DeviceFileManager(DocumentsFile documents);
 
+    [[nodiscard]] Text SystemRootDirectory() const override;
     [[nodiscard]] Text tidewaterIdentityToken() override;
 
 private:

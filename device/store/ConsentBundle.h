@@ -1,7 +1,9 @@
 #pragma once
 
+#include "device/DeviceError.h"
 #include "platform/system/Bundle.h"
 
+#include <expected>
 #include <memory>
 #include <optional>
 #include <utility>
@@ -24,6 +26,10 @@ public:
     }
     [[nodiscard]] std::shared_ptr<const Image> imageNamed(const Text& /*name*/) const override {
         return nullptr;
+    }
+    [[nodiscard]] bool isLoaded() const override { return false; }
+    std::expected<void, Error> load() override {
+        return std::unexpected(deviceError("an application is not loaded by another one"));
     }
 
 private:

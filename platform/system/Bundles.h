@@ -16,6 +16,10 @@ public:
     [[nodiscard]] virtual std::shared_ptr<Bundle>
     bundleWithIdentifier(const BundleIdentifier& identifier) const = 0;
 
+    /// The bundle in the folder that the device calls `path`, loaded or not; null where no folder
+    /// is. One that is loaded stays found when its folder goes.
+    [[nodiscard]] virtual std::shared_ptr<Bundle> bundleWithPath(const Text& path) = 0;
+
     /// The bundle whose shared object holds `classType`; null for a class of no known bundle.
     [[nodiscard]] virtual std::shared_ptr<Bundle>
     bundleForClass(const std::type_info& classType) const = 0;

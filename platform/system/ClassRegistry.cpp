@@ -1,8 +1,19 @@
 #include "platform/system/ClassRegistry.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace nimbra {
+
+namespace {
+
+template <class Classes>
+bool shareAName(const Classes& some, const Classes& others) {
+    return std::ranges::any_of(some,
+                               [&others](const auto& one) { return others.contains(one.first); });
+}
+
+} // namespace
 
 bool ClassRegistry::registerClass(ControllerClass controllerClass) {
     std::string name = controllerClass.name;
@@ -22,6 +33,16 @@ bool ClassRegistry::registerHeaderFooterClass(HeaderFooterClass headerFooterClas
 const HeaderFooterClass* ClassRegistry::headerFooterClassNamed(const std::string& name) const {
     const auto entry = _headerFooterClasses.find(name);
     return entry != _headerFooterClasses.end() ? &entry->second : nullptr;
+}
+
+bool ClassRegistry::takeClassesOf(ClassRegistry& others) {
+    if (shareAName(others._classes, _classes) ||
+        shareAName(others._headerFooterClasses, _headerFooterClasses)) {
+        return false;
+    }
+    _classes.merge(others._classes);
+    _headerFooterClasses.merge(others._headerFooterClasses);
+    return true;
 }
 
 } // namespace nimbra

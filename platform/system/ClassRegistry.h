@@ -1,5 +1,7 @@
 #pragma once
 
+#include "platform/values/RowValue.h"
+
 #include <functional>
 #include <map>
 #include <memory>
@@ -17,6 +19,9 @@ struct ControllerClass {
     std::string name;
     /// Makes a controller over the given services, which outlive it.
     std::function<std::shared_ptr<SettingsListController>(const PlatformServices&)> create;
+    /// What the class itself answers, without an object of it, by the operation's name: for
+    /// example "tessaryNumAppGroups", a number. Called on the main queue each time somebody asks.
+    std::map<std::string, std::function<RowValue()>> classOperations;
 };
 
 /// A class of views above or under a group's rows, which the group names.
@@ -40,6 +45,10 @@ public:
     /// The same for classes of views above or under a group's rows.
     [[nodiscard]] bool registerHeaderFooterClass(HeaderFooterClass headerFooterClass);
     [[nodiscard]] const HeaderFooterClass* headerFooterClassNamed(const std::string& name) const;
+
+    /// Takes all classes of `others`, which stay where they are in memory and are `others`' no
+    /// more; false, and nothing changed, when a name of one of them is taken.
+    [[nodiscard]] bool takeClassesOf(ClassRegistry& others);
 
 private:
     std::map<std::string, ControllerClass> _classes;

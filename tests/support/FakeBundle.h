@@ -3,6 +3,8 @@
 #include "platform/system/Bundle.h"
 #include "platform/views/Image.h"
 
+#include <expected>
+#include <functional>
 #include <map>
 #include <memory>
 #include <optional>
@@ -34,7 +36,20 @@ public:
         return entry != images.end() ? entry->second : nullptr;
     }
 
+    [[nodiscard]] bool isLoaded() const override { return loaded; }
+    std::expected<void, Error> load() override {
+        ++loads;
+        loaded = onLoad();
+        return loaded ? std::expected<void, Error>()
+                      : std::unexpected(Error{"bundle", 1, "cannot be loaded"});
+    }
+
     std::map<std::string, std::shared_ptr<const Image>> images;
+    bool loaded = true;
+    /// How often it was to be loaded.
+    int loads = 0;
+    /// What loading does; false where it fails.
+    std::function<bool()> onLoad = [] { return true; };
 
 private:
     std::optional<BundleIdentifier> _identifier;

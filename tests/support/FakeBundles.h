@@ -17,6 +17,10 @@ public:
         ++lookups;
         return paneBundle && paneBundle->identifier() == identifier ? paneBundle : nullptr;
     }
+    [[nodiscard]] std::shared_ptr<Bundle> bundleWithPath(const Text& path) override {
+        pathsAskedFor.push_back(path.string());
+        return bundleAtPath;
+    }
     [[nodiscard]] std::shared_ptr<Bundle>
     bundleForClass(const std::type_info& classType) const override {
         classesAskedFor.emplace_back(classType.name());
@@ -27,11 +31,17 @@ public:
         std::map<std::string, Text>{{"CLOUD_DRIVE", "Nimbra Drive"},
                                     {"CLOUD_DRIVE_UPGRADE_LINK", "Upgrade"},
                                     {"CLOUD_DRIVE_EXPLANATION", "Keeps your documents."},
+                                    {"CLOUD_DRIVE_PRIVACY_INFO", "Look me up"},
+                                    {"CLOUD_DRIVE_NUM_APPS", "{0} apps"},
                                     {"TURNING_ON_CLOUD_DRIVE", "Turning on"},
                                     {"TURNING_OFF_CLOUD_DRIVE", "Turning off"},
                                     {"CLOUD_DRIVE_CELLULAR", "Cellular"},
                                     {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI", "Over Wi-Fi."},
                                     {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI_WLAN", "Over WLAN."}});
+    /// The bundle that stands at every path; null for none.
+    std::shared_ptr<FakeBundle> bundleAtPath;
+    /// The paths at which a bundle was looked for, in order.
+    std::vector<std::string> pathsAskedFor;
     /// How often a bundle was looked up.
     mutable int lookups = 0;
     /// The bundle that every class belongs to.

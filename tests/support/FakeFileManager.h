@@ -6,8 +6,10 @@ namespace nimbra::test {
 
 class FakeFileManager final : public FileManager {
 public:
+    [[nodiscard]] Text SystemRootDirectory() const override { return root; }
     [[nodiscard]] Text tidewaterIdentityToken() override { return identity; }
 
+    Text root{"/"};
     Text identity{"token"};
 };
 

@@ -2,6 +2,7 @@
 
 #include "device/system/DeviceNotificationCenter.h"
 #include "platform/PlatformServices.h"
+#include "platform/system/ClassRegistry.h"
 #include "platform/views/ViewAnimations.h"
 #include "tests/support/FakeAccountStore.h"
 #include "tests/support/FakeAppTerminator.h"
@@ -40,6 +41,7 @@ struct TestPlatform {
     PumpedQueues workQueues;
     FakeFileManager fileManager;
     FakeBundles bundles;
+    ClassRegistry classes;
     FakeLocalization localization;
     FakeDeviceInfo deviceInfo;
     FakeRestrictionsProfile restrictions;
@@ -64,6 +66,7 @@ struct TestPlatform {
                 .workQueues = workQueues,
                 .fileManager = fileManager,
                 .bundles = bundles,
+                .classes = classes,
                 .localization = localization,
                 .deviceInfo = deviceInfo,
                 .restrictions = restrictions,

@@ -2,7 +2,9 @@
 
 #include "host/core/RowDescription.h"
 #include "host/core/trace/Trace.h"
+#include "platform/accounts/Account.h"
 #include "platform/host/SettingsListController.h"
+#include "platform/system/ClassRegistry.h"
 #include "platform/views/ViewAnimations.h"
 
 #include <string>
@@ -35,7 +37,8 @@ SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
       _appTerminator(services.appTerminator, trace), _systemLog(trace),
       _distributedNotificationCenter(services.distributedNotificationCenter, trace),
       _progressReports(services.progressReports, trace),
-      _deviceListRequests(services.deviceListRequests, trace), _table(trace), _parent(trace),
+      _deviceListRequests(services.deviceListRequests, trace), _bundles(services.bundles, trace),
+      _table(trace), _parent(trace),
       _earlierSyslogSink(replaceSyslogSink([&trace](int priority, const std::string& message) {
           trace.write("syslog", {{"priority", priority}, {"message", message}});
       })) {
@@ -61,6 +64,7 @@ PlatformServices SessionTracer::services() {
     services.distributedNotificationCenter = _distributedNotificationCenter;
     services.progressReports = _progressReports;
     services.deviceListRequests = _deviceListRequests;
+    services.bundles = _bundles;
     return services;
 }
 
@@ -77,6 +81,14 @@ void SessionTracer::observeRefreshControl(SettingsListController& pane) {
 
 void SessionTracer::observeParent(SettingsListController& parent) {
     parent.setObserver(&_parent);
+}
+
+void SessionTracer::traceDetail(const Specifier& row) {
+    const ControllerClass* pageClass = row.detailControllerClass();
+    const auto account = userInfoValue<std::shared_ptr<Account>>(row.userInfo(), AccountKey);
+    _trace.write("detail",
+                 {{"class", jsonOf(pageClass != nullptr ? Text(pageClass->name) : Text())},
+                  {"account", jsonOf(account ? Text(account->identifier().string()) : Text())}});
 }
 
 } // namespace nimbra::host

@@ -4,6 +4,7 @@
 #include "host/core/trace/TableTracer.h"
 #include "host/core/trace/TracingAccountStore.h"
 #include "host/core/trace/TracingAppTerminator.h"
+#include "host/core/trace/TracingBundles.h"
 #include "host/core/trace/TracingDeviceListRequests.h"
 #include "host/core/trace/TracingDistributedNotificationCenter.h"
 #include "host/core/trace/TracingDocumentContainers.h"
@@ -20,7 +21,8 @@
 
 namespace nimbra {
 class SettingsListController;
-}
+class Specifier;
+} // namespace nimbra
 
 namespace nimbra::host {
 
@@ -49,6 +51,8 @@ public:
     void observeRefreshControl(SettingsListController& pane);
     /// Traces that `parent` is built anew.
     void observeParent(SettingsListController& parent);
+    /// Traces that the link `row` is opened.
+    void traceDetail(const Specifier& row);
 
 private:
     PlatformServices _services;
@@ -64,6 +68,7 @@ private:
     TracingDistributedNotificationCenter _distributedNotificationCenter;
     TracingProgressReports _progressReports;
     TracingDeviceListRequests _deviceListRequests;
+    TracingBundles _bundles;
     TableTracer _table;
     ParentTracer _parent;
     SyslogSink _earlierSyslogSink;

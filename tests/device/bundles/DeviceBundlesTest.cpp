@@ -49,7 +49,7 @@ TEST_F(DeviceBundlesTest, AnotherPlatformOfTheProcessLoadsTheSameFolderForItself
     makeBundle(folder());
     const auto bundle = load();
     ClassRegistry otherClasses;
-    DeviceBundles others(settings(), otherClasses, log());
+    DeviceBundles others(paths(), settings(), otherClasses, log());
 
     const auto other = others.load(folder());
 
@@ -115,7 +115,7 @@ TEST_F(DeviceBundlesTest, AClassOfNoLoadedBundleHasNone) {
     makeBundle(folder());
     const auto bundle = load();
     ClassRegistry otherClasses;
-    const DeviceBundles others(settings(), otherClasses, log());
+    const DeviceBundles others(paths(), settings(), otherClasses, log());
     const auto object = objectOf(*bundle);
 
     EXPECT_EQ(bundles().bundleForClass(typeid(DeviceBundles)), nullptr);

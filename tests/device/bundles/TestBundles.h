@@ -20,6 +20,7 @@ protected:
     BundlesFixture() : _settings(openSettings()) {}
 
     [[nodiscard]] std::filesystem::path folder() const { return _directory.path() / "A.bundle"; }
+    [[nodiscard]] DevicePaths paths() const { return DevicePaths(_directory.path() / "device"); }
     [[nodiscard]] DeviceSettings& settings() { return _settings; }
     [[nodiscard]] DeviceBundles& bundles() { return _bundles; }
     [[nodiscard]] ClassRegistry& classes() { return _classes; }
@@ -66,7 +67,7 @@ private:
     DeviceSettings _settings;
     ClassRegistry _classes;
     test::RecordingLog _log;
-    DeviceBundles _bundles{_settings, _classes, _log};
+    DeviceBundles _bundles{paths(), _settings, _classes, _log};
 };
 
 } // namespace nimbra::device

@@ -36,6 +36,10 @@ TEST_F(DeviceFileManagerTest, TheIdentityTokenIsTheOneOfTheFileNow) {
     EXPECT_TRUE(log().lines().empty());
 }
 
+TEST_F(DeviceFileManagerTest, TheSystemsRootIsTheDevicesOwn) {
+    EXPECT_EQ(fileManager().SystemRootDirectory(), Text("/"));
+}
+
 TEST_F(DeviceFileManagerTest, AFileThatCannotBeReadMeansNobodyAndOneLine) {
     writeDocuments(R"({"identity": 7})");
 
