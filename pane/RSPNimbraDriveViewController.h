@@ -7,6 +7,7 @@
 #include "upgrade/RSPUpgradeViewControllerDelegate.h"
 
 #include <atomic>
+#include <cstdint>
 #include <memory>
 #include <mutex>
 #include <optional>
@@ -56,7 +57,7 @@ protected:
     [[nodiscard]] virtual SpecifierArray _appSpecifiersForPRVServices();
     /// The group and the switch of cellular data; nothing on a device without it.
     [[nodiscard]] std::optional<SpecifierArray> _createSpecifiersForCellularSwitchCell();
-    /// The row of the cloud database; null for none.
+    /// The link to the settings of the cloud database; null for an account without it.
     [[nodiscard]] virtual std::shared_ptr<Specifier> _specifierForTessary();
     /// The group and the button of diagnostics; nothing while diagnostics are off.
     [[nodiscard]] virtual std::optional<SpecifierArray> _createSpecifiersForDiagnostics();
@@ -102,6 +103,10 @@ private:
 
     [[nodiscard]] RowValue _useCellular(const Specifier& row);
     void _setUseCellularForSpecifier(const RowValue& value, const std::shared_ptr<Specifier>& row);
+
+    void _loadTessarySettingsBundleIfNeeded();
+    [[nodiscard]] std::optional<std::int64_t> _numberOfAppsUsingTessary();
+    [[nodiscard]] RowValue _valueForTessarySpecifier(const Specifier& row);
 
     void _upgradeButtonWasTapped(const std::shared_ptr<Specifier>& row);
 

@@ -110,11 +110,7 @@ void RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndData
     }
 }
 
-// Until diagnostics and the cloud database have rows of their own, these answer with nothing.
-
-std::shared_ptr<Specifier> RSPNimbraDriveViewController::_specifierForTessary() {
-    return nullptr;
-}
+// Until diagnostics have rows of their own, this answers with nothing.
 
 std::optional<SpecifierArray> RSPNimbraDriveViewController::_createSpecifiersForDiagnostics() {
     return std::nullopt;

@@ -44,6 +44,8 @@ public:
     /// Absent: the rows that the page itself makes of the consent records.
     std::optional<SpecifierArray> apps = SpecifierArray();
     std::shared_ptr<Specifier> tessary;
+    /// Whether the row of the cloud database is the page's own instead.
+    bool makesTessaryRow = false;
     std::optional<SpecifierArray> diagnostics;
     int appQueries = 0;
     /// The sources that were asked for rows, in order.
@@ -57,7 +59,7 @@ protected:
     }
     std::shared_ptr<Specifier> _specifierForTessary() override {
         asked.emplace_back("tessary");
-        return tessary;
+        return makesTessaryRow ? RSPNimbraDriveViewController::_specifierForTessary() : tessary;
     }
     std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override {
         asked.emplace_back("diagnostics");
