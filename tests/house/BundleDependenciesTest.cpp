@@ -1,5 +1,6 @@
 #include "tests/house/Command.h"
 
+#include <filesystem>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 #include <regex>
@@ -22,20 +23,28 @@ std::vector<std::string> neededBy(const std::string& path) {
     return needed;
 }
 
-TEST(BundleDependencies, ThePaneNeedsThePlatformTheRuntimeAndLibcOnly) {
+class BundleDependencies : public testing::TestWithParam<const char*> {};
+
+TEST_P(BundleDependencies, ABundleNeedsThePlatformTheRuntimeAndLibcOnly) {
     std::string allowed =
         R"((libnimbra-platform|libstdc\+\+|libgcc_s|libc|libm|ld-linux.*)\.so\..*)";
 #if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
     allowed += R"(|lib(asan|ubsan|tsan)\.so\..*)";
 #endif
 
-    const std::vector<std::string> needed = neededBy(NIMBRA_BUNDLE_OBJECT);
+    const std::vector<std::string> needed = neededBy(GetParam());
 
     EXPECT_THAT(needed, testing::Each(testing::Truly([&](const std::string& name) {
                     return std::regex_match(name, std::regex(allowed));
                 })));
     EXPECT_THAT(needed, testing::Contains(testing::StartsWith("libnimbra-platform.so")));
 }
+
+INSTANTIATE_TEST_SUITE_P(Every, BundleDependencies,
+                         testing::Values(NIMBRA_BUNDLE_OBJECT, NIMBRA_DATABASE_BUNDLE_OBJECT),
+                         [](const auto& object) {
+                             return std::filesystem::path(object.param).stem().string();
+                         });
 
 } // namespace
 } // namespace nimbra::test

@@ -22,6 +22,7 @@ protected:
         tree.write("footer/Footer.h", "#include \"support/Lookup.h\"\n");
         tree.write("upgrade/Upgrade.h", "#include \"support/Lookup.h\"\n");
         tree.write("pane/Pane.h", "#include \"footer/Footer.h\"\n#include \"upgrade/Upgrade.h\"\n");
+        tree.write("samples/Sample.cpp", "#include \"platform/Text.h\"\n#include <dlfcn.h>\n");
         tree.write("device/json/Reader.h", "#include <nlohmann/json.hpp>\n");
         tree.write("device/store/Store.h", "#include \"device/json/Reader.h\"\n");
         tree.write("device/bundles/Bundles.h", "#include \"device/json/Reader.h\"\n");
@@ -77,6 +78,14 @@ TEST_F(LayerCheck, TheFooterAndTheUpgradeDoNotKnowEachOther) {
     tree.write("footer/Footer.h", "#include \"upgrade/Upgrade.h\"\n");
 
     expectFault("footer/Footer.h:1", R"(includes "upgrade/Upgrade.h"; beside itself footer may)");
+}
+
+TEST_F(LayerCheck, SamplesStandOverThePlatformAlone) {
+    tree.write("samples/Sample.cpp", "#include \"pane/Pane.h\"\n#include <nlohmann/json.hpp>\n");
+
+    expectFault("samples/Sample.cpp:1",
+                R"(includes "pane/Pane.h"; beside itself samples may include platform)");
+    expectFault("samples/Sample.cpp:2", "includes <nlohmann/json.hpp>");
 }
 
 TEST_F(LayerCheck, ThePaneMayNotIncludeTheDevice) {
