@@ -20,7 +20,6 @@ struct LaterPart {
 };
 
 constexpr std::array laterParts{
-    LaterPart{"databaseSettings", checkDatabaseSettings},
     LaterPart{"tool", checkTool},
 };
 
@@ -33,8 +32,8 @@ constexpr std::array parts{
     Part{"preferences", readPreferences}, Part{"restrictions", readRestrictions},
     Part{"accounts", readAccounts},       Part{"apps", readApplications},
     Part{"consent", readConsent},         Part{"documents", readDocuments},
-    Part{"deviceList", readDeviceList},   Part{"strings", readStrings},
-    Part{"faults", readFaults},
+    Part{"deviceList", readDeviceList},   Part{"databaseSettings", readDatabaseSettings},
+    Part{"strings", readStrings},         Part{"faults", readFaults},
 };
 
 } // namespace

@@ -67,6 +67,11 @@ struct DeviceDescription {
         double delay = 0;
     };
 
+    /// The settings of the cloud database, which have a bundle of their own.
+    struct DatabaseSettings {
+        std::int64_t numAppGroups = 0;
+    };
+
     std::string name = "Nimbra Phone";
     std::string idiom = "phone";
     std::optional<Screen> screen = Screen();
@@ -90,6 +95,8 @@ struct DeviceDescription {
     /// Whether nobody has given the sentence: the device composes it from the date.
     bool composesLastSyncText = false;
     DeviceList deviceList;
+    /// Nothing for a device without the bundle.
+    std::optional<DatabaseSettings> databaseSettings;
     /// The table "Localizable" instead of the bundle's own.
     std::optional<std::map<std::string, std::string>> strings;
     bool paneBundleRegistered = true;

@@ -2,6 +2,7 @@
 
 #include "device/DeviceError.h"
 #include "device/description/ApplicationEntries.h"
+#include "device/description/DatabaseSettings.h"
 #include "device/description/DescriptionFiles.h"
 #include "device/files/DevicePaths.h"
 #include "device/files/Files.h"
@@ -134,7 +135,8 @@ std::expected<void, Error> replaceApplications(const DevicePaths& paths,
 
 /// Makes everything of a device in the empty directory `root`.
 std::expected<void, Error> buildDevice(const std::filesystem::path& root,
-                                       const DeviceDescription& description) {
+                                       const DeviceDescription& description,
+                                       const std::filesystem::path& databaseBundle) {
     const DevicePaths paths(root);
     const auto below = [&root](std::string_view devicePath) {
         return root / std::filesystem::path(devicePath).relative_path();
@@ -159,6 +161,10 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
         !written) {
         return written;
     }
+    if (auto written = replaceDatabaseSettings(paths, description.databaseSettings, databaseBundle);
+        !written) {
+        return written;
+    }
     auto accounts = AccountDatabase::create(below(kAccountsDatabase));
     auto written = accounts ? accounts->replaceAccounts(description.accounts)
                             : std::unexpected(accounts.error());
@@ -168,12 +174,13 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
 } // namespace
 
 std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
-                                                 const DeviceDescription& description) {
+                                                 const DeviceDescription& description,
+                                                 const std::filesystem::path& databaseBundle) {
     auto staged = StagedDirectory::start(root);
     if (!staged) {
         return std::unexpected(staged.error());
     }
-    if (auto built = buildDevice(staged->path(), description); !built) {
+    if (auto built = buildDevice(staged->path(), description, databaseBundle); !built) {
         // The place where it was built goes with the failure and says nothing to anybody.
         return std::unexpected(withPath(built.error(), staged->path(), root.string()));
     }
@@ -181,7 +188,8 @@ std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& ro
 }
 
 std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& root,
-                                                 const GivenDescription& change) {
+                                                 const GivenDescription& change,
+                                                 const std::filesystem::path& databaseBundle) {
     const DevicePaths paths(root);
     const DeviceDescription& description = change.description;
     const auto isGiven = [&change](const char* key) { return change.keys.contains(key); };
@@ -213,6 +221,9 @@ std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& ro
     }
     if (changed && isGiven("deviceList")) {
         changed = writeDescriptionFile(paths, deviceListFile, description);
+    }
+    if (changed && isGiven("databaseSettings")) {
+        changed = replaceDatabaseSettings(paths, description.databaseSettings, databaseBundle);
     }
     if (changed && isGiven("preferences")) {
         changed = replacePreferences(paths, description);

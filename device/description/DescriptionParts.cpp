@@ -195,6 +195,19 @@ void readDeviceList(const JsonReader& reader, DeviceDescription& description) {
     }
 }
 
+void readDatabaseSettings(const JsonReader& reader, DeviceDescription& description) {
+    description.databaseSettings.reset();
+    if (reader.isNull()) {
+        return;
+    }
+    if (!reader.isObject()) {
+        reader.expected("an object or null");
+        return;
+    }
+    reader.allowOnly({"numAppGroups"});
+    description.databaseSettings = {.numAppGroups = reader.member("numAppGroups").integer()};
+}
+
 void readStrings(const JsonReader& reader, DeviceDescription& description) {
     description.strings.emplace();
     for (const std::string& key : reader.keys()) {

@@ -17,6 +17,7 @@ void readApplications(const JsonReader& reader, DeviceDescription& description);
 void readConsent(const JsonReader& reader, DeviceDescription& description);
 void readDocuments(const JsonReader& reader, DeviceDescription& description);
 void readDeviceList(const JsonReader& reader, DeviceDescription& description);
+void readDatabaseSettings(const JsonReader& reader, DeviceDescription& description);
 void readStrings(const JsonReader& reader, DeviceDescription& description);
 void readFaults(const JsonReader& reader, DeviceDescription& description);
 

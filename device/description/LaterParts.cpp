@@ -31,25 +31,11 @@ void checkOutcomes(const JsonReader& reader, CheckFailure checkFailure) {
     }
 }
 
-constexpr std::int64_t lowestNumber = INT32_MIN;
-constexpr std::int64_t highestNumber = INT32_MAX;
 constexpr int highestExit = 255;
 constexpr int highestSignal = 64;
 constexpr int highestErrno = 4095;
 
 } // namespace
-
-void checkDatabaseSettings(const JsonReader& reader) {
-    if (reader.isNull()) {
-        return;
-    }
-    if (!reader.isObject()) {
-        reader.expected("an object or null");
-        return;
-    }
-    reader.allowOnly({"numAppGroups"});
-    checkIntegerBetween(reader.member("numAppGroups"), lowestNumber, highestNumber);
-}
 
 void checkTool(const JsonReader& reader) {
     if (reader.isNull() || (reader.isString() && reader.string() == "real")) {

@@ -7,7 +7,6 @@ class JsonReader;
 // Parts of a device's description that nothing on the device uses yet: they are checked, so that a
 // description is right or wrong whatever the version that reads it.
 
-void checkDatabaseSettings(const JsonReader& reader);
 void checkTool(const JsonReader& reader);
 /// Of the faults only those that no service uses yet.
 void checkFaults(const JsonReader& reader);

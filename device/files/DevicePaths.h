@@ -23,6 +23,8 @@ inline constexpr std::string_view kPriorityHintsDirectory = "/run/nimbra/priorit
 inline constexpr std::string_view kProgressDirectory = "/run/nimbra/progress";
 inline constexpr std::string_view kNotificationsDirectory = "/run/nimbra/notifications";
 inline constexpr std::string_view kApplicationsDirectory = "/usr/share/applications";
+inline constexpr std::string_view kDatabaseSettingsBundle =
+    "/System/Library/PreferenceBundles/AccountSettings/TessarySettings.bundle";
 inline constexpr std::string_view kLogFile = "/var/log/nimbra/settings.log";
 
 /// Turns a path on the device into one of this machine: the last step before the file system.

@@ -70,7 +70,8 @@ std::expected<void, Failure> provideDevice(const std::filesystem::path& root,
     if (!sample) {
         return std::unexpected(sample.error());
     }
-    const auto made = device::createDeviceDirectory(root, sample->description);
+    const auto made =
+        device::createDeviceDirectory(root, sample->description, host::findDatabaseBundle());
     if (made) {
         messages << "settingsctl: made the sample device in " << root.string() << '\n';
     } else if (!isThere(root)) {
@@ -87,7 +88,9 @@ std::expected<void, Failure> initializeDevice(const std::filesystem::path& root,
     if (!given) {
         return std::unexpected(given.error());
     }
-    if (const auto made = device::createDeviceDirectory(root, given->description); !made) {
+    if (const auto made =
+            device::createDeviceDirectory(root, given->description, host::findDatabaseBundle());
+        !made) {
         return badInput(made.error());
     }
     for (const std::string& key : device::keysWithoutEffect(*given)) {

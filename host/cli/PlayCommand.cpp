@@ -3,6 +3,7 @@
 #include "device/DeviceDirectory.h"
 #include "device/files/Files.h"
 #include "device/system/StandingTime.h"
+#include "host/core/BundleSearch.h"
 #include "host/core/PaneSession.h"
 #include "host/core/scenario/RunningApplications.h"
 #include "host/core/scenario/ScenarioPlayer.h"
@@ -39,7 +40,9 @@ std::expected<void, Failure> playOn(const std::filesystem::path& root,
                                     host::RunningApplications& applications,
                                     const host::Scenario& scenario, const PlayOptions& options,
                                     std::ostream& out) {
-    if (const auto made = device::createDeviceDirectory(root, scenario.device.description); !made) {
+    if (const auto made = device::createDeviceDirectory(root, scenario.device.description,
+                                                        host::findDatabaseBundle());
+        !made) {
         return badInput(made.error());
     }
     const auto running = applications.setRunning(scenario.device.description.runningApplications());

@@ -1,17 +1,24 @@
 #include "host/core/BundleSearch.h"
 
-#include <array>
 #include <system_error>
 
 namespace nimbra::host {
 
 namespace {
 
-constexpr const char* bundleName = "NimbraDriveSettings.bundle";
+constexpr const char* paneBundle = "NimbraDriveSettings.bundle";
 
 bool isThere(const std::filesystem::path& path) {
     std::error_code ignored;
     return std::filesystem::exists(path, ignored);
+}
+
+/// The bundle called `name` that came with this program, built or installed.
+std::filesystem::path suppliedBundle(const char* name) {
+    const std::filesystem::path programs = executableDirectory();
+    auto built = programs / name;
+    return isThere(built) ? built
+                          : (programs / ".." / NIMBRA_LIBDIR / "nimbra" / name).lexically_normal();
 }
 
 } // namespace
@@ -22,17 +29,12 @@ std::filesystem::path executableDirectory() {
 }
 
 std::filesystem::path findPaneBundle(const std::filesystem::path& root) {
-    const std::filesystem::path programs = executableDirectory();
-    const std::array candidates{
-        root / "System/Library/PreferenceBundles/AccountSettings" / bundleName,
-        programs / bundleName,
-        (programs / ".." / NIMBRA_LIBDIR / "nimbra" / bundleName).lexically_normal()};
-    for (const auto& candidate : candidates) {
-        if (isThere(candidate)) {
-            return candidate;
-        }
-    }
-    return candidates.back();
+    const auto onDevice = root / "System/Library/PreferenceBundles/AccountSettings" / paneBundle;
+    return isThere(onDevice) ? onDevice : suppliedBundle(paneBundle);
+}
+
+std::filesystem::path findDatabaseBundle() {
+    return suppliedBundle("TessarySettings.bundle");
 }
 
 } // namespace nimbra::host

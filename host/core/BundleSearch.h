@@ -13,4 +13,8 @@ namespace nimbra::host {
 /// none is found, so that loading it says what is missing.
 [[nodiscard]] std::filesystem::path findPaneBundle(const std::filesystem::path& root);
 
+/// The folder of the settings bundle of the cloud database that came with this program, to be put
+/// on a device; a folder that is not there when none is found.
+[[nodiscard]] std::filesystem::path findDatabaseBundle();
+
 } // namespace nimbra::host

@@ -232,24 +232,34 @@ TEST(DeviceDescriptionTest, FaultsAreReadInTheirOrder) {
               (std::vector<std::optional<bool>>{false, std::nullopt, false}));
 }
 
+TEST(DeviceDescriptionTest, TheDatabasesSettingsHaveANumberOrAreNotThere) {
+    const auto settings = [](const std::string& text) {
+        return given(R"({"databaseSettings": )" + text + "}").description.databaseSettings;
+    };
+
+    EXPECT_FALSE(given("{}").description.databaseSettings);
+    EXPECT_FALSE(settings("null"));
+    EXPECT_EQ(settings("{}").value().numAppGroups, 0);
+    EXPECT_EQ(settings(R"({"numAppGroups": -2})").value().numAppGroups, -2);
+    EXPECT_EQ(settings(R"({"numAppGroups": 2147483648})").value().numAppGroups, 2147483648);
+}
+
 TEST(DeviceDescriptionTest, PartsThatNothingUsesYetAreCheckedAndNamed) {
     const auto everything = given(R"({
         "name": "x",
         "apps": [{"identifier": "com.a"}],
         "consent": [{"service": "kPRVServiceTidewater"}],
         "deviceList": {"incompatible": ["Old Phone"], "needUpgrade": []},
-        "databaseSettings": {"numAppGroups": 3},
         "tool": {"exit": 1, "signal": null, "writesArchive": false},
         "faults": {"save": [null, {"domain": "D", "code": 1, "description": "d"}],
                    "consentSet": [false, null], "removeItem": [], "createDirectory": [null],
                    "spawn": [2, null]}})");
     EXPECT_EQ(keysWithoutEffect(everything),
-              (Strings{"databaseSettings", "tool", "faults/createDirectory", "faults/removeItem",
-                       "faults/spawn"}));
+              (Strings{"tool", "faults/createDirectory", "faults/removeItem", "faults/spawn"}));
 
     const auto others =
         given(R"({"deviceList": null, "databaseSettings": null, "tool": null, "name": "x"})");
-    EXPECT_EQ(keysWithoutEffect(others), (Strings{"databaseSettings", "tool"}));
+    EXPECT_EQ(keysWithoutEffect(others), (Strings{"tool"}));
     EXPECT_EQ(keysWithoutEffect(given(R"({"deviceList": "never", "tool": "real"})")),
               (Strings{"tool"}));
     EXPECT_TRUE(keysWithoutEffect(given(R"({"name": "x", "accounts": []})")).empty());

@@ -7,6 +7,7 @@
 #include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/StandingTime.h"
+#include "host/core/BundleSearch.h"
 #include "host/core/PaneSession.h"
 #include "host/core/RowDescription.h"
 #include "host/core/scenario/RunningApplications.h"
@@ -198,7 +199,9 @@ ScenarioPlayer::Outcome ScenarioPlayer::post(const ScenarioStep& step) {
 
 ScenarioPlayer::Outcome ScenarioPlayer::change(const ScenarioStep& step) {
     const device::GivenDescription& change = std::get<ChangeArguments>(step.arguments).device;
-    if (const auto changed = device::changeDeviceDirectory(_session.root(), change); !changed) {
+    if (const auto changed =
+            device::changeDeviceDirectory(_session.root(), change, findDatabaseBundle());
+        !changed) {
         return std::unexpected(changed.error().description);
     }
     if (const auto reloaded = _session.device().settings().reload(); !reloaded) {

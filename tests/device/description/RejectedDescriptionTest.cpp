@@ -178,13 +178,22 @@ INSTANTIATE_TEST_SUITE_P(
                   "/deviceList/delay: unknown key; expected one of incompatible, needUpgrade"}));
 
 INSTANTIATE_TEST_SUITE_P(
+    DatabaseSettings, RejectedDescriptionTest,
+    testing::Values(std::pair{R"({"databaseSettings": 3})",
+                              "/databaseSettings: expected an object or null, found 3"},
+                    std::pair{R"({"databaseSettings": {"numAppGroups": "many"}})",
+                              "/databaseSettings/numAppGroups: expected an integer, "
+                              "found \"many\""},
+                    std::pair{R"({"databaseSettings": {"numAppGroups": 9223372036854775808}})",
+                              "/databaseSettings/numAppGroups: expected an integer, "
+                              "found 9223372036854775808"},
+                    std::pair{R"({"databaseSettings": {"groups": 1}})",
+                              "/databaseSettings/groups: unknown key; expected one of "
+                              "numAppGroups"}));
+
+INSTANTIATE_TEST_SUITE_P(
     LaterParts, RejectedDescriptionTest,
     testing::Values(
-        std::pair{R"({"databaseSettings": 3})",
-                  "/databaseSettings: expected an object or null, found 3"},
-        std::pair{R"({"databaseSettings": {"numAppGroups": "many"}})",
-                  "/databaseSettings/numAppGroups: expected an integer, "
-                  "found \"many\""},
         std::pair{R"({"tool": "fake"})",
                   R"(/tool: expected an object, null or "real", found "fake")"},
         std::pair{R"({"tool": {"exit": 256}})",
