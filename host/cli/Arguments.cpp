@@ -130,7 +130,7 @@ private:
             "Prints what changes: + stands before a row that came, - before one that went,\n"
             "~ before one that is different now.");
 
-        CLI::App* tap = add(Command::tap, "tap", "Press a button");
+        CLI::App* tap = add(Command::tap, "tap", "Press a button, or show the page of a link");
         addRow(tap);
         tap->add_flag("-y,--yes", _arguments.saysYes, "Answer yes to what the page asks");
         tap->footer("Where the button opens a screen, it is shown as text, and what it asks is\n"

@@ -86,10 +86,26 @@ PaneCommands::Outcome PaneCommands::set(std::string_view row, std::string_view v
 }
 
 PaneCommands::Outcome PaneCommands::tap(std::string_view row, const Ask& ask) {
+    if (const auto found = _session.row(row); found) {
+        if (const auto refusal = host::refusalToOpen(**found)) {
+            return refused(*refusal);
+        }
+    }
     if (const auto done = _session.tapRow(row); !done) {
         return refused(done.error());
     }
+    showDetail();
     return Dialog(_session, _out, Terminal::ofStandardOutput(), ask).lead();
+}
+
+/// Prints the page that a link has opened, and comes back from it: the rows stay the pane's.
+void PaneCommands::showDetail() {
+    host::DetailPage& detail = _session.detailPage();
+    if (const auto page = detail.page()) {
+        _session.settle();
+        _out << _text.page(detail.title(), RowDescription::of(page->specifiers()));
+        detail.leave();
+    }
 }
 
 std::string PaneCommands::takeChanges() {

@@ -30,7 +30,8 @@ public:
     [[nodiscard]] Outcome listAsJson() const;
     [[nodiscard]] Outcome get(std::string_view row) const;
     [[nodiscard]] Outcome set(std::string_view row, std::string_view value);
-    /// Taps the row, and goes through what it opens over the page with the user's answers.
+    /// Taps the row. A link's page is printed; through what a button opens over the page the user
+    /// is led, with the answers of `ask`.
     [[nodiscard]] Outcome tap(std::string_view row, const Ask& ask);
 
     /// How the rows differ now from how they were when the commands were made, or when this was
@@ -44,6 +45,7 @@ public:
     [[nodiscard]] std::vector<std::string> rowIdentifiers() const;
 
 private:
+    void showDetail();
     [[nodiscard]] std::vector<host::RowDescription> rows() const;
 
     host::PaneSession& _session;

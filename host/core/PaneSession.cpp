@@ -121,6 +121,7 @@ void PaneSession::closePane() {
     if (_isShown) {
         disappear();
     }
+    _detailPage.leave();
     _presentations.dismissAll();
     _pane->setObserver(nullptr);
     _footers.reset();
@@ -187,6 +188,9 @@ PaneSession::uncoveredRow(std::string_view name) {
     if (found && (_presentations.alert() != nullptr || _presentations.screen())) {
         return std::unexpected(refusalOfCoveredPage());
     }
+    if (found) {
+        _detailPage.leave();
+    }
     return found;
 }
 
@@ -210,8 +214,19 @@ std::expected<void, RowRefusal> PaneSession::tapRow(std::string_view name) {
     if (auto refusal = refusalToTap(**found)) {
         return std::unexpected(std::move(*refusal));
     }
-    (*found)->performButtonAction();
+    if ((*found)->cellType() == LinkListCell) {
+        openDetail(*found);
+    } else {
+        (*found)->performButtonAction();
+    }
     return {};
+}
+
+void PaneSession::openDetail(const std::shared_ptr<Specifier>& row) {
+    if (_tracer) {
+        _tracer->traceDetail(*row);
+    }
+    _detailPage.open(row, servicesForPane(), _pane);
 }
 
 void PaneSession::becomeActive() {
@@ -273,6 +288,13 @@ void PaneSession::dismissController(const ViewController& controller, bool anima
         _loop.async([this] { closePane(); });
     } else if (&controller == _presentations.screen().get()) {
         dismissPresentedController(animated);
+    } else if (&controller == _detailPage.page().get()) {
+        // As with the pane; meanwhile another page may have come in its place.
+        _loop.async([this, page = std::weak_ptr(_detailPage.page())] {
+            if (!page.expired() && page.lock() == _detailPage.page()) {
+                _detailPage.leave();
+            }
+        });
     }
 }
 

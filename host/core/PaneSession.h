@@ -2,6 +2,7 @@
 
 #include "device/system/CurrentQueue.h"
 #include "host/core/AccountPage.h"
+#include "host/core/DetailPage.h"
 #include "host/core/FixedViewMetrics.h"
 #include "host/core/GroupFooters.h"
 #include "host/core/HostLoop.h"
@@ -103,9 +104,13 @@ public:
     [[nodiscard]] GroupFooters& footers() { return *_footers; }
     /// What the pane has presented over itself; it is laid out whenever the main queue runs.
     [[nodiscard]] Presentations& presentations() { return _presentations; }
+    /// What a link row of the pane has opened. The user comes back from it when a row of the pane
+    /// is set or tapped, and when the pane closes.
+    [[nodiscard]] DetailPage& detailPage() { return _detailPage; }
     /// The row that `name` stands for.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal> row(std::string_view name);
     [[nodiscard]] std::expected<void, RowRefusal> setRow(std::string_view name, bool isOn);
+    /// Presses a button row, or opens the page of a link row; one without a page opens nothing.
     [[nodiscard]] std::expected<void, RowRefusal> tapRow(std::string_view name);
 
     // What happens on the device, pane or no pane.
@@ -131,9 +136,10 @@ private:
     void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) override;
     void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) override;
 
-    /// The row, where the user can reach it now.
+    /// The row, where the user can reach it now; from a page behind a link the user comes back.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
     uncoveredRow(std::string_view name);
+    void openDetail(const std::shared_ptr<Specifier>& row);
     void setActivity(Text activity);
     void updateFootersSoon();
     void updateFooters();
@@ -159,6 +165,7 @@ private:
     ListWatcher _listWatcher;
     std::unique_ptr<GroupFooters> _footers;
     Presentations _presentations;
+    DetailPage _detailPage;
     /// Set on any thread: on the one that posts, a notification can make the list anew.
     std::atomic<bool> _areFootersBehind = false;
     bool _isShown = false;

@@ -1,6 +1,7 @@
 #include "host/core/RowLookup.h"
 
 #include "host/core/RowDescription.h"
+#include "platform/system/ClassRegistry.h"
 
 #include <algorithm>
 #include <utility>
@@ -159,21 +160,26 @@ std::optional<RowRefusal> refusalToSet(const Specifier& row) {
 }
 
 std::optional<RowRefusal> refusalToTap(const Specifier& row) {
-    if (row.cellType() == LinkListCell) {
-        return RowRefusal{Reason::notAButton,
-                          quoted(row) + " opens another page, which this version cannot show"};
-    }
-    if (row.cellType() != ButtonCell) {
+    if (row.cellType() != ButtonCell && row.cellType() != LinkListCell) {
         return RowRefusal{Reason::notAButton,
                           quoted(row) + " is " + withArticle(row) + ", not a button"};
     }
     if (!row.isEnabled()) {
         return locked(row);
     }
-    if (!row.hasButtonAction()) {
+    if (row.cellType() == ButtonCell && !row.hasButtonAction()) {
         return RowRefusal{Reason::noAction, quoted(row) + " does nothing in this version"};
     }
     return std::nullopt;
+}
+
+std::optional<RowRefusal> refusalToOpen(const Specifier& row) {
+    const ControllerClass* pageClass = row.detailControllerClass();
+    if (row.cellType() != LinkListCell || (pageClass != nullptr && pageClass->create)) {
+        return std::nullopt;
+    }
+    return RowRefusal{Reason::noPage,
+                      quoted(row) + " leads to a page that this device does not have"};
 }
 
 } // namespace nimbra::host

@@ -21,8 +21,10 @@ struct RowRefusal {
         noValue,
         /// Only a switch can be set.
         notASwitch,
-        /// Only a button can be tapped.
+        /// Only a button and a link can be tapped.
         notAButton,
+        /// The page that the link leads to is not there.
+        noPage,
         /// The row is shown, but cannot be used now.
         locked,
         /// The switch cannot be changed at all.
@@ -49,7 +51,9 @@ findRow(const SpecifierArray& rows, std::string_view name);
 [[nodiscard]] std::optional<RowRefusal> refusalToRead(const Specifier& row);
 /// Why `row` cannot be switched on or off; nothing when it can.
 [[nodiscard]] std::optional<RowRefusal> refusalToSet(const Specifier& row);
-/// Why `row` cannot be tapped; nothing when it can.
+/// Why `row` cannot be tapped; nothing when it can, also where a link then opens no page.
 [[nodiscard]] std::optional<RowRefusal> refusalToTap(const Specifier& row);
+/// That the link `row` opens no page; nothing for one that does, and for a row of another kind.
+[[nodiscard]] std::optional<RowRefusal> refusalToOpen(const Specifier& row);
 
 } // namespace nimbra::host

@@ -1,5 +1,7 @@
 #include "host/core/RowLookup.h"
 
+#include "platform/system/ClassRegistry.h"
+
 #include <gtest/gtest.h>
 #include <string>
 
@@ -112,7 +114,30 @@ TEST(RowLookup, SaysWhyARowCannotBeTapped) {
     button->setPropertyForKey(false, EnabledKey);
     EXPECT_EQ(refusalToTap(*button)->reason, Reason::locked);
     EXPECT_EQ(refusalToTap(*row(nullptr, "a"))->reason, Reason::notAButton);
-    EXPECT_EQ(refusalToTap(*row(nullptr, "a", LinkListCell))->reason, Reason::notAButton);
+}
+
+TEST(RowLookup, ALinkCanBeTappedUnlessItIsLocked) {
+    const auto link = row(nullptr, "a", LinkListCell);
+    EXPECT_FALSE(refusalToTap(*link).has_value());
+
+    link->setPropertyForKey(false, EnabledKey);
+    EXPECT_EQ(refusalToTap(*link)->reason, Reason::locked);
+}
+
+TEST(RowLookup, SaysWhichLinkOpensNoPage) {
+    const auto linkTo = [](const ControllerClass* pageClass) {
+        return Specifier::preferenceSpecifierNamed("a",
+                                                   {.detail = pageClass, .cell = LinkListCell});
+    };
+    const ControllerClass page{.name = "Page",
+                               .create = [](const auto& /*services*/) { return nullptr; },
+                               .classOperations = {}};
+    const ControllerClass withoutPages{.name = "Class", .create = nullptr, .classOperations = {}};
+
+    EXPECT_FALSE(refusalToOpen(*linkTo(&page)).has_value());
+    EXPECT_EQ(refusalToOpen(*linkTo(nullptr))->reason, Reason::noPage);
+    EXPECT_EQ(refusalToOpen(*linkTo(&withoutPages))->reason, Reason::noPage);
+    EXPECT_FALSE(refusalToOpen(*row(nullptr, "a", ButtonCell)).has_value());
 }
 
 TEST(RowLookup, SaysWhyARowCannotBeRead) {

@@ -41,6 +41,8 @@ TEST(DefaultDevice, IsMadeFromTheSampleOnFirstUse) {
               "\n"
               "    Last synced on March 5, 2024\n"
               "\n"
+              "  Look Me Up by Email                                                   3 apps ›\n"
+              "\n"
               "  2000 Songs                                                                 off\n"
               "  Atlas                                                                      off\n"
               "  Budget                                                                     off\n"
@@ -336,12 +338,12 @@ TEST(Tap, PressesAButtonAndPrintsWhatChanges) {
               "+ Arrived                                                                      ›\n");
 }
 
-TEST(Tap, RefusesWhatIsNoButton) {
+TEST(Tap, RefusesWhatCannotBeTapped) {
     const Program program;
 
     expectRefused(runOnRows(program, {"tap", "Notes"}), "\"Notes\" is a switch, not a button");
     expectRefused(runOnRows(program, {"tap", "Storage"}),
-                  "\"Storage\" opens another page, which this version cannot show");
+                  "\"Storage\" leads to a page that this device does not have");
     expectRefused(runOnRows(program, {"tap", "Nothing Behind"}),
                   "\"Nothing Behind\" does nothing in this version");
 }
