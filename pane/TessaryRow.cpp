@@ -24,11 +24,12 @@ std::shared_ptr<Specifier> RSPNimbraDriveViewController::_specifierForTessary() 
         return nullptr;
     }
     _loadTessarySettingsBundleIfNeeded();
+    const ControllerClass* const detail = services().classes->classNamed(controllerClassName);
     const auto row = Specifier::preferenceSpecifierNamed(
         _localizedString("CLOUD_DRIVE_PRIVACY_INFO"),
         {.target = this,
          .get = [this](const Specifier& specifier) { return _valueForTessarySpecifier(specifier); },
-         .detail = services().classes->classNamed(controllerClassName),
+         .detail = detail,
          .cell = LinkListCell});
 
     // The page behind the row is opened as this one was, but on another account.
@@ -62,7 +63,8 @@ std::optional<std::int64_t> RSPNimbraDriveViewController::_numberOfAppsUsingTess
         return std::nullopt;
     }
     const auto operation = controllerClass->classOperations.find("tessaryNumAppGroups");
-    if (operation == controllerClass->classOperations.end()) {
+    // The class may be anybody's: its operation need not be there.
+    if (operation == controllerClass->classOperations.end() || !operation->second) {
         return std::nullopt;
     }
     const RowValue answer = operation->second();

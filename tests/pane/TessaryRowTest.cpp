@@ -3,6 +3,10 @@
 #include <cstdint>
 #include <gmock/gmock.h>
 #include <limits>
+#include <map>
+#include <memory>
+#include <string>
+#include <utility>
 
 namespace nimbra::test {
 namespace {
@@ -239,6 +243,98 @@ TEST_F(TessaryRow, CarriesNothingWithoutAnAccountOfTheDatabase) {
     EXPECT_EQ(rows(), withRow);
     EXPECT_EQ(tessary()->userInfo(), UserInfo());
     EXPECT_EQ(tessary()->value(), RowValue("3 apps"));
+}
+
+TEST_F(TessaryRow, CarriesTheUserInfoOfTheTimeWhenItWasBuilt) {
+    ASSERT_EQ(rows(), withRow);
+    const UserInfoKey later("later");
+    entry->setUserInfo({{AccountIdentifierKey, Text("primary")}, {later, true}});
+    EXPECT_EQ(tessary()->userInfo().count(later), 0U);
+
+    pane->reloadSpecifiers();
+
+    EXPECT_EQ(tessary()->userInfo().count(later), 1U);
+}
+
+TEST_F(TessaryRow, HasANewGroupWithEachList) {
+    const SpecifierArray earlier = pane->specifiers();
+    pane->reloadSpecifiers();
+
+    EXPECT_NE(pane->specifiers().at(2), earlier.at(2));
+    EXPECT_NE(tessary(), earlier.at(3));
+}
+
+TEST_F(TessaryRow, LoadsTheBundleWhereverTheClassIsFrom) {
+    ASSERT_TRUE(bundle().onLoad());
+    platform.bundles.bundleAtPath.reset();
+
+    EXPECT_EQ(rows(), withRow);
+    pane->reloadSpecifiers();
+
+    // A class of that name is no sign that the bundle is loaded.
+    EXPECT_EQ(lines(), (FakeSystemLog::Lines{kLoading.front(), kLoading.front()}));
+    EXPECT_NE(tessary()->detailControllerClass(), nullptr);
+}
+
+TEST_F(TessaryRow, LoadsABundleWithoutTheClassOnce) {
+    bundle().onLoad = [] { return true; };
+    ASSERT_EQ(rows(), withRow);
+    pane->reloadSpecifiers();
+    pane->reloadSpecifiers();
+
+    EXPECT_EQ(lines(), kLoading);
+    EXPECT_EQ(bundle().loads, 1);
+}
+
+TEST_F(TessaryRow, LoadsTheBundleWhereTheLogKeepsNothing) {
+    platform.systemLog.enabled.clear();
+
+    EXPECT_EQ(rows(), withRow);
+
+    EXPECT_TRUE(lines().empty());
+    EXPECT_EQ(bundle().loads, 1);
+    EXPECT_EQ(tessary()->value(), RowValue("3 apps"));
+}
+
+TEST_F(TessaryRow, FindsTheClassEachTimeItsValueIsAskedFor) {
+    const auto registers = bundle().onLoad;
+    platform.bundles.bundleAtPath.reset();
+    const auto row = tessary();
+    EXPECT_EQ(row->value(), RowValue(""));
+
+    ASSERT_TRUE(registers());
+
+    EXPECT_EQ(row->value(), RowValue("3 apps"));
+    EXPECT_EQ(row->detailControllerClass(), nullptr);
+}
+
+TEST_F(TessaryRow, FindsThePagesBundleEachTimeItsValueIsAskedFor) {
+    const auto row = tessary();
+    const auto texts = std::exchange(platform.bundles.paneBundle, nullptr);
+    EXPECT_EQ(row->value(), RowValue(Text()));
+
+    platform.bundles.paneBundle = texts;
+
+    EXPECT_EQ(row->value(), RowValue("3 apps"));
+}
+
+TEST_F(TessaryRow, LooksUpNoTextForLessThanOne) {
+    const auto row = tessary();
+    platform.bundles.paneBundle = std::make_shared<FakeBundle>(std::map<std::string, Text>());
+    answer = std::int64_t{0};
+
+    EXPECT_EQ(row->value(), RowValue(""));
+
+    EXPECT_TRUE(syslog.lines.empty());
+}
+
+TEST_F(TessaryRow, WithAnOperationThatIsNotThereIsEmpty) {
+    bundle().onLoad = [this] {
+        return platform.classes.registerClass(
+            {.name = "TSYSettingsController", .classOperations = {{"tessaryNumAppGroups", {}}}});
+    };
+
+    EXPECT_EQ(tessary()->value(), RowValue(""));
 }
 
 TEST_F(TessaryRow, StandsBehindTheStatusWhileTheSwitchIsOn) {
