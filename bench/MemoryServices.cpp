@@ -84,4 +84,8 @@ int MemoryServices::localizedStandardCompare(const Text& left, const Text& right
     return left.string().compare(right.string());
 }
 
+std::unique_ptr<DateFormatter> MemoryServices::dateFormatterWithFormat(const Text& format) const {
+    return _others.localization->dateFormatterWithFormat(format);
+}
+
 } // namespace nimbra::bench

@@ -42,6 +42,7 @@ private:
     Text stringWithFormatLocaleArguments(const Text& format, const Locale& locale,
                                          std::span<const FormatArgument> arguments) const override;
     int localizedStandardCompare(const Text& left, const Text& right) const override;
+    std::unique_ptr<DateFormatter> dateFormatterWithFormat(const Text& format) const override;
 
     const PlatformServices _others;
     PrivacyAccessRecords _tidewater;

@@ -2,7 +2,6 @@
 
 #include "device/description/DescriptionParts.h"
 #include "device/description/DescriptionValues.h"
-#include "device/description/LaterParts.h"
 #include "device/json/JsonReader.h"
 
 #include <algorithm>
@@ -13,27 +12,23 @@ namespace nimbra::device {
 
 namespace {
 
-/// A part that is only checked, under its key.
-struct LaterPart {
-    const char* key;
-    void (*check)(const JsonReader& reader);
-};
-
-constexpr std::array laterParts{
-    LaterPart{"tool", checkTool},
-};
-
 struct Part {
     const char* key;
     void (*read)(const JsonReader& reader, DeviceDescription& description);
 };
 
 constexpr std::array parts{
-    Part{"preferences", readPreferences}, Part{"restrictions", readRestrictions},
-    Part{"accounts", readAccounts},       Part{"apps", readApplications},
-    Part{"consent", readConsent},         Part{"documents", readDocuments},
-    Part{"deviceList", readDeviceList},   Part{"databaseSettings", readDatabaseSettings},
-    Part{"strings", readStrings},         Part{"faults", readFaults},
+    Part{"preferences", readPreferences},
+    Part{"restrictions", readRestrictions},
+    Part{"accounts", readAccounts},
+    Part{"apps", readApplications},
+    Part{"consent", readConsent},
+    Part{"documents", readDocuments},
+    Part{"deviceList", readDeviceList},
+    Part{"databaseSettings", readDatabaseSettings},
+    Part{"tool", readTool},
+    Part{"strings", readStrings},
+    Part{"faults", readFaults},
 };
 
 } // namespace
@@ -77,11 +72,6 @@ GivenDescription readDeviceDescription(const JsonReader& reader) {
     GivenDescription given;
     std::ranges::copy(reader.keys(), std::inserter(given.keys, given.keys.end()));
 
-    // Of the faults each kind is a key of its own: some have an effect and others none yet.
-    for (const std::string& kind : reader.member("faults").keys()) {
-        given.keys.insert("faults/" + kind);
-    }
-
     DeviceDescription& description = given.description;
     readDeviceFacts(reader, description);
     description.now = readInstant(reader.member("now"), description.now);
@@ -92,11 +82,6 @@ GivenDescription readDeviceDescription(const JsonReader& reader) {
         }
     }
     description.paneBundleRegistered = reader.member("paneBundleRegistered").boolean(true);
-    for (const LaterPart& part : laterParts) {
-        if (const JsonReader value = reader.member(part.key); !value.isAbsent()) {
-            part.check(value);
-        }
-    }
     return given;
 }
 
@@ -104,19 +89,6 @@ GivenDescription readScenarioDevice(const JsonReader& reader) {
     GivenDescription given = readDeviceDescription(reader);
     given.description.composesLastSyncText = false;
     return given;
-}
-
-std::vector<std::string> keysWithoutEffect(const GivenDescription& given) {
-    std::vector<std::string> keys;
-    for (const LaterPart& part : laterParts) {
-        if (given.keys.contains(part.key)) {
-            keys.emplace_back(part.key);
-        }
-    }
-    std::ranges::copy_if(given.keys, std::back_inserter(keys), [](const std::string& key) {
-        return key.starts_with("faults/") && key != "faults/save" && key != "faults/consentSet";
-    });
-    return keys;
 }
 
 } // namespace nimbra::device

@@ -72,6 +72,19 @@ struct DeviceDescription {
         std::int64_t numAppGroups = 0;
     };
 
+    /// What stands in the place of the document service's command-line tool.
+    struct Tool {
+        enum class Kind : std::uint8_t { real, missing, standIn };
+
+        Kind kind = Kind::real;
+        // What a stand-in does, one after the other:
+        /// Whether it writes an archive to where its last argument says.
+        bool writesArchive = false;
+        /// The signal that it ends by; nothing for one that exits.
+        std::optional<int> signal;
+        int exitStatus = 0;
+    };
+
     std::string name = "Nimbra Phone";
     std::string idiom = "phone";
     std::optional<Screen> screen = Screen();
@@ -97,6 +110,7 @@ struct DeviceDescription {
     DeviceList deviceList;
     /// Nothing for a device without the bundle.
     std::optional<DatabaseSettings> databaseSettings;
+    Tool tool;
     /// The table "Localizable" instead of the bundle's own.
     std::optional<std::map<std::string, std::string>> strings;
     bool paneBundleRegistered = true;
@@ -104,6 +118,12 @@ struct DeviceDescription {
     std::vector<std::optional<Error>> saveFaults;
     /// The outcomes of the next changes of consent, in order: false for one that is refused.
     std::vector<std::optional<bool>> consentSetFaults;
+    /// The outcomes of the next removals of files and of the next folders made: an error for one
+    /// that fails.
+    std::vector<std::optional<Error>> removeItemFaults;
+    std::vector<std::optional<Error>> createDirectoryFaults;
+    /// The outcomes of the next starts of programs: an errno for one that fails.
+    std::vector<std::optional<int>> spawnFaults;
 
     DeviceDescription();
 
@@ -123,8 +143,5 @@ struct GivenDescription {
 
 /// The same for the device of a scenario, which composes no sentence: without one there is none.
 [[nodiscard]] GivenDescription readScenarioDevice(const JsonReader& reader);
-
-/// The keys of `given` that this version checks but that have no effect yet.
-[[nodiscard]] std::vector<std::string> keysWithoutEffect(const GivenDescription& given);
 
 } // namespace nimbra::device

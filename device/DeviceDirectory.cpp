@@ -4,6 +4,7 @@
 #include "device/description/ApplicationEntries.h"
 #include "device/description/DatabaseSettings.h"
 #include "device/description/DescriptionFiles.h"
+#include "device/description/DeviceTool.h"
 #include "device/files/DevicePaths.h"
 #include "device/files/Files.h"
 #include "device/files/StagedDirectory.h"
@@ -136,7 +137,7 @@ std::expected<void, Error> replaceApplications(const DevicePaths& paths,
 /// Makes everything of a device in the empty directory `root`.
 std::expected<void, Error> buildDevice(const std::filesystem::path& root,
                                        const DeviceDescription& description,
-                                       const std::filesystem::path& databaseBundle) {
+                                       const DeviceParts& parts) {
     const DevicePaths paths(root);
     const auto below = [&root](std::string_view devicePath) {
         return root / std::filesystem::path(devicePath).relative_path();
@@ -161,8 +162,12 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
         !written) {
         return written;
     }
-    if (auto written = replaceDatabaseSettings(paths, description.databaseSettings, databaseBundle);
+    if (auto written =
+            replaceDatabaseSettings(paths, description.databaseSettings, parts.databaseBundle);
         !written) {
+        return written;
+    }
+    if (auto written = replaceTool(paths, description.tool, parts.tool); !written) {
         return written;
     }
     auto accounts = AccountDatabase::create(below(kAccountsDatabase));
@@ -175,12 +180,12 @@ std::expected<void, Error> buildDevice(const std::filesystem::path& root,
 
 std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
                                                  const DeviceDescription& description,
-                                                 const std::filesystem::path& databaseBundle) {
+                                                 const DeviceParts& parts) {
     auto staged = StagedDirectory::start(root);
     if (!staged) {
         return std::unexpected(staged.error());
     }
-    if (auto built = buildDevice(staged->path(), description, databaseBundle); !built) {
+    if (auto built = buildDevice(staged->path(), description, parts); !built) {
         // The place where it was built goes with the failure and says nothing to anybody.
         return std::unexpected(withPath(built.error(), staged->path(), root.string()));
     }
@@ -189,7 +194,7 @@ std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& ro
 
 std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& root,
                                                  const GivenDescription& change,
-                                                 const std::filesystem::path& databaseBundle) {
+                                                 const DeviceParts& parts) {
     const DevicePaths paths(root);
     const DeviceDescription& description = change.description;
     const auto isGiven = [&change](const char* key) { return change.keys.contains(key); };
@@ -213,17 +218,19 @@ std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& ro
         applyFacts(change, *facts);
         changed = writeDescriptionFile(paths, deviceFile, *facts);
     }
-    if (changed && isGiven("restrictions")) {
-        changed = writeDescriptionFile(paths, restrictionsFile, description);
-    }
-    if (changed && isGiven("documents")) {
-        changed = writeDescriptionFile(paths, documentsFile, description);
-    }
-    if (changed && isGiven("deviceList")) {
-        changed = writeDescriptionFile(paths, deviceListFile, description);
+    for (const auto& [key, file] :
+         {std::pair{"restrictions", &restrictionsFile}, std::pair{"documents", &documentsFile},
+          std::pair{"deviceList", &deviceListFile}}) {
+        if (changed && isGiven(key)) {
+            changed = writeDescriptionFile(paths, *file, description);
+        }
     }
     if (changed && isGiven("databaseSettings")) {
-        changed = replaceDatabaseSettings(paths, description.databaseSettings, databaseBundle);
+        changed =
+            replaceDatabaseSettings(paths, description.databaseSettings, parts.databaseBundle);
+    }
+    if (changed && isGiven("tool")) {
+        changed = replaceTool(paths, description.tool, parts.tool);
     }
     if (changed && isGiven("preferences")) {
         changed = replacePreferences(paths, description);

@@ -8,18 +8,27 @@
 
 namespace nimbra::device {
 
+/// What a device gets that is no part of its description.
+struct DeviceParts {
+    /// The program mrctl. Where it is not at hand, empty, a device that should have the real tool
+    /// has none.
+    std::filesystem::path tool;
+    /// The folder of the cloud database's settings bundle, of which a device with these settings
+    /// gets a copy.
+    std::filesystem::path databaseBundle;
+};
+
 /// Makes the device directory `root` from `description`. `root` must not exist or be empty;
 /// directories above it are made. It is made beside its place and moved there when complete, so a
-/// failure leaves nothing. `databaseBundle` is the folder of the cloud database's settings bundle,
-/// of which a device with these settings gets a copy.
-[[nodiscard]] std::expected<void, Error>
-createDeviceDirectory(const std::filesystem::path& root, const DeviceDescription& description,
-                      const std::filesystem::path& databaseBundle = {});
+/// failure leaves nothing.
+[[nodiscard]] std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
+                                                               const DeviceDescription& description,
+                                                               const DeviceParts& parts = {});
 
 /// Replaces in the device directory `root` what the keys of `change` describe, whole values, as
-/// another process would; everything else stays. `databaseBundle` is as above.
-[[nodiscard]] std::expected<void, Error>
-changeDeviceDirectory(const std::filesystem::path& root, const GivenDescription& change,
-                      const std::filesystem::path& databaseBundle = {});
+/// another process would; everything else stays.
+[[nodiscard]] std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& root,
+                                                               const GivenDescription& change,
+                                                               const DeviceParts& parts = {});
 
 } // namespace nimbra::device

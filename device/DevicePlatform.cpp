@@ -22,6 +22,7 @@
 #include "device/system/DeviceLocalization.h"
 #include "device/system/DeviceNotificationCenter.h"
 #include "device/system/DevicePreferences.h"
+#include "device/system/DeviceProcesses.h"
 #include "device/system/DeviceRestrictions.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/DeviceSystemLog.h"
@@ -80,7 +81,7 @@ struct DevicePlatform::Parts {
                               systemLog),
           applications(paths, applicationFolders(paths, processEnvironment), settings, systemLog),
           appTerminator(DeviceAppTerminator::waysOn(paths, systemLog), workQueues, systemLog),
-          fileManager(DocumentsFile(paths, systemLog)),
+          fileManager(paths, DocumentsFile(paths, systemLog)), processes(paths),
           documentContainers(paths, workQueues.serialQueueWithLabel("document-refresh"), systemLog),
           lastSync(paths, settings, clock), progressReports(mainQueue),
           progressPublisher(mainQueue, progressReports),
@@ -108,6 +109,7 @@ struct DevicePlatform::Parts {
     DeviceAppTerminator appTerminator;
     DeviceNotificationCenter notificationCenter;
     DeviceFileManager fileManager;
+    DeviceProcesses processes;
     DeviceDocumentContainers documentContainers;
     DeviceDaemonConnection daemonConnection;
     DeviceLastSync lastSync;
@@ -175,6 +177,8 @@ void DevicePlatform::stopListening() {
     _parts->progressFolder.finish();
     _parts->distributedNotificationCenter.finish();
     _parts->deviceListRequests.finish();
+    // Work that waits for a tool would keep the queues from ending.
+    _parts->processes.finish();
 }
 
 PlatformServices DevicePlatform::servicesFor(const HostServices& host) {
@@ -200,7 +204,9 @@ PlatformServices DevicePlatform::servicesFor(const HostServices& host) {
             .clock = _parts->clock,
             .viewMetrics = host.viewMetrics,
             .viewAnimations = host.viewAnimations,
-            .deviceListRequests = _parts->deviceListRequests};
+            .deviceListRequests = _parts->deviceListRequests,
+            .preferences = _parts->preferences,
+            .processes = _parts->processes};
 }
 
 DeviceAccountStore& DevicePlatform::accountStore() {
@@ -213,6 +219,14 @@ DeviceBundles& DevicePlatform::bundles() {
 
 DevicePrivacyConsentStore& DevicePlatform::privacyConsentStore() {
     return _parts->privacyConsentStore;
+}
+
+DeviceFileManager& DevicePlatform::fileManager() {
+    return _parts->fileManager;
+}
+
+DeviceProcesses& DevicePlatform::processes() {
+    return _parts->processes;
 }
 
 const DaemonConnection& DevicePlatform::daemonConnection() const {

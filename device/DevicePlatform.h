@@ -19,8 +19,10 @@ namespace nimbra::device {
 
 class DeviceAccountStore;
 class DeviceBundles;
+class DeviceFileManager;
 class DevicePreferences;
 class DevicePrivacyConsentStore;
+class DeviceProcesses;
 class DeviceSettings;
 class DeviceWorkQueues;
 class ProgressPublisher;
@@ -41,8 +43,8 @@ public:
     DevicePlatform(const DevicePlatform&) = delete;
     DevicePlatform& operator=(const DevicePlatform&) = delete;
     /// Ends the progress that is followed, the distributed notifications, the requests that wait
-    /// for an answer and the timers, lets their handlers go, waits for the background work under
-    /// way, then ends the platform's threads.
+    /// for an answer, the waiting for programs that run and the timers, lets their handlers go,
+    /// waits for the background work under way, then ends the platform's threads.
     /// Every controller made over the services has gone before, but for what those handlers hold.
     ~DevicePlatform();
 
@@ -56,8 +58,9 @@ public:
     /// The services for one pane.
     [[nodiscard]] PlatformServices servicesFor(const HostServices& host);
 
-    /// From here on nothing comes from elsewhere: no progress, no notification, and no answer of an
-    /// account's service. What has come and has not been told yet is dropped.
+    /// From here on nothing comes from elsewhere: no progress, no notification, no answer of an
+    /// account's service and no end of a program that runs, which is asked to end. What has come
+    /// and has not been told yet is dropped.
     void stopListening();
 
     // What a host needs of the device beyond what a pane may ask.
@@ -65,6 +68,8 @@ public:
     [[nodiscard]] DeviceAccountStore& accountStore();
     [[nodiscard]] DeviceBundles& bundles();
     [[nodiscard]] DevicePrivacyConsentStore& privacyConsentStore();
+    [[nodiscard]] DeviceFileManager& fileManager();
+    [[nodiscard]] DeviceProcesses& processes();
     [[nodiscard]] const DaemonConnection& daemonConnection() const;
     [[nodiscard]] ProgressPublisher& progressPublisher();
     [[nodiscard]] const DevicePreferences& preferences() const;

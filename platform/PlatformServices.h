@@ -19,8 +19,10 @@ class FileManager;
 class LastSync;
 class Localization;
 class NotificationCenter;
+class Preferences;
 class Presenter;
 class PrivacyConsentStore;
+class Processes;
 class ProgressReports;
 class RestrictionsProfile;
 class SystemLog;
@@ -56,6 +58,8 @@ struct PlatformServices {
     ServiceReference<ViewMetrics> viewMetrics;
     ServiceReference<ViewAnimations> viewAnimations;
     ServiceReference<DeviceListRequests> deviceListRequests;
+    ServiceReference<Preferences> preferences;
+    ServiceReference<Processes> processes;
 };
 
 } // namespace nimbra

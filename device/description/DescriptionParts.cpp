@@ -1,7 +1,6 @@
 #include "device/description/DescriptionParts.h"
 
 #include "device/description/DescriptionValues.h"
-#include "device/description/LaterParts.h"
 #include "device/files/ApplicationFileName.h"
 #include "device/json/JsonReader.h"
 
@@ -77,16 +76,6 @@ std::optional<bool> readGranted(const JsonReader& reader) {
         reader.expected("true, false or null");
     }
     return std::nullopt;
-}
-
-std::optional<bool> readRefusal(const JsonReader& reader) {
-    if (reader.isNull()) {
-        return std::nullopt;
-    }
-    if (!reader.isBoolean() || reader.boolean()) {
-        reader.expected("false or null");
-    }
-    return false;
 }
 
 } // namespace
@@ -212,19 +201,6 @@ void readStrings(const JsonReader& reader, DeviceDescription& description) {
     description.strings.emplace();
     for (const std::string& key : reader.keys()) {
         description.strings->emplace(key, reader.member(key).string());
-    }
-}
-
-void readFaults(const JsonReader& reader, DeviceDescription& description) {
-    checkFaults(reader);
-    description.saveFaults.clear();
-    for (const JsonReader& outcome : reader.member("save").elements()) {
-        description.saveFaults.push_back(outcome.isNull() ? std::nullopt
-                                                          : std::optional(readError(outcome)));
-    }
-    description.consentSetFaults.clear();
-    for (const JsonReader& outcome : reader.member("consentSet").elements()) {
-        description.consentSetFaults.push_back(readRefusal(outcome));
     }
 }
 

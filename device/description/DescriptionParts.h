@@ -18,6 +18,7 @@ void readConsent(const JsonReader& reader, DeviceDescription& description);
 void readDocuments(const JsonReader& reader, DeviceDescription& description);
 void readDeviceList(const JsonReader& reader, DeviceDescription& description);
 void readDatabaseSettings(const JsonReader& reader, DeviceDescription& description);
+void readTool(const JsonReader& reader, DeviceDescription& description);
 void readStrings(const JsonReader& reader, DeviceDescription& description);
 void readFaults(const JsonReader& reader, DeviceDescription& description);
 

@@ -112,6 +112,14 @@ std::vector<std::string> readTexts(const JsonReader& reader) {
     return texts;
 }
 
+std::int64_t readIntegerBetween(const JsonReader& reader, std::int64_t least, std::int64_t most) {
+    const std::int64_t value = reader.integer(least);
+    if (value < least || value > most) {
+        reader.expected("an integer from " + std::to_string(least) + " to " + std::to_string(most));
+    }
+    return value;
+}
+
 Date readInstant(const JsonReader& reader, Date fallback) {
     if (reader.isAbsent()) {
         return fallback;

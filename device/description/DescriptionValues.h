@@ -4,6 +4,7 @@
 #include "platform/values/Date.h"
 #include "platform/values/Error.h"
 
+#include <cstdint>
 #include <initializer_list>
 #include <optional>
 #include <set>
@@ -34,6 +35,9 @@ namespace nimbra::device {
 [[nodiscard]] std::set<std::string> readNames(const JsonReader& reader);
 /// An array of any strings, in order.
 [[nodiscard]] std::vector<std::string> readTexts(const JsonReader& reader);
+/// An integer of these bounds, both included; `least` where nothing stands.
+[[nodiscard]] std::int64_t readIntegerBetween(const JsonReader& reader, std::int64_t least,
+                                              std::int64_t most);
 /// An instant as RFC 3339 writes it.
 [[nodiscard]] Date readInstant(const JsonReader& reader, Date fallback);
 

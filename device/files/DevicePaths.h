@@ -25,6 +25,8 @@ inline constexpr std::string_view kNotificationsDirectory = "/run/nimbra/notific
 inline constexpr std::string_view kApplicationsDirectory = "/usr/share/applications";
 inline constexpr std::string_view kDatabaseSettingsBundle =
     "/System/Library/PreferenceBundles/AccountSettings/TessarySettings.bundle";
+inline constexpr std::string_view kToolDirectory = "/usr/bin";
+inline constexpr std::string_view kTool = "/usr/bin/mrctl";
 inline constexpr std::string_view kLogFile = "/var/log/nimbra/settings.log";
 
 /// Turns a path on the device into one of this machine: the last step before the file system.

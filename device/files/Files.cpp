@@ -91,13 +91,15 @@ std::expected<std::string, Error> readFile(const std::filesystem::path& path) {
 }
 
 std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,
-                                               std::string_view content) {
+                                               std::string_view content,
+                                               std::optional<mode_t> permissions) {
     const auto failure = [&path] {
         return std::unexpected(fileError(path, "cannot be written", errno));
     };
     TemporaryFile file(path);
     if (!file.descriptor().isOpen() || !writeAll(file.descriptor().number(), content) ||
-        ::fchmod(file.descriptor().number(), permissionsFor(path)) != 0 ||
+        ::fchmod(file.descriptor().number(), permissions ? *permissions : permissionsFor(path)) !=
+            0 ||
         ::fsync(file.descriptor().number()) != 0 ||
         ::rename(file.name().c_str(), path.c_str()) != 0) {
         return failure();

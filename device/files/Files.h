@@ -5,8 +5,10 @@
 #include <expected>
 #include <filesystem>
 #include <map>
+#include <optional>
 #include <string>
 #include <string_view>
+#include <sys/types.h>
 #include <vector>
 
 namespace nimbra::device {
@@ -17,9 +19,11 @@ namespace nimbra::device {
 /// Makes `content` the whole content of the file at `path`, whose directory exists: it is written
 /// under a temporary name, flushed and renamed, so that a reader, and a machine that stops, see
 /// the earlier content or the new one. On an error the earlier content stays and nothing is left
-/// beside it.
-[[nodiscard]] std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,
-                                                             std::string_view content);
+/// beside it. The file has `permissions`, or where none are given those that it had, a new one
+/// those that let everybody read it.
+[[nodiscard]] std::expected<void, Error>
+writeFileAtomically(const std::filesystem::path& path, std::string_view content,
+                    std::optional<mode_t> permissions = std::nullopt);
 
 /// Makes files in `directory` that do not stand there yet, each with the content that `files` has
 /// under its name, and flushes them, where there are many together. On an error some may be left:

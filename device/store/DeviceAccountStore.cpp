@@ -7,7 +7,6 @@
 #include "platform/system/SystemLog.h"
 #include "platform/system/WorkQueues.h"
 
-#include <iterator>
 #include <utility>
 
 namespace nimbra::device {
@@ -60,7 +59,7 @@ std::optional<AccountRecord> DeviceAccountStore::record(const AccountIdentifier&
 
 std::expected<void, Error> DeviceAccountStore::save(const std::shared_ptr<Account>& account) {
     // Whoever plans a failure knows of it: the log is for real ones.
-    if (auto planned = takePlannedFailure()) {
+    if (auto planned = _saveOutcomes.take()) {
         return std::unexpected(std::move(*planned));
     }
     auto written = write(account);
@@ -73,19 +72,7 @@ std::expected<void, Error> DeviceAccountStore::save(const std::shared_ptr<Accoun
 }
 
 void DeviceAccountStore::planSaveOutcomes(std::vector<std::optional<Error>> outcomes) {
-    const std::scoped_lock lock(_mutex);
-    _plannedOutcomes.assign(std::make_move_iterator(outcomes.begin()),
-                            std::make_move_iterator(outcomes.end()));
-}
-
-std::optional<Error> DeviceAccountStore::takePlannedFailure() {
-    const std::scoped_lock lock(_mutex);
-    if (_plannedOutcomes.empty()) {
-        return std::nullopt;
-    }
-    std::optional<Error> outcome = std::move(_plannedOutcomes.front());
-    _plannedOutcomes.pop_front();
-    return outcome;
+    _saveOutcomes.plan(std::move(outcomes));
 }
 
 /// Where the device's directory stands on this machine concerns no page and no log of the device.

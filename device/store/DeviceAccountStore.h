@@ -1,10 +1,10 @@
 #pragma once
 
 #include "device/store/AccountDatabase.h"
+#include "device/system/PlannedOutcomes.h"
 #include "platform/accounts/AccountStore.h"
 #include "platform/values/Error.h"
 
-#include <deque>
 #include <expected>
 #include <memory>
 #include <mutex>
@@ -54,7 +54,6 @@ public:
     void planSaveOutcomes(std::vector<std::optional<Error>> outcomes);
 
 private:
-    [[nodiscard]] std::optional<Error> takePlannedFailure();
     [[nodiscard]] Error asTheDeviceSaysIt(Error error) const;
     [[nodiscard]] std::expected<void, Error> write(const std::shared_ptr<Account>& account);
 
@@ -62,7 +61,7 @@ private:
     AccountDatabase _database;
     WorkQueues& _queues;
     SystemLog& _log;
-    std::deque<std::optional<Error>> _plannedOutcomes;
+    PlannedOutcomes<Error> _saveOutcomes;
     std::once_flag _saveQueueCreation;
     std::shared_ptr<WorkQueue> _saveQueue;
 };

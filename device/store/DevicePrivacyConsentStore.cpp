@@ -39,7 +39,7 @@ bool DevicePrivacyConsentStore::PRVAccessSetForBundle(const PrivacyService& serv
     std::unique_lock lock(_mutex);
     // Whoever plans a refusal knows of it, and who gives no bundle as well: the log is for writes
     // that fail.
-    const bool isRefused = takePlannedRefusal();
+    const bool isRefused = _setOutcomes.take() == false;
     if (isRefused || bundle == nullptr || !bundle->identifier()) {
         return false;
     }
@@ -53,18 +53,8 @@ bool DevicePrivacyConsentStore::PRVAccessSetForBundle(const PrivacyService& serv
     return written.has_value();
 }
 
-void DevicePrivacyConsentStore::planSetOutcomes(const std::vector<std::optional<bool>>& outcomes) {
-    const std::scoped_lock lock(_mutex);
-    _plannedOutcomes.assign(outcomes.begin(), outcomes.end());
-}
-
-bool DevicePrivacyConsentStore::takePlannedRefusal() {
-    if (_plannedOutcomes.empty()) {
-        return false;
-    }
-    const std::optional<bool> outcome = _plannedOutcomes.front();
-    _plannedOutcomes.pop_front();
-    return outcome == false;
+void DevicePrivacyConsentStore::planSetOutcomes(std::vector<std::optional<bool>> outcomes) {
+    _setOutcomes.plan(std::move(outcomes));
 }
 
 std::expected<void, Error> DevicePrivacyConsentStore::openIfThere() {

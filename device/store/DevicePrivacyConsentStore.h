@@ -1,10 +1,10 @@
 #pragma once
 
 #include "device/store/ConsentDatabase.h"
+#include "device/system/PlannedOutcomes.h"
 #include "platform/privacy/PrivacyConsentStore.h"
 #include "platform/values/Error.h"
 
-#include <deque>
 #include <expected>
 #include <filesystem>
 #include <mutex>
@@ -38,11 +38,10 @@ public:
     /// The outcomes of the next calls that set something, used up one a call, in their order:
     /// false is one that is refused without anything being written. For whoever tries how a page
     /// bears refusals.
-    void planSetOutcomes(const std::vector<std::optional<bool>>& outcomes);
+    void planSetOutcomes(std::vector<std::optional<bool>> outcomes);
 
 private:
-    // Each with the mutex held.
-    [[nodiscard]] bool takePlannedRefusal();
+    // These with the mutex held.
     [[nodiscard]] std::expected<void, Error> openIfThere();
     [[nodiscard]] std::expected<std::vector<ConsentDatabase::Record>, Error>
     read(const PrivacyService& service);
@@ -55,7 +54,7 @@ private:
     SystemLog& _log;
     std::mutex _mutex;
     std::optional<ConsentDatabase> _database;
-    std::deque<std::optional<bool>> _plannedOutcomes;
+    PlannedOutcomes<bool> _setOutcomes;
 };
 
 } // namespace nimbra::device

@@ -10,6 +10,10 @@ bool DeviceAbilities::boolAnswerForQuestion(const Text& question) const {
     return question == Text("cellular-data") && _settings.hasCellularData();
 }
 
+Text DeviceAbilities::copyAnswerForQuestion(const Text& question) const {
+    return question == Text("UserAssignedDeviceName") ? Text(_settings.name()) : Text();
+}
+
 Text DeviceAbilities::VariantStringKeyForKey(const Text& key) const {
     const auto variant = _settings.wirelessVariant();
     return variant ? Text(key.string() + '_' + *variant) : key;

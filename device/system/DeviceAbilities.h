@@ -13,6 +13,7 @@ public:
     explicit DeviceAbilities(const DeviceSettings& settings);
 
     [[nodiscard]] bool boolAnswerForQuestion(const Text& question) const override;
+    [[nodiscard]] Text copyAnswerForQuestion(const Text& question) const override;
     [[nodiscard]] Text VariantStringKeyForKey(const Text& key) const override;
     [[nodiscard]] UserInterfaceIdiom userInterfaceIdiom() const override;
     [[nodiscard]] std::optional<Screen> mainScreen() const override;

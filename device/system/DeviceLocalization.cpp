@@ -1,5 +1,6 @@
 #include "device/system/DeviceLocalization.h"
 
+#include "device/system/DeviceDateFormatter.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/MessageFormatter.h"
 #include "platform/system/SystemLog.h"
@@ -66,6 +67,12 @@ int DeviceLocalization::localizedStandardCompare(const Text& left, const Text& r
         return static_cast<int>(left.isPresent()) - static_cast<int>(right.isPresent());
     }
     return orderOfUser().compare(left.string(), right.string());
+}
+
+std::unique_ptr<DateFormatter>
+DeviceLocalization::dateFormatterWithFormat(const Text& format) const {
+    return std::make_unique<DeviceDateFormatter>(format, _settings.localeIdentifier(),
+                                                 _settings.timeZone());
 }
 
 const DeviceLocalization::Order& DeviceLocalization::orderOfUser() const {

@@ -31,6 +31,9 @@ public:
     stringWithFormatLocaleArguments(const Text& format, const Locale& locale,
                                     std::span<const FormatArgument> arguments) const override;
     [[nodiscard]] int localizedStandardCompare(const Text& left, const Text& right) const override;
+    /// Of the locale and the time zone that the device has when the formatter is made.
+    [[nodiscard]] std::unique_ptr<DateFormatter>
+    dateFormatterWithFormat(const Text& format) const override;
 
 private:
     class Order;

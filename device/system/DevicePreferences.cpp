@@ -45,8 +45,9 @@ std::expected<void, Error> checkPreferences(const DevicePaths& paths) {
 DevicePreferences::DevicePreferences(DevicePaths paths, SystemLog& log)
     : _paths(std::move(paths)), _log(log) {}
 
-std::optional<std::int64_t> DevicePreferences::integer(const std::string& domain,
-                                                       const std::string& key) const {
+std::optional<std::int64_t>
+DevicePreferences::appIntegerValueForKeyInDomain(const std::string& key,
+                                                 const std::string& domain) const {
     const auto path = _paths.resolve(std::string(kPreferencesDirectory) + '/' + domain + ".json");
     std::error_code failure;
     if (path && !std::filesystem::exists(*path, failure) && !failure) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "device/files/DevicePaths.h"
+#include "platform/system/Preferences.h"
 #include "platform/values/Error.h"
 
 #include <cstdint>
@@ -17,15 +18,15 @@ namespace nimbra::device {
 /// Whether every file of preferences on the device can be read.
 [[nodiscard]] std::expected<void, Error> checkPreferences(const DevicePaths& paths);
 
-/// The preferences of applications, by domain and key, as their files have them now. Any thread.
-class DevicePreferences {
+/// The preferences of applications as their files have them now. What cannot be read is nothing,
+/// with a line in the log. Any thread.
+class DevicePreferences final : public Preferences {
 public:
     /// `log` is told of what cannot be read and outlives the preferences.
     DevicePreferences(DevicePaths paths, SystemLog& log);
 
-    /// The integer under `key` of `domain`; nothing where there is none, or something else.
-    [[nodiscard]] std::optional<std::int64_t> integer(const std::string& domain,
-                                                      const std::string& key) const;
+    [[nodiscard]] std::optional<std::int64_t>
+    appIntegerValueForKeyInDomain(const std::string& key, const std::string& domain) const override;
 
 private:
     DevicePaths _paths;

@@ -13,6 +13,7 @@ namespace nimbra::device {
 struct DeviceSettings::State {
     DevicePaths paths;
     mutable std::mutex mutex;
+    std::string name;
     std::string locale;
     std::string timeZone;
     bool hasCellularData = false;
@@ -31,6 +32,11 @@ std::expected<DeviceSettings, Error> DeviceSettings::open(const std::filesystem:
         return std::unexpected(read.error());
     }
     return settings;
+}
+
+std::string DeviceSettings::name() const {
+    const std::scoped_lock lock(_state->mutex);
+    return _state->name;
 }
 
 std::string DeviceSettings::localeIdentifier() const {
@@ -79,6 +85,7 @@ std::expected<void, Error> DeviceSettings::reload() {
         return std::unexpected(description.error());
     }
     const std::scoped_lock lock(_state->mutex);
+    _state->name = std::move(description->name);
     _state->locale = std::move(description->locale);
     ++_state->localeRevision;
     _state->timeZone = std::move(description->timeZone);

@@ -12,12 +12,15 @@
 
 namespace nimbra::device {
 
-/// What `device.json` says of the device: its language, its time zone, its screen and its
+/// What `device.json` says of the device: its name, its language, its time zone, its screen and its
 /// abilities. Copies are the same settings. Any thread.
 class DeviceSettings {
 public:
     [[nodiscard]] static std::expected<DeviceSettings, Error>
     open(const std::filesystem::path& root);
+
+    /// The name that the user gave the device.
+    [[nodiscard]] std::string name() const;
 
     /// The BCP 47 tag of the user's locale.
     [[nodiscard]] std::string localeIdentifier() const;

@@ -1,8 +1,10 @@
 #include "device/system/DeviceWorkQueues.h"
 
+#include "device/system/ConcurrentQueue.h"
 #include "device/system/DataOrSource.h"
 #include "device/system/MachineTime.h"
 #include "device/system/SerialQueue.h"
+#include "device/system/ThreadName.h"
 #include "device/system/TimerSchedule.h"
 #include "device/system/TimerSource.h"
 
@@ -14,15 +16,35 @@
 #include <iostream>
 #include <list>
 #include <mutex>
-#include <pthread.h>
 #include <thread>
 #include <utility>
 
 namespace nimbra::device {
 
+namespace {
+
+/// Queues `work` and waits until it has run.
+void runAndWait(WorkQueue& queue, WorkQueue::Work work) {
+    std::promise<void> ran;
+    const std::future<void> end = ran.get_future();
+    queue.async([work = std::move(work), ran = std::move(ran)]() mutable {
+        work();
+        // Who waits may rely on it that nothing of the work is left.
+        work = nullptr;
+        ran.set_value();
+    });
+    end.wait();
+}
+
+} // namespace
+
 /// What the queues and their maker share: the threads, and how much work there is.
 class DeviceWorkQueues::Shared {
 public:
+    Shared() : _globalQueue("user-initiated", [this] { workEnded(); }) {}
+
+    [[nodiscard]] ConcurrentQueue& globalQueue() { return _globalQueue; }
+
     /// A new queue with a thread of its own: a queue that waits for another never keeps a third
     /// one from running.
     std::shared_ptr<SerialQueue> addQueue(const std::string& label) {
@@ -32,7 +54,7 @@ public:
         Thread& thread = _threads.emplace_back();
         thread.queue = queue;
         thread.thread = std::thread([this, queue, &thread] {
-            nameThread(queue->label());
+            nameCurrentThread(queue->label());
             queue->run();
             const std::scoped_lock threadLock(_mutex);
             thread.ended = true;
@@ -41,7 +63,8 @@ public:
     }
 
     /// Puts `work` behind what `queue` has; once the threads have ended it is dropped.
-    void add(SerialQueue& queue, WorkQueue::Work work) {
+    template <class Queue>
+    void add(Queue& queue, WorkQueue::Work work) {
         {
             const std::scoped_lock lock(_mutex);
             ++_unfinished;
@@ -73,6 +96,7 @@ public:
             thread.thread.join();
         }
         _threads.clear();
+        _globalQueue.finish();
     }
 
 private:
@@ -81,11 +105,6 @@ private:
         std::thread thread;
         bool ended = false;
     };
-
-    static void nameThread(const std::string& label) {
-        constexpr std::size_t longest = 15;
-        ::pthread_setname_np(::pthread_self(), label.substr(0, longest).c_str());
-    }
 
     void workEnded() {
         std::shared_ptr<std::function<void()>> observer;
@@ -117,6 +136,8 @@ private:
     std::list<Thread> _threads;
     std::size_t _unfinished = 0;
     std::shared_ptr<std::function<void()>> _idleObserver;
+    /// Last: its threads, which use the others, end before those go.
+    ConcurrentQueue _globalQueue;
 };
 
 /// One serial queue as its owners hold it.
@@ -137,15 +158,7 @@ public:
             std::cerr << "nimbra: the queue \"" << label() << "\" waits for itself\n";
             std::abort();
         }
-        std::promise<void> ran;
-        const std::future<void> end = ran.get_future();
-        async([work = std::move(work), ran = std::move(ran)]() mutable {
-            work();
-            // Who waits may rely on it that nothing of the work is left.
-            work = nullptr;
-            ran.set_value();
-        });
-        end.wait();
+        runAndWait(*this, std::move(work));
     }
 
 private:
@@ -153,8 +166,24 @@ private:
     std::shared_ptr<SerialQueue> _queue;
 };
 
+/// The queue that everybody shares.
+class DeviceWorkQueues::GlobalQueue final : public WorkQueue {
+public:
+    explicit GlobalQueue(std::shared_ptr<Shared> shared) : _shared(std::move(shared)) {}
+
+    [[nodiscard]] const std::string& label() const override {
+        return _shared->globalQueue().label();
+    }
+    void async(Work work) override { _shared->add(_shared->globalQueue(), std::move(work)); }
+    // Also from itself: another thread runs the work.
+    void sync(Work work) override { runAndWait(*this, std::move(work)); }
+
+private:
+    std::shared_ptr<Shared> _shared;
+};
+
 DeviceWorkQueues::DeviceWorkQueues(WorkQueue& mainQueue, std::shared_ptr<TimeSource> timeSource)
-    : _shared(std::make_shared<Shared>()),
+    : _shared(std::make_shared<Shared>()), _globalQueue(std::make_unique<GlobalQueue>(_shared)),
       _timeSource(timeSource ? std::move(timeSource) : std::make_shared<MachineTime>()),
       _timers(TimerSchedule::over(_timeSource)), _mainQueue(mainQueue) {}
 
@@ -174,6 +203,10 @@ WorkQueue& DeviceWorkQueues::mainQueue() {
 
 std::shared_ptr<WorkQueue> DeviceWorkQueues::serialQueueWithLabel(const std::string& label) {
     return std::make_shared<Queue>(_shared, label);
+}
+
+WorkQueue& DeviceWorkQueues::globalQueueWithQuality(QualityClass /*quality*/) {
+    return *_globalQueue;
 }
 
 std::shared_ptr<DataOrEventSource>

@@ -11,9 +11,11 @@ namespace nimbra::device {
 class TimeSource;
 class TimerSchedule;
 
-/// Serial queues on the platform's threads, beside the main queue that the host's loop runs.
-/// Any thread. A queue may outlive the threads, but then drops what is queued to it. A timer that
-/// waits for its time is no work to do.
+/// Queues on the platform's threads, beside the main queue that the host's loop runs. Any thread.
+/// A serial queue has a thread of its own. Any number of pieces of work of a global queue may be
+/// under way at once, each on its thread, so it may wait for work of its own.
+/// A serial queue may outlive the threads, but then drops what is queued to it. A timer that waits
+/// for its time is no work to do.
 class DeviceWorkQueues final : public WorkQueues {
 public:
     /// `mainQueue` is not owned and outlives the queues. The timers run by `timeSource`, which is
@@ -30,6 +32,8 @@ public:
     [[nodiscard]] WorkQueue& mainQueue() override;
     [[nodiscard]] std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) override;
+    /// The queue "user-initiated", which goes with this object.
+    [[nodiscard]] WorkQueue& globalQueueWithQuality(QualityClass quality) override;
     [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
     [[nodiscard]] std::shared_ptr<TimerEventSource> timerSourceOnQueue(WorkQueue& queue) override;
@@ -46,8 +50,10 @@ public:
 private:
     class Shared;
     class Queue;
+    class GlobalQueue;
 
     std::shared_ptr<Shared> _shared;
+    std::unique_ptr<WorkQueue> _globalQueue;
     std::shared_ptr<TimeSource> _timeSource;
     std::shared_ptr<TimerSchedule> _timers;
     WorkQueue& _mainQueue;

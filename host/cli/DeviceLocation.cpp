@@ -71,7 +71,7 @@ std::expected<void, Failure> provideDevice(const std::filesystem::path& root,
         return std::unexpected(sample.error());
     }
     const auto made =
-        device::createDeviceDirectory(root, sample->description, host::findDatabaseBundle());
+        device::createDeviceDirectory(root, sample->description, host::findDeviceParts());
     if (made) {
         messages << "settingsctl: made the sample device in " << root.string() << '\n';
     } else if (!isThere(root)) {
@@ -89,12 +89,9 @@ std::expected<void, Failure> initializeDevice(const std::filesystem::path& root,
         return std::unexpected(given.error());
     }
     if (const auto made =
-            device::createDeviceDirectory(root, given->description, host::findDatabaseBundle());
+            device::createDeviceDirectory(root, given->description, host::findDeviceParts());
         !made) {
         return badInput(made.error());
-    }
-    for (const std::string& key : device::keysWithoutEffect(*given)) {
-        messages << "settingsctl: note: /" << key << " has no effect in this version\n";
     }
     if (!given->description.runningApplications().empty()) {
         messages << "settingsctl: note: /apps: \"running\" has no effect here, applications run "

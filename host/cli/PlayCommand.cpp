@@ -41,7 +41,7 @@ std::expected<void, Failure> playOn(const std::filesystem::path& root,
                                     const host::Scenario& scenario, const PlayOptions& options,
                                     std::ostream& out) {
     if (const auto made = device::createDeviceDirectory(root, scenario.device.description,
-                                                        host::findDatabaseBundle());
+                                                        host::findDeviceParts());
         !made) {
         return badInput(made.error());
     }
@@ -71,14 +71,10 @@ std::expected<void, Failure> playOn(const std::filesystem::path& root,
 
 } // namespace
 
-std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out,
-                                  std::ostream& messages) {
+std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out) {
     const auto scenario = readScenario(options.scenario);
     if (!scenario) {
         return badInput(scenario.error());
-    }
-    for (const std::string& note : scenario->notes) {
-        messages << "settingsctl: note: " << note << '\n';
     }
     if (options.keep) {
         host::RunningApplications applications(*options.keep);

@@ -19,9 +19,8 @@ struct PlayOptions {
     std::optional<std::string> locale;
 };
 
-/// Plays a scenario on a device directory made for it: the trace goes to `out`, notes to
-/// `messages`. Nothing else stays behind, also when the program is interrupted.
-[[nodiscard]] std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out,
-                                                std::ostream& messages);
+/// Plays a scenario on a device directory made for it: the trace goes to `out`. Nothing else stays
+/// behind, also when the program is interrupted.
+[[nodiscard]] std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out);
 
 } // namespace nimbra::cli

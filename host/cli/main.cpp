@@ -148,7 +148,7 @@ Outcome run(const Arguments& arguments) {
                      .keep = arguments.keep,
                      .bundle = arguments.bundle,
                      .locale = arguments.locale},
-                    std::cout, std::cerr);
+                    std::cout);
     case Command::completion:
         std::cout << (arguments.shellName == "bash" ? bashCompletion() : zshCompletion());
         return {};

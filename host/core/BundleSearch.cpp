@@ -33,8 +33,10 @@ std::filesystem::path findPaneBundle(const std::filesystem::path& root) {
     return isThere(onDevice) ? onDevice : suppliedBundle(paneBundle);
 }
 
-std::filesystem::path findDatabaseBundle() {
-    return suppliedBundle("TessarySettings.bundle");
+device::DeviceParts findDeviceParts() {
+    // Built or installed, programs stand beside each other.
+    return {.tool = executableDirectory() / "mrctl",
+            .databaseBundle = suppliedBundle("TessarySettings.bundle")};
 }
 
 } // namespace nimbra::host

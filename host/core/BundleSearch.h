@@ -1,5 +1,7 @@
 #pragma once
 
+#include "device/DeviceDirectory.h"
+
 #include <filesystem>
 #include <optional>
 
@@ -13,8 +15,7 @@ namespace nimbra::host {
 /// none is found, so that loading it says what is missing.
 [[nodiscard]] std::filesystem::path findPaneBundle(const std::filesystem::path& root);
 
-/// The folder of the settings bundle of the cloud database that came with this program, to be put
-/// on a device; a folder that is not there when none is found.
-[[nodiscard]] std::filesystem::path findDatabaseBundle();
+/// What came with this program to be put on devices; a path where nothing stands for what did not.
+[[nodiscard]] device::DeviceParts findDeviceParts();
 
 } // namespace nimbra::host

@@ -19,6 +19,10 @@ public:
     /// The answer to a yes-or-no question such as "cellular-data"; false for one it does not know.
     [[nodiscard]] virtual bool boolAnswerForQuestion(const Text& question) const = 0;
 
+    /// The answer in words to a question such as "UserAssignedDeviceName", the name that the user
+    /// gave the device; absent for one it does not know.
+    [[nodiscard]] virtual Text copyAnswerForQuestion(const Text& question) const = 0;
+
     /// The localization key for this device's wording of wireless networks in the text under
     /// `key`; `key` itself where the device has no wording of its own.
     [[nodiscard]] virtual Text VariantStringKeyForKey(const Text& key) const = 0;

@@ -1,10 +1,12 @@
 #pragma once
 
+#include "platform/system/DateFormatter.h"
 #include "platform/system/Locale.h"
 #include "platform/values/Date.h"
 #include "platform/values/Text.h"
 
 #include <cstdint>
+#include <memory>
 #include <span>
 #include <variant>
 
@@ -31,6 +33,10 @@ public:
     /// comes first, zero when neither does. An absent text comes before every other.
     [[nodiscard]] virtual int localizedStandardCompare(const Text& left,
                                                        const Text& right) const = 0;
+
+    /// A formatter for `format`, a pattern of date fields such as "yy.MM.dd". Never null.
+    [[nodiscard]] virtual std::unique_ptr<DateFormatter>
+    dateFormatterWithFormat(const Text& format) const = 0;
 };
 
 } // namespace nimbra

@@ -5,7 +5,8 @@
 
 namespace nimbra {
 
-/// Runs pieces of work one after the other, in the order in which they came.
+/// Runs pieces of work in the order in which they came: one after the other, but for a global
+/// queue, which may have several under way.
 ///
 /// A piece of work and everything that it captured is destroyed on the queue when it ends, before
 /// the next one starts: temporary objects never outlive their work item. Work that is queued when

@@ -3,10 +3,15 @@
 #include "platform/system/EventSource.h"
 #include "platform/system/WorkQueue.h"
 
+#include <cstdint>
 #include <memory>
 #include <string>
 
 namespace nimbra {
+
+/// How much the user cares when work is done; the number is the platform's.
+enum class QualityClass : std::uint8_t { UserInitiatedQuality = 25 };
+using enum QualityClass;
 
 /// The main queue, and what makes further queues and event sources. Any thread.
 class WorkQueues {
@@ -19,6 +24,10 @@ public:
     /// A new serial queue on a thread of the platform.
     [[nodiscard]] virtual std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) = 0;
+
+    /// The queue that everybody shares for work of this quality class: work on it may wait for long
+    /// without keeping other work from running.
+    [[nodiscard]] virtual WorkQueue& globalQueueWithQuality(QualityClass quality) = 0;
 
     /// A new source of kind data-or, suspended, whose handler runs on `queue`.
     [[nodiscard]] virtual std::shared_ptr<DataOrEventSource>

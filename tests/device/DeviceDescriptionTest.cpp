@@ -222,14 +222,57 @@ TEST(DeviceDescriptionTest, AListOfDevicesMayFailOrNeverCome) {
 TEST(DeviceDescriptionTest, FaultsAreReadInTheirOrder) {
     const auto description = given(R"({"faults": {
         "save": [null, {"domain": "D", "code": 1, "description": "d"}],
-        "consentSet": [false, null, false]}})")
+        "consentSet": [false, null, false],
+        "removeItem": [{"domain": "PlatformErrorDomain", "code": 4, "description": "r"}, null],
+        "createDirectory": [null, {"domain": "C", "code": -1, "description": ""}],
+        "spawn": [2, null, 4095]}})")
                                  .description;
 
+    using Errors = std::vector<std::optional<Error>>;
     EXPECT_EQ(description.saveFaults,
-              (std::vector<std::optional<Error>>{
-                  std::nullopt, Error{.domain = "D", .code = 1, .description = "d"}}));
+              (Errors{std::nullopt, Error{.domain = "D", .code = 1, .description = "d"}}));
     EXPECT_EQ(description.consentSetFaults,
               (std::vector<std::optional<bool>>{false, std::nullopt, false}));
+    EXPECT_EQ(description.removeItemFaults,
+              (Errors{Error{.domain = "PlatformErrorDomain", .code = 4, .description = "r"},
+                      std::nullopt}));
+    EXPECT_EQ(description.createDirectoryFaults,
+              (Errors{std::nullopt, Error{.domain = "C", .code = -1, .description = ""}}));
+    EXPECT_EQ(description.spawnFaults, (std::vector<std::optional<int>>{2, std::nullopt, 4095}));
+}
+
+TEST(DeviceDescriptionTest, FaultsThatAreNotGivenAreNone) {
+    const auto description = given(R"({"faults": {"spawn": []}})").description;
+
+    EXPECT_TRUE(description.saveFaults.empty());
+    EXPECT_TRUE(description.consentSetFaults.empty());
+    EXPECT_TRUE(description.removeItemFaults.empty());
+    EXPECT_TRUE(description.createDirectoryFaults.empty());
+    EXPECT_TRUE(description.spawnFaults.empty());
+}
+
+TEST(DeviceDescriptionTest, TheToolIsRealMissingOrDoesAsItIsTold) {
+    using Kind = DeviceDescription::Tool::Kind;
+    const auto tool = [](const std::string& text) {
+        return given(R"({"tool": )" + text + "}").description.tool;
+    };
+
+    EXPECT_EQ(given("{}").description.tool.kind, Kind::real);
+    EXPECT_EQ(tool(R"("real")").kind, Kind::real);
+    EXPECT_EQ(tool("null").kind, Kind::missing);
+
+    const auto least = tool("{}");
+    EXPECT_EQ(least.kind, Kind::standIn);
+    EXPECT_EQ(least.exitStatus, 0);
+    EXPECT_EQ(least.signal, std::nullopt);
+    EXPECT_FALSE(least.writesArchive);
+
+    const auto most = tool(R"({"exit": 255, "signal": 64, "writesArchive": true})");
+    EXPECT_EQ(most.kind, Kind::standIn);
+    EXPECT_EQ(most.exitStatus, 255);
+    EXPECT_EQ(most.signal, 64);
+    EXPECT_TRUE(most.writesArchive);
+    EXPECT_EQ(tool(R"({"signal": null})").signal, std::nullopt);
 }
 
 TEST(DeviceDescriptionTest, TheDatabasesSettingsHaveANumberOrAreNotThere) {
@@ -242,27 +285,6 @@ TEST(DeviceDescriptionTest, TheDatabasesSettingsHaveANumberOrAreNotThere) {
     EXPECT_EQ(settings("{}").value().numAppGroups, 0);
     EXPECT_EQ(settings(R"({"numAppGroups": -2})").value().numAppGroups, -2);
     EXPECT_EQ(settings(R"({"numAppGroups": 2147483648})").value().numAppGroups, 2147483648);
-}
-
-TEST(DeviceDescriptionTest, PartsThatNothingUsesYetAreCheckedAndNamed) {
-    const auto everything = given(R"({
-        "name": "x",
-        "apps": [{"identifier": "com.a"}],
-        "consent": [{"service": "kPRVServiceTidewater"}],
-        "deviceList": {"incompatible": ["Old Phone"], "needUpgrade": []},
-        "tool": {"exit": 1, "signal": null, "writesArchive": false},
-        "faults": {"save": [null, {"domain": "D", "code": 1, "description": "d"}],
-                   "consentSet": [false, null], "removeItem": [], "createDirectory": [null],
-                   "spawn": [2, null]}})");
-    EXPECT_EQ(keysWithoutEffect(everything),
-              (Strings{"tool", "faults/createDirectory", "faults/removeItem", "faults/spawn"}));
-
-    const auto others =
-        given(R"({"deviceList": null, "databaseSettings": null, "tool": null, "name": "x"})");
-    EXPECT_EQ(keysWithoutEffect(others), (Strings{"tool"}));
-    EXPECT_EQ(keysWithoutEffect(given(R"({"deviceList": "never", "tool": "real"})")),
-              (Strings{"tool"}));
-    EXPECT_TRUE(keysWithoutEffect(given(R"({"name": "x", "accounts": []})")).empty());
 }
 
 } // namespace

@@ -38,11 +38,13 @@ protected:
         return description;
     }
     void create(const DeviceDescription& description) const {
-        const auto created = createDeviceDirectory(root(), description, source());
+        const auto created =
+            createDeviceDirectory(root(), description, {.databaseBundle = source()});
         ASSERT_TRUE(created) << created.error();
     }
     [[nodiscard]] std::expected<void, Error> change(const DeviceDescription& description) const {
-        return changeDeviceDirectory(root(), {description, {"databaseSettings"}}, source());
+        return changeDeviceDirectory(root(), {description, {"databaseSettings"}},
+                                     {.databaseBundle = source()});
     }
 
 private:
@@ -101,7 +103,7 @@ TEST_F(DeviceDirectoryDatabaseTest, AChangeOfSomethingElseLeavesTheBundle) {
 TEST_F(DeviceDirectoryDatabaseTest, ABundleThatIsNotThereToBeCopiedIsReportedAndNothingIsMade) {
     std::filesystem::remove_all(source());
 
-    const auto created = createDeviceDirectory(root(), withGroups(1), source());
+    const auto created = createDeviceDirectory(root(), withGroups(1), {.databaseBundle = source()});
 
     ASSERT_FALSE(created);
     EXPECT_EQ(created.error().description,

@@ -100,7 +100,7 @@ TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
     EXPECT_EQ(&services.workQueues->mainQueue(), &mainQueue());
     EXPECT_EQ(platform->accountStore().accountIdentifiers(),
               std::vector{AccountIdentifier("primary")});
-    EXPECT_EQ(platform->preferences().integer("domain", "level"), 4);
+    EXPECT_EQ(services.preferences->appIntegerValueForKeyInDomain("level", "domain"), 4);
     EXPECT_EQ(platform->settings().localeIdentifier(), "fr");
     EXPECT_TRUE(platform->systemLog().isEnabled(LogLevel::error));
 }

@@ -26,6 +26,9 @@ public:
         _made.push_back(_queues.serialQueueWithLabel(label));
         return _made.back();
     }
+    [[nodiscard]] WorkQueue& globalQueueWithQuality(QualityClass quality) override {
+        return _queues.globalQueueWithQuality(quality);
+    }
     [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override {
         return _queues.dataOrSourceOnQueue(std::move(queue));

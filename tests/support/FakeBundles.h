@@ -37,7 +37,13 @@ public:
                                     {"TURNING_OFF_CLOUD_DRIVE", "Turning off"},
                                     {"CLOUD_DRIVE_CELLULAR", "Cellular"},
                                     {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI", "Over Wi-Fi."},
-                                    {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI_WLAN", "Over WLAN."}});
+                                    {"CLOUD_DRIVE_CELLULAR_EXPLANATION_WIFI_WLAN", "Over WLAN."},
+                                    {"CLOUD_DRIVE_DIAGNOSE_TEXT", "Finds faults."},
+                                    {"CLOUD_DRIVE_DIAGNOSE", "Diagnose"},
+                                    {"CLOUD_DRIVE_DIAGNOSE_GATHER", "Gathering"},
+                                    {"CLOUD_DRIVE_DIAGNOSE_ERROR", "No archive"},
+                                    {"CLOUD_DRIVE_DIAGNOSE_ERROR_TEXT", "Try again."},
+                                    {"CLOUD_DRIVE_DIAGNOSE_ERROR_OK", "OK"}});
     /// The bundle that stands at every path; null for none.
     std::shared_ptr<FakeBundle> bundleAtPath;
     /// The paths at which a bundle was looked for, in order.

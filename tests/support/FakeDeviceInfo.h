@@ -13,6 +13,9 @@ public:
     [[nodiscard]] bool boolAnswerForQuestion(const Text& question) const override {
         return question == Text("cellular-data") && hasCellularData;
     }
+    [[nodiscard]] Text copyAnswerForQuestion(const Text& question) const override {
+        return question == Text("UserAssignedDeviceName") ? name : Text();
+    }
     [[nodiscard]] Text VariantStringKeyForKey(const Text& key) const override {
         return variant.empty() ? key : Text(key.string() + "_" + variant);
     }
@@ -23,6 +26,7 @@ public:
     [[nodiscard]] std::optional<Screen> mainScreen() const override { return screen; }
 
     bool hasCellularData = false;
+    Text name{"Phone"};
     std::string variant;
     UserInterfaceIdiom idiom = UserInterfaceIdiom::phone;
     std::optional<Screen> screen = Screen{.bounds = {.origin = {}, .size = {390, 844}}, .scale = 2};

@@ -2,10 +2,13 @@
 
 #include "platform/system/Localization.h"
 
+#include <chrono>
 #include <cstring>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <strings.h>
+#include <utility>
 #include <vector>
 
 namespace nimbra::test {
@@ -32,6 +35,24 @@ public:
             return static_cast<int>(left.isPresent()) - static_cast<int>(right.isPresent());
         }
         return strverscmp(lowered(left).c_str(), lowered(right).c_str());
+    }
+
+    /// Writes the format and, in seconds of the epoch, the date.
+    [[nodiscard]] std::unique_ptr<DateFormatter>
+    dateFormatterWithFormat(const Text& format) const override {
+        class Formatter final : public DateFormatter {
+        public:
+            explicit Formatter(Text format) : _format(std::move(format)) {}
+            [[nodiscard]] Text stringFromDate(Date date) const override {
+                const auto seconds =
+                    std::chrono::floor<std::chrono::seconds>(date).time_since_epoch().count();
+                return Text(_format.string() + '@' + std::to_string(seconds));
+            }
+
+        private:
+            Text _format;
+        };
+        return std::make_unique<Formatter>(format);
     }
 
     /// The locales handed to the formatter, in order.

@@ -11,6 +11,11 @@ std::shared_ptr<WorkQueue> PumpedQueues::serialQueueWithLabel(const std::string&
     return _queues.emplace(label, std::make_shared<PumpedQueue>(label))->second;
 }
 
+PumpedQueue& PumpedQueues::globalQueueWithQuality(QualityClass /*quality*/) {
+    // There is but one class.
+    return _userInitiatedQueue;
+}
+
 std::shared_ptr<DataOrEventSource>
 PumpedQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
     return std::make_shared<device::DataOrSource>(std::move(queue));

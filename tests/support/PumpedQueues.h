@@ -17,6 +17,7 @@ public:
     [[nodiscard]] PumpedQueue& mainQueue() override { return _mainQueue; }
     [[nodiscard]] std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) override;
+    [[nodiscard]] PumpedQueue& globalQueueWithQuality(QualityClass quality) override;
     [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
     /// A `FakeTimer`, which calls its handler at once, whatever the queue.
@@ -32,6 +33,7 @@ public:
 
 private:
     PumpedQueue _mainQueue{"main"};
+    PumpedQueue _userInitiatedQueue{"user-initiated"};
     std::multimap<std::string, std::shared_ptr<PumpedQueue>> _queues;
     std::vector<std::shared_ptr<FakeTimer>> _timers;
 };

@@ -17,7 +17,9 @@
 #include "tests/support/FakeFileManager.h"
 #include "tests/support/FakeLastSync.h"
 #include "tests/support/FakeLocalization.h"
+#include "tests/support/FakePreferences.h"
 #include "tests/support/FakePrivacyConsentStore.h"
+#include "tests/support/FakeProcesses.h"
 #include "tests/support/FakeProgressReports.h"
 #include "tests/support/FakeRestrictionsProfile.h"
 #include "tests/support/FakeSystemLog.h"
@@ -39,7 +41,7 @@ struct TestPlatform {
     FakeDocumentContainers documentContainers;
     device::DeviceNotificationCenter notificationCenter;
     PumpedQueues workQueues;
-    FakeFileManager fileManager;
+    FakeFileManager fileManager{calls};
     FakeBundles bundles;
     ClassRegistry classes;
     FakeLocalization localization;
@@ -57,6 +59,8 @@ struct TestPlatform {
     FakeViewMetrics viewMetrics;
     ViewAnimations viewAnimations;
     FakeDeviceListRequests deviceListRequests;
+    FakePreferences preferences;
+    FakeProcesses processes{calls};
 
     [[nodiscard]] PlatformServices services() {
         return {.presenter = presenter,
@@ -81,7 +85,9 @@ struct TestPlatform {
                 .clock = clock,
                 .viewMetrics = viewMetrics,
                 .viewAnimations = viewAnimations,
-                .deviceListRequests = deviceListRequests};
+                .deviceListRequests = deviceListRequests,
+                .preferences = preferences,
+                .processes = processes};
     }
 };
 

@@ -200,7 +200,7 @@ ScenarioPlayer::Outcome ScenarioPlayer::post(const ScenarioStep& step) {
 ScenarioPlayer::Outcome ScenarioPlayer::change(const ScenarioStep& step) {
     const device::GivenDescription& change = std::get<ChangeArguments>(step.arguments).device;
     if (const auto changed =
-            device::changeDeviceDirectory(_session.root(), change, findDatabaseBundle());
+            device::changeDeviceDirectory(_session.root(), change, findDeviceParts());
         !changed) {
         return std::unexpected(changed.error().description);
     }

@@ -38,14 +38,6 @@ PaneEntry readEntry(const JsonReader& reader, const device::DeviceDescription& d
     return entry;
 }
 
-void addNotes(const GivenDescription& given, const std::string& pointer, Scenario& scenario) {
-    for (const std::string& key : device::keysWithoutEffect(given)) {
-        std::string note = pointer;
-        note.append("/").append(key).append(" has no effect in this version");
-        scenario.notes.push_back(std::move(note));
-    }
-}
-
 } // namespace
 
 std::expected<Scenario, Error> readScenario(std::string_view text, const std::string& name) {
@@ -56,7 +48,6 @@ std::expected<Scenario, Error> readScenario(std::string_view text, const std::st
     reader->allowOnly({"device", "entry", "steps"});
     Scenario scenario;
     scenario.device = device::readScenarioDevice(reader->member("device"));
-    addNotes(scenario.device, "/device", scenario);
     scenario.entry = readEntry(reader->member("entry"), scenario.device.description);
 
     const JsonReader steps = reader->member("steps");
@@ -64,10 +55,7 @@ std::expected<Scenario, Error> readScenario(std::string_view text, const std::st
         steps.expected("an array of steps");
     }
     for (const JsonReader& element : steps.elements()) {
-        const ScenarioStep& step = scenario.steps.emplace_back(readStep(element));
-        if (const auto* change = std::get_if<ChangeArguments>(&step.arguments)) {
-            addNotes(change->device, element.pointer() + "/device", scenario);
-        }
+        scenario.steps.push_back(readStep(element));
     }
     if (auto problem = reader->problem()) {
         return std::unexpected(std::move(*problem));

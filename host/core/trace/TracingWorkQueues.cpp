@@ -68,6 +68,10 @@ std::shared_ptr<WorkQueue> TracingWorkQueues::serialQueueWithLabel(const std::st
     return _queues.serialQueueWithLabel(label);
 }
 
+WorkQueue& TracingWorkQueues::globalQueueWithQuality(QualityClass quality) {
+    return _queues.globalQueueWithQuality(quality);
+}
+
 std::shared_ptr<DataOrEventSource>
 TracingWorkQueues::dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) {
     return _queues.dataOrSourceOnQueue(std::move(queue));

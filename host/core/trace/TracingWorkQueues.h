@@ -19,6 +19,7 @@ public:
     [[nodiscard]] WorkQueue& mainQueue() override;
     [[nodiscard]] std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) override;
+    [[nodiscard]] WorkQueue& globalQueueWithQuality(QualityClass quality) override;
     [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override;
     [[nodiscard]] std::shared_ptr<TimerEventSource> timerSourceOnQueue(WorkQueue& queue) override;

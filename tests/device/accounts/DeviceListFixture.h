@@ -32,6 +32,9 @@ public:
     serialQueueWithLabel(const std::string& label) override {
         return queues.emplace_back(std::make_shared<PumpedQueue>(label));
     }
+    [[nodiscard]] PumpedQueue& globalQueueWithQuality(QualityClass /*quality*/) override {
+        return _globalQueue;
+    }
     [[nodiscard]] std::shared_ptr<DataOrEventSource>
     dataOrSourceOnQueue(std::shared_ptr<WorkQueue> queue) override {
         return std::make_shared<device::DataOrSource>(std::move(queue));
@@ -47,6 +50,7 @@ public:
 
 private:
     PumpedQueue _mainQueue{"main"};
+    PumpedQueue _globalQueue{"global"};
     std::shared_ptr<device::TimerSchedule> _schedule = device::TimerSchedule::over(time);
 };
 

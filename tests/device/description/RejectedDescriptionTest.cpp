@@ -192,16 +192,28 @@ INSTANTIATE_TEST_SUITE_P(
                               "numAppGroups"}));
 
 INSTANTIATE_TEST_SUITE_P(
-    LaterParts, RejectedDescriptionTest,
+    Tool, RejectedDescriptionTest,
     testing::Values(
         std::pair{R"({"tool": "fake"})",
                   R"(/tool: expected an object, null or "real", found "fake")"},
+        std::pair{R"({"tool": true})", R"(/tool: expected an object, null or "real", found true)"},
         std::pair{R"({"tool": {"exit": 256}})",
                   "/tool/exit: expected an integer from 0 to 255, found 256"},
+        std::pair{R"({"tool": {"exit": "1"}})", R"(/tool/exit: expected an integer, found "1")"},
         std::pair{R"({"tool": {"signal": 0}})",
                   "/tool/signal: expected an integer from 1 to 64, found 0"},
+        std::pair{R"({"tool": {"signal": 65}})",
+                  "/tool/signal: expected an integer from 1 to 64, found 65"},
+        std::pair{R"({"tool": {"signal": 19}})",
+                  "/tool/signal: expected a signal that ends a program, found 19"},
         std::pair{R"({"tool": {"writesArchive": "x"}})",
                   R"(/tool/writesArchive: expected true or false, found "x")"},
+        std::pair{R"({"tool": {"path": "x"}})",
+                  "/tool/path: unknown key; expected one of exit, signal, writesArchive"}));
+
+INSTANTIATE_TEST_SUITE_P(
+    Faults, RejectedDescriptionTest,
+    testing::Values(
         std::pair{R"({"faults": {"load": []}})",
                   "/faults/load: unknown key; expected one of save, consentSet, removeItem, "
                   "createDirectory, spawn"},
@@ -210,8 +222,16 @@ INSTANTIATE_TEST_SUITE_P(
                   "/faults/save/0/description: expected a string, found 2"},
         std::pair{R"({"faults": {"consentSet": [true]}})",
                   "/faults/consentSet/0: expected false or null, found true"},
+        std::pair{R"({"faults": {"removeItem": {}}})",
+                  "/faults/removeItem: expected an array, found {}"},
+        std::pair{R"({"faults": {"removeItem": [null, 2]}})",
+                  "/faults/removeItem/1: " + error + "2"},
+        std::pair{R"({"faults": {"createDirectory": [{"domain": "D", "description": ""}]}})",
+                  "/faults/createDirectory/0/code: expected an integer, found nothing"},
         std::pair{R"({"faults": {"spawn": [0]}})",
-                  "/faults/spawn/0: expected an integer from 1 to 4095, found 0"}));
+                  "/faults/spawn/0: expected an integer from 1 to 4095, found 0"},
+        std::pair{R"({"faults": {"spawn": ["ENOENT"]}})",
+                  R"(/faults/spawn/0: expected an integer, found "ENOENT")"}));
 
 } // namespace
 } // namespace nimbra::device

@@ -21,7 +21,8 @@ protected:
 private:
     test::TemporaryDirectory _directory;
     test::RecordingLog _log;
-    DeviceFileManager _fileManager{DocumentsFile(DevicePaths(_directory.path()), _log)};
+    DeviceFileManager _fileManager{DevicePaths(_directory.path()),
+                                   DocumentsFile(DevicePaths(_directory.path()), _log)};
 };
 
 TEST_F(DeviceFileManagerTest, TheIdentityTokenIsTheOneOfTheFileNow) {

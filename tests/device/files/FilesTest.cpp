@@ -63,6 +63,22 @@ TEST(FilesTest, AWriteThatCannotEndLeavesNothingBeside) {
         (std::map<std::string, std::string>{{"place", "directory"}, {"place/taken", "directory"}}));
 }
 
+TEST(FilesTest, AFileHasThePermissionsThatAreAskedForWhateverItHadBefore) {
+    using std::filesystem::perms;
+    const test::TemporaryDirectory directory;
+    const auto path = directory.path() / "file";
+    const mode_t earlier = ::umask(077);
+
+    ASSERT_TRUE(writeFileAtomically(path, "text", 0755));
+    EXPECT_EQ(std::filesystem::status(path).permissions(), perms(0755));
+    ASSERT_TRUE(writeFileAtomically(path, "other", 0600));
+    EXPECT_EQ(std::filesystem::status(path).permissions(), perms(0600));
+    ASSERT_TRUE(writeFileAtomically(path, "third"));
+    EXPECT_EQ(std::filesystem::status(path).permissions(), perms(0600));
+
+    ::umask(earlier);
+}
+
 TEST(FilesTest, NewFilesAreReadableByEverybody) {
     const test::TemporaryDirectory directory;
     const std::map<std::string, std::string> files{{"a", "text"}, {"b", ""}};

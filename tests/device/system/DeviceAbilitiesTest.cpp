@@ -45,6 +45,27 @@ TEST_F(DeviceAbilitiesTest, AQuestionThatIsNotKnownIsAnsweredWithNo) {
     EXPECT_FALSE(DeviceAbilities(made).boolAnswerForQuestion("time-travel"));
 }
 
+TEST_F(DeviceAbilitiesTest, TheUsersNameForTheDeviceIsThatOfItsFile) {
+    description.name = " Lab\u2019s \"Pad\" / 2";
+    const DeviceSettings named = settings();
+    EXPECT_EQ(DeviceAbilities(named).copyAnswerForQuestion("UserAssignedDeviceName"),
+              Text(description.name));
+
+    ASSERT_TRUE(changeDeviceDirectory(root(), {DeviceDescription(), {"name"}}));
+    auto renamed = DeviceSettings::open(root());
+    ASSERT_TRUE(renamed);
+    EXPECT_EQ(DeviceAbilities(*renamed).copyAnswerForQuestion("UserAssignedDeviceName"),
+              Text("Nimbra Phone"));
+}
+
+TEST_F(DeviceAbilitiesTest, AQuestionForWordsThatIsNotKnownHasNoAnswer) {
+    const DeviceSettings made = settings();
+
+    for (const Text& question : {Text("SerialNumber"), Text("userassigneddevicename"), Text()}) {
+        EXPECT_EQ(DeviceAbilities(made).copyAnswerForQuestion(question), Text()) << question;
+    }
+}
+
 TEST_F(DeviceAbilitiesTest, AKeyStaysAsItIsOnADeviceWithTheUsualWording) {
     const DeviceSettings made = settings();
 

@@ -211,5 +211,39 @@ TEST_F(DeviceLocalizationTest, AFormatThatCannotBeFilledComesBackWithALine) {
                   start + R"("{0, date, short}": U_ILLEGAL_ARGUMENT_ERROR)"}));
 }
 
+// The last second of 2023 in Tokyo, where the device is.
+constexpr Date newYearsEve =
+    std::chrono::sys_days(std::chrono::December / 31 / 2023) + std::chrono::seconds(53999);
+
+TEST_F(DeviceLocalizationTest, ADateIsWrittenByItsPatternInTheDevicesTimeZone) {
+    const auto formatter = localization().dateFormatterWithFormat("yy.MM.dd-HH.mm.ss");
+
+    EXPECT_EQ(formatter->stringFromDate(newYearsEve), Text("23.12.31-23.59.59"));
+    EXPECT_EQ(formatter->stringFromDate(newYearsEve + std::chrono::microseconds(999'999)),
+              Text("23.12.31-23.59.59"));
+    EXPECT_EQ(formatter->stringFromDate(newYearsEve + std::chrono::seconds(1)),
+              Text("24.01.01-00.00.00"));
+    EXPECT_EQ(formatter->stringFromDate(Date(std::chrono::microseconds(-1))),
+              Text("70.01.01-08.59.59"));
+}
+
+TEST_F(DeviceLocalizationTest, ADateIsWrittenByTheLocaleOfWhenTheFormatterWasMade) {
+    const auto english = localization().dateFormatterWithFormat("MMMM d");
+    settings().overrideLocale("de-DE");
+    const auto german = localization().dateFormatterWithFormat("d. MMMM");
+    settings().overrideLocale("ar-EG");
+    const auto arabic = localization().dateFormatterWithFormat("dd");
+
+    EXPECT_EQ(english->stringFromDate(newYearsEve), Text("December 31"));
+    EXPECT_EQ(german->stringFromDate(newYearsEve), Text("31. Dezember"));
+    EXPECT_EQ(arabic->stringFromDate(newYearsEve), Text("\u0663\u0661"));
+}
+
+TEST_F(DeviceLocalizationTest, APatternWithAFieldThatDoesNotExistWritesNothing) {
+    EXPECT_EQ(localization().dateFormatterWithFormat("yy n")->stringFromDate(newYearsEve), Text());
+    EXPECT_EQ(localization().dateFormatterWithFormat(Text())->stringFromDate(newYearsEve),
+              Text(""));
+}
+
 } // namespace
 } // namespace nimbra::device

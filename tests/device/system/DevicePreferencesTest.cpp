@@ -29,28 +29,29 @@ private:
 
 TEST_F(DevicePreferencesTest, AnIntegerIsReadAsTheFileHasItNow) {
     write("domain", R"({"level": 3})");
-    EXPECT_EQ(preferences().integer("domain", "level"), 3);
+    EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("level", "domain"), 3);
 
     write("domain", R"({"level": -9223372036854775808})");
-    EXPECT_EQ(preferences().integer("domain", "level"), INT64_MIN);
+    EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("level", "domain"), INT64_MIN);
 }
 
 TEST_F(DevicePreferencesTest, AnythingElseIsNoInteger) {
-    write("domain", R"({"true": true, "float": 7.5, "whole": 7.0, "text": "7", "null": null,
-                        "large": 9223372036854775808, "list": [7]})");
+    write("domain", R"({"true": true, "float": 7.5, "whole": 7.0, "text": "7", "fraction": "7.5",
+                        "word": "seven", "null": null, "large": 9223372036854775808,
+                        "list": [7], "object": {"7": 7}})");
 
-    for (const char* const key :
-         {"true", "float", "whole", "text", "null", "large", "list", "no"}) {
-        EXPECT_EQ(preferences().integer("domain", key), std::nullopt) << key;
+    for (const char* const key : {"true", "float", "whole", "text", "fraction", "word", "null",
+                                  "large", "list", "object", "no"}) {
+        EXPECT_EQ(preferences().appIntegerValueForKeyInDomain(key, "domain"), std::nullopt) << key;
     }
-    EXPECT_EQ(preferences().integer("no such domain", "key"), std::nullopt);
+    EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("key", "no such domain"), std::nullopt);
     EXPECT_TRUE(log().lines().empty());
 }
 
 TEST_F(DevicePreferencesTest, AFileThatCannotBeReadMeansNothingAndOneLine) {
     write("domain", "[1]");
 
-    EXPECT_EQ(preferences().integer("domain", "key"), std::nullopt);
+    EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("key", "domain"), std::nullopt);
 
     EXPECT_EQ(log().lines(),
               std::vector<std::string>{(directory() / "domain.json").string() +

@@ -12,7 +12,9 @@
 #include <gtest/gtest.h>
 #include <memory>
 #include <optional>
+#include <set>
 #include <string>
+#include <thread>
 #include <vector>
 
 namespace nimbra::device {
@@ -217,6 +219,140 @@ TEST_F(DeviceWorkQueuesTest, ManyQueuesComeAndGo) {
     }
     endQueues();
     EXPECT_EQ(ran, 200);
+}
+
+TEST_F(DeviceWorkQueuesTest, ThereIsOneGlobalQueueForWorkThatTheUserHasAskedFor) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::string label;
+
+    queue.sync([&label] { label = currentQueueLabel(); });
+
+    EXPECT_EQ(&queues().globalQueueWithQuality(UserInitiatedQuality), &queue);
+    EXPECT_EQ(queue.label(), "user-initiated");
+    EXPECT_EQ(label, "user-initiated");
+}
+
+TEST_F(DeviceWorkQueuesTest, WorkOfTheGlobalQueueThatWaitsKeepsNoOtherFromRunning) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    constexpr std::size_t count = 20;
+    std::vector<std::promise<void>> started(count);
+    // Each piece of work waits for the one that was queued after it.
+    for (std::size_t index = 0; index < count; ++index) {
+        queue.async([&started, index] {
+            if (index + 1 < started.size()) {
+                started[index + 1].get_future().wait();
+            }
+            started[index].set_value();
+        });
+    }
+
+    started.front().get_future().wait();
+
+    endQueues();
+}
+
+TEST_F(DeviceWorkQueuesTest, TheGlobalQueueMayWaitForItself) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::vector<int> order;
+
+    queue.sync([&queue, &order] {
+        queue.sync([&queue, &order] {
+            queue.sync([&order] { order.push_back(3); });
+            order.push_back(2);
+        });
+        order.push_back(1);
+    });
+
+    EXPECT_EQ(order, (std::vector{3, 2, 1}));
+}
+
+TEST_F(DeviceWorkQueuesTest, AThreadOfTheGlobalQueueRunsFurtherWorkWhenItHasNothingToDo) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::set<std::thread::id> threads;
+    constexpr std::size_t count = 1000;
+
+    for (std::size_t index = 0; index < count; ++index) {
+        queue.sync([&threads] { threads.insert(std::this_thread::get_id()); });
+    }
+
+    EXPECT_LT(threads.size(), count);
+}
+
+TEST_F(DeviceWorkQueuesTest, WorkOfTheGlobalQueueCountsAsWorkUntilItsCapturesAreGone) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::atomic<int> alive = 0;
+    std::promise<void> start;
+    std::promise<std::pair<int, std::string>> idle;
+    queues().setIdleObserver([&] { idle.set_value({alive, currentQueueLabel()}); });
+
+    queue.async([&start, held = std::make_unique<Counted>(alive)] { start.get_future().wait(); });
+    EXPECT_FALSE(queues().isIdle());
+    start.set_value();
+
+    EXPECT_EQ(idle.get_future().get(), std::pair(0, std::string("user-initiated")));
+    EXPECT_TRUE(queues().isIdle());
+    queues().setIdleObserver({});
+}
+
+TEST_F(DeviceWorkQueuesTest, TheIdleObserverMayWaitForTheGlobalQueueThatCallsIt) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::promise<void> done;
+    std::atomic<bool> isFirst = true;
+    queues().setIdleObserver([&] {
+        if (isFirst.exchange(false)) {
+            queue.sync([] {});
+            done.set_value();
+        }
+    });
+
+    queue.async([] {});
+
+    done.get_future().wait();
+    endQueues();
+}
+
+TEST_F(DeviceWorkQueuesTest, TheEndWaitsForTheGlobalQueueAndForTheWorkThatItQueues) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    const auto serial = queues().serialQueueWithLabel("serial");
+    std::atomic<int> ran = 0;
+    for (int index = 0; index < 50; ++index) {
+        queue.async([&queue, &serial, &ran] {
+            serial->async([&queue, &ran] { queue.async([&ran] { ++ran; }); });
+        });
+    }
+
+    endQueues();
+
+    EXPECT_EQ(ran, 50);
+}
+
+TEST_F(DeviceWorkQueuesTest, WorkForTheGlobalQueueWhoseThreadsHaveEndedIsDropped) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::atomic<int> alive = 0;
+    bool ran = false;
+    queues().finish();
+
+    queue.async([held = std::make_unique<Counted>(alive), &ran] { ran = true; });
+    queue.sync([held = std::make_unique<Counted>(alive), &ran] { ran = true; });
+
+    EXPECT_FALSE(ran);
+    EXPECT_EQ(alive, 0);
+}
+
+TEST_F(DeviceWorkQueuesTest, ManyThreadsMayQueueAtOnceToTheGlobalQueue) {
+    WorkQueue& queue = queues().globalQueueWithQuality(UserInitiatedQuality);
+    std::atomic<int> sum = 0;
+    const auto count = [&queue, &sum] {
+        for (int round = 0; round < 100; ++round) {
+            queue.async([&sum] { ++sum; });
+            queue.sync([&sum] { ++sum; });
+        }
+    };
+
+    test::runAtOnce({count, count, count, count});
+    endQueues();
+
+    EXPECT_EQ(sum, 800);
 }
 
 TEST_F(DeviceWorkQueuesTest, ManyThreadsMayQueueAtOnce) {

@@ -40,8 +40,8 @@ protected:
             "description");
         const auto given = device::readDeviceDescription(*reader);
         ASSERT_FALSE(reader->problem()) << *reader->problem();
-        const auto made =
-            device::createDeviceDirectory(root(), given.description, NIMBRA_DATABASE_BUNDLE);
+        const auto made = device::createDeviceDirectory(root(), given.description,
+                                                        {.databaseBundle = NIMBRA_DATABASE_BUNDLE});
         ASSERT_TRUE(made) << made.error();
         auto started = PaneSession::start(
             {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .locale = "en-US", .trace = &_trace});

@@ -19,14 +19,14 @@ TEST(Init, MakesTheSampleDevice) {
 TEST(Init, MakesTheDeviceThatAFileDescribes) {
     const Program program;
     const auto description = program.write(
-        "phone.json", R"({"name": "Peter's Phone", "locale": "de-DE", "tool": null})");
+        "phone.json", R"({"name": "Peter's Phone", "locale": "de-DE", "databaseSettings": null})");
     const auto device = program.path("device");
 
     const auto result = program.run({"init", device.string(), "--from", description.string()});
 
     EXPECT_EQ(result.status, 0);
     EXPECT_EQ(result.output, "Made the device \"Peter's Phone\" in " + device.string() + ".\n");
-    EXPECT_EQ(result.messages, "settingsctl: note: /tool has no effect in this version\n");
+    EXPECT_EQ(result.messages, "");
     EXPECT_NE(program.run({"--root", device.string(), "list"}).output.find("Apps können"),
               std::string::npos);
 }

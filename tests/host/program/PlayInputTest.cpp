@@ -110,18 +110,5 @@ TEST(ScenarioInput, AFileThatIsNotThereIsRefused) {
     EXPECT_EQ(result.messages.find('\n'), result.messages.size() - 1);
 }
 
-TEST(ScenarioInput, KeysWithoutEffectAreNamedOnceEach) {
-    const Program program;
-    const std::string scenario = R"({"device": {"deviceList": null, "tool": null}, "steps": [
-        {"do": "open"}, {"do": "change", "device": {"tool": "real"}}]})";
-
-    const auto result = program.run({"play", "-"}, scenario);
-
-    EXPECT_EQ(result.status, 0);
-    EXPECT_EQ(result.messages,
-              "settingsctl: note: /device/tool has no effect in this version\n"
-              "settingsctl: note: /steps/1/device/tool has no effect in this version\n");
-}
-
 } // namespace
 } // namespace nimbra::test
