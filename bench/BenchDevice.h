@@ -73,6 +73,8 @@ private:
     void presentAlert(const std::shared_ptr<AlertController>& /*alert*/,
                       bool /*animated*/) override {}
     void showAccountAlert(const std::shared_ptr<AccountAlertView>& /*alert*/) override {}
+    void presentShareSheet(const std::shared_ptr<ShareSheet>& /*sheet*/,
+                           bool /*animated*/) override {}
 
     host::TemporaryDirectory _directory;
     host::HostLoop _loop;

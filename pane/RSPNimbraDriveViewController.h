@@ -3,6 +3,7 @@
 #include "pane/RSPServiceAccessCache.h"
 #include "platform/host/AccountSettingsPane.h"
 #include "platform/system/NotificationCenter.h"
+#include "platform/values/FileURL.h"
 #include "platform/values/RowValue.h"
 #include "upgrade/RSPUpgradeViewControllerDelegate.h"
 
@@ -11,6 +12,7 @@
 #include <memory>
 #include <mutex>
 #include <optional>
+#include <string>
 
 namespace nimbra {
 
@@ -62,6 +64,18 @@ protected:
     /// The group and the button of diagnostics; nothing while diagnostics are off.
     [[nodiscard]] virtual std::optional<SpecifierArray> _createSpecifiersForDiagnostics();
 
+    /// `name` as a part of a file's name. Any queue.
+    [[nodiscard]] static std::string _sanitizeForDiagnoseName(std::string name);
+    /// Empties the directory of the archive, and says where in it the archive of this moment is to
+    /// stand; nothing, and a line in the log, where that fails. Any queue but the main one.
+    [[nodiscard]] std::optional<std::string> _diagnosePathForMR() const;
+    /// Has an archive written, and waits for it; nothing where none was. Any queue but the main
+    /// one.
+    [[nodiscard]] std::optional<FileURL> _collectMRLogs() const;
+    /// What a tap on the button `row` calls: an archive is collected in the background and offered
+    /// to be shared. Nothing while the page is at it already.
+    void diagnoseDocumentsAndData(const std::shared_ptr<Specifier>& row);
+
     /// The row of one application; null for one that is not installed or not to be shown.
     [[nodiscard]] std::shared_ptr<Specifier>
     _appSpecifierWithBundleID(const BundleIdentifier& bundleID);
@@ -109,6 +123,12 @@ private:
     [[nodiscard]] RowValue _valueForTessarySpecifier(const Specifier& row);
 
     void _upgradeButtonWasTapped(const std::shared_ptr<Specifier>& row);
+
+    void _diagnosisDidEnd(const std::optional<FileURL>& archive,
+                          const std::shared_ptr<Specifier>& row);
+    void _showFailedDiagnosisAlert() const;
+    void _shareDiagnosis(const FileURL& archive, const std::shared_ptr<Specifier>& row);
+    void _diagnosisTaskFinished();
 
     void _refresh(const std::shared_ptr<RefreshControl>& sender);
     [[nodiscard]] std::shared_ptr<ObserverToken>

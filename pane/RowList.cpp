@@ -110,10 +110,4 @@ void RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndData
     }
 }
 
-// Until diagnostics have rows of their own, this answers with nothing.
-
-std::optional<SpecifierArray> RSPNimbraDriveViewController::_createSpecifiersForDiagnostics() {
-    return std::nullopt;
-}
-
 } // namespace nimbra

@@ -8,6 +8,7 @@
 #include "device/system/DeviceWorkQueues.h"
 #include "host/core/BundleSearch.h"
 #include "host/core/trace/SessionTracer.h"
+#include "platform/host/SettingsRootController.h"
 #include "platform/system/ClassRegistry.h"
 #include "platform/system/DistributedNotificationCenter.h"
 #include "platform/system/NotificationCenter.h"
@@ -32,6 +33,8 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
     if (Trace* trace = session->_configuration.trace) {
         session->_tracer = std::make_unique<SessionTracer>(*session->_services, *trace);
     }
+    session->_rootController = session->_tracer ? session->_tracer->makeRootController()
+                                                : std::make_shared<SettingsRootController>();
     return session;
 }
 
@@ -99,6 +102,7 @@ std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
     _pane = paneClass.create(services);
     _pane->setSpecifier(_accountPage->entryRow());
     _pane->setParentController(_accountPage);
+    _pane->setRootController(_rootController);
     if (_tracer) {
         _tracer->observeParent(*_accountPage);
         _listWatcher.setNext(&_tracer->listObserver());
@@ -106,6 +110,7 @@ std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
     _pane->setObserver(&_listWatcher);
     _footers = std::make_unique<GroupFooters>(_device->classes(), services, _device->systemLog());
     _pane->loadViewIfNeeded();
+    _pane->table()->setCellSource([this](const IndexPath& path) { return cellOfRow(path); });
     if (_tracer) {
         _tracer->observeRefreshControl(*_pane);
     }
@@ -127,6 +132,12 @@ void PaneSession::closePane() {
     _footers.reset();
     _pane.reset();
     _accountPage.reset();
+}
+
+std::shared_ptr<TableCell> PaneSession::cellOfRow(const IndexPath& path) {
+    // A text has all its rows on the screen. A page that has been closed has none.
+    const auto row = _pane ? _pane->specifierAtIndexPath(path) : nullptr;
+    return row ? std::make_shared<TableCell>(*_services, Rect(), row->label()) : nullptr;
 }
 
 void PaneSession::appear() {
@@ -185,6 +196,7 @@ std::expected<std::shared_ptr<Specifier>, RowRefusal> PaneSession::row(std::stri
 std::expected<std::shared_ptr<Specifier>, RowRefusal>
 PaneSession::uncoveredRow(std::string_view name) {
     auto found = row(name);
+    // A share sheet may stand beside the list.
     if (found && (_presentations.alert() != nullptr || _presentations.screen())) {
         return std::unexpected(refusalOfCoveredPage());
     }
@@ -279,15 +291,15 @@ void PaneSession::presentController(const std::shared_ptr<SetupController>& cont
 }
 
 void PaneSession::dismissPresentedController(bool /*animated*/) {
-    _presentations.dismissScreen();
+    _presentations.dismissLast();
 }
 
-void PaneSession::dismissController(const ViewController& controller, bool animated) {
+void PaneSession::dismissController(const ViewController& controller, bool /*animated*/) {
     if (&controller == _pane.get()) {
         // Later, as the pane itself asks for it and is still at work.
         _loop.async([this] { closePane(); });
     } else if (&controller == _presentations.screen().get()) {
-        dismissPresentedController(animated);
+        _presentations.dismissScreen();
     } else if (&controller == _detailPage.page().get()) {
         // As with the pane; meanwhile another page may have come in its place.
         _loop.async([this, page = std::weak_ptr(_detailPage.page())] {
@@ -299,11 +311,20 @@ void PaneSession::dismissController(const ViewController& controller, bool anima
 }
 
 void PaneSession::presentAlert(const std::shared_ptr<AlertController>& alert, bool /*animated*/) {
-    _presentations.present(alert);
+    if (_pane) {
+        _presentations.present(alert);
+    }
 }
 
 void PaneSession::showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) {
     _presentations.present(alert);
+}
+
+void PaneSession::presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool /*animated*/) {
+    // A collection may end after its page was closed, with none to show a sheet over.
+    if (_pane) {
+        _presentations.present(sheet);
+    }
 }
 
 std::expected<void, Error> PaneSession::loadBundle() {

@@ -26,7 +26,8 @@
 
 namespace nimbra {
 struct Notification;
-}
+class SettingsRootController;
+} // namespace nimbra
 namespace nimbra::device {
 class DeviceBundle;
 class DevicePlatform;
@@ -135,6 +136,7 @@ private:
     void dismissController(const ViewController& controller, bool animated) override;
     void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) override;
     void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) override;
+    void presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool animated) override;
 
     /// The row, where the user can reach it now; from a page behind a link the user comes back.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
@@ -146,6 +148,7 @@ private:
     void layOut();
     [[nodiscard]] std::expected<void, Error> loadBundle();
     [[nodiscard]] PlatformServices servicesForPane();
+    [[nodiscard]] std::shared_ptr<TableCell> cellOfRow(const IndexPath& path);
     [[nodiscard]] std::expected<UserInfo, Error> userInfoFor(const PaneEntry& entry);
 
     Configuration _configuration;
@@ -160,6 +163,7 @@ private:
     std::unique_ptr<device::DevicePlatform> _device;
     std::shared_ptr<device::DeviceBundle> _bundle;
     std::optional<std::map<std::string, std::string>> _texts;
+    std::shared_ptr<SettingsRootController> _rootController;
     std::shared_ptr<AccountPage> _accountPage;
     std::shared_ptr<SettingsListController> _pane;
     ListWatcher _listWatcher;

@@ -50,7 +50,7 @@ bool isCalled(const Text& text, std::string_view title) {
 } // namespace
 
 void Presentations::present(const std::shared_ptr<SetupController>& controller) {
-    if (_presented) {
+    if (_presented || _sheet) {
         return;
     }
     _presented = controller;
@@ -76,6 +76,20 @@ void Presentations::present(const std::shared_ptr<AccountAlertView>& alert) {
                                                 .isOfAccount = true}));
 }
 
+void Presentations::present(const std::shared_ptr<ShareSheet>& sheet) {
+    if (!_sheet) {
+        _sheet = sheet;
+    }
+}
+
+void Presentations::dismissLast() {
+    if (_sheet) {
+        _sheet.reset();
+        return;
+    }
+    dismissScreen();
+}
+
 void Presentations::dismissScreen() {
     const auto dismissed = std::exchange(_presented, nullptr);
     if (!dismissed) {
@@ -88,6 +102,7 @@ void Presentations::dismissScreen() {
 }
 
 void Presentations::dismissAll() {
+    _sheet.reset();
     dismissScreen();
     _alerts.clear();
 }
@@ -124,6 +139,18 @@ void Presentations::answerAlert(std::size_t action) {
     if (handler) {
         handler();
     }
+}
+
+std::expected<void, std::string> Presentations::endSharing(ShareOutcome outcome) {
+    // A hold, as the handler dismisses the sheet.
+    const auto sheet = _sheet;
+    if (!sheet) {
+        return Refused("no share sheet is presented");
+    }
+    if (const auto& handler = sheet->completionWithItemsHandler()) {
+        handler(outcome);
+    }
+    return {};
 }
 
 std::shared_ptr<Button> Presentations::usableButton() const {

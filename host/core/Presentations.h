@@ -1,6 +1,7 @@
 #pragma once
 
 #include "platform/host/AlertController.h"
+#include "platform/host/ShareSheet.h"
 #include "platform/values/Text.h"
 #include "platform/views/Geometry.h"
 #include "platform/views/Window.h"
@@ -32,15 +33,21 @@ struct ShownAlert {
     bool isOfAccount = false;
 };
 
-/// What stands over a pane: a screen in a sheet, and alerts over both. Main queue.
+/// What stands over a pane: a screen in a sheet or something to be shared, and alerts over both.
+/// Main queue.
 class Presentations {
 public:
-    /// Shows the controller's page, in a window of its own, over the pane. One at a time: where
-    /// there is one already, nothing happens.
+    /// Shows the controller's page, in a window of its own, over the pane. Where there is one
+    /// already, or a share sheet, nothing happens: the pane can present one thing only.
     void present(const std::shared_ptr<SetupController>& controller);
     void present(const std::shared_ptr<AlertController>& alert);
     void present(const std::shared_ptr<AccountAlertView>& alert);
+    /// Also over a screen that came while the sheet was made ready; nothing where there is one.
+    void present(const std::shared_ptr<ShareSheet>& sheet);
 
+    /// Takes away what was presented last, the share sheet or the screen; nothing when there is
+    /// neither.
+    void dismissLast();
     /// Takes the screen away, and the alerts with which it asks; nothing when there is none.
     void dismissScreen();
     /// Takes all away.
@@ -50,6 +57,12 @@ public:
     [[nodiscard]] std::shared_ptr<SettingsListController> screen() const;
     /// The alert on top, the same object as long as it stands; null for none.
     [[nodiscard]] std::shared_ptr<const ShownAlert> alert() const;
+
+    /// What the user is offered to share; null for nothing.
+    [[nodiscard]] const std::shared_ptr<ShareSheet>& shareSheet() const { return _sheet; }
+    /// The user has shared, or given up: the pane is told, which then dismisses the sheet. Refused,
+    /// with the reason, where there is none.
+    [[nodiscard]] std::expected<void, std::string> endSharing(ShareOutcome outcome);
 
     /// While the pane is busy, its sign covers the screen.
     void setBusy(bool isBusy) { _isBusy = isBusy; }
@@ -77,6 +90,7 @@ private:
 
     Window _window;
     std::shared_ptr<SetupController> _presented;
+    std::shared_ptr<ShareSheet> _sheet;
     /// The one on top last.
     std::vector<std::shared_ptr<const ShownAlert>> _alerts;
     bool _isBusy = false;

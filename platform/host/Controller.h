@@ -4,6 +4,8 @@
 
 namespace nimbra {
 
+class SettingsRootController;
+
 /// A page, or what holds a page, as the one that it leads to knows it. Main queue only, but for its
 /// release.
 class Controller {
@@ -24,8 +26,17 @@ public:
         _parentController = parent;
     }
 
+    /// The host's own, held weakly; null when there is none or it has gone.
+    [[nodiscard]] std::shared_ptr<SettingsRootController> rootController() const {
+        return _rootController.lock();
+    }
+    void setRootController(const std::shared_ptr<SettingsRootController>& root) {
+        _rootController = root;
+    }
+
 private:
     std::weak_ptr<Controller> _parentController;
+    std::weak_ptr<SettingsRootController> _rootController;
 };
 
 } // namespace nimbra

@@ -9,6 +9,7 @@ namespace nimbra {
 class AccountAlertView;
 class AlertController;
 class SetupController;
+class ShareSheet;
 class ViewController;
 
 /// What a pane may ask of the host that shows it. Main queue only.
@@ -30,8 +31,8 @@ public:
     /// Shows `controller` over the pane; the host shares it while it is shown.
     virtual void presentController(const std::shared_ptr<SetupController>& controller,
                                    bool animated) = 0;
-    /// Takes away the controller that the pane has presented over itself, and the alerts over that;
-    /// nothing when there is none.
+    /// Takes away what the pane has presented over itself last, a share sheet or a controller with
+    /// the alerts over that; nothing when there is none.
     virtual void dismissPresentedController(bool animated) = 0;
     /// Takes away `controller` itself, the pane or what was presented over it, and returns to the
     /// page that led there; nothing when it is not shown.
@@ -42,6 +43,11 @@ public:
     virtual void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) = 0;
     /// The same with an alert about an account.
     virtual void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) = 0;
+
+    /// Offers the user to share something, over all that is shown. The host shares the sheet while
+    /// it is shown, calls its handler when the user has shared or given up, and leaves it to the
+    /// pane to dismiss it.
+    virtual void presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool animated) = 0;
 };
 
 } // namespace nimbra

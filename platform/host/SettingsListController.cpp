@@ -127,4 +127,44 @@ SettingsListController::indexOfSpecifier(const std::shared_ptr<Specifier>& row) 
     return static_cast<std::size_t>(std::distance(_specifiers->begin(), place));
 }
 
+std::optional<IndexPath>
+SettingsListController::indexPathForSpecifier(const std::shared_ptr<Specifier>& row) const {
+    std::optional<IndexPath> found;
+    visitRows([&](const IndexPath& path, const std::shared_ptr<Specifier>& candidate) {
+        if (candidate == row) {
+            found = path;
+        }
+    });
+    return found;
+}
+
+std::shared_ptr<Specifier>
+SettingsListController::specifierAtIndexPath(const IndexPath& path) const {
+    std::shared_ptr<Specifier> found;
+    visitRows([&](const IndexPath& candidate, const std::shared_ptr<Specifier>& row) {
+        if (candidate == path) {
+            found = row;
+        }
+    });
+    return found;
+}
+
+template <class Visit>
+void SettingsListController::visitRows(const Visit& visit) const {
+    if (!_specifiers) {
+        return;
+    }
+    IndexPath next;
+    bool isFirst = true;
+    for (const std::shared_ptr<Specifier>& row : *_specifiers) {
+        if (row->cellType() != GroupCell) {
+            visit(next, row);
+            ++next.row;
+        } else if (!isFirst) {
+            next = {.section = next.section + 1, .row = 0};
+        }
+        isFirst = false;
+    }
+}
+
 } // namespace nimbra

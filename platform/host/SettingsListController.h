@@ -54,6 +54,12 @@ public:
     /// Where the rows are shown; never null.
     [[nodiscard]] const std::shared_ptr<Table>& table() const { return _table; }
 
+    /// Where `row` stands in the table, and which row stands there; nothing for a group's header,
+    /// or where there is none. Rows before the first header are a group of their own.
+    [[nodiscard]] std::optional<IndexPath>
+    indexPathForSpecifier(const std::shared_ptr<Specifier>& row) const;
+    [[nodiscard]] std::shared_ptr<Specifier> specifierAtIndexPath(const IndexPath& path) const;
+
     /// Sets who is told of changes, instead of whoever was; null for nobody. Not owned: to be
     /// taken back before it goes.
     void setObserver(SettingsListObserver* observer);
@@ -74,6 +80,10 @@ protected:
     std::optional<SpecifierArray> _specifiers;
 
 private:
+    /// Calls `visit` with the index path of each row that is no group's header, and with the row.
+    template <class Visit>
+    void visitRows(const Visit& visit) const;
+
     std::shared_ptr<Table> _table;
     std::shared_ptr<Specifier> _specifier;
     SettingsListObserver* _observer = nullptr;

@@ -64,6 +64,11 @@ void ViewController::presentViewControllerAnimated(const std::shared_ptr<AlertCo
     _services.presenter->presentAlert(alert, animated);
 }
 
+void ViewController::presentViewControllerAnimated(const std::shared_ptr<ShareSheet>& sheet,
+                                                   bool animated) const {
+    _services.presenter->presentShareSheet(sheet, animated);
+}
+
 void ViewController::dismissViewControllerAnimated(bool animated) const {
     _services.presenter->dismissPresentedController(animated);
 }

@@ -11,6 +11,7 @@ namespace nimbra {
 
 class AlertController;
 class SetupController;
+class ShareSheet;
 class View;
 
 /// What stands behind a view that fills the screen or a sheet. To be made as a shared object, over
@@ -51,12 +52,14 @@ protected:
     void setView(std::shared_ptr<View> view);
     void setTitle(Text title);
 
-    /// Shows another controller over this one, or asks the user something.
+    /// Shows another controller over this one, asks the user something, or offers to share.
     void presentViewControllerAnimated(const std::shared_ptr<SetupController>& controller,
                                        bool animated) const;
     void presentViewControllerAnimated(const std::shared_ptr<AlertController>& alert,
                                        bool animated) const;
-    /// Takes away the screen presented over this page, or this page itself.
+    void presentViewControllerAnimated(const std::shared_ptr<ShareSheet>& sheet,
+                                       bool animated) const;
+    /// Takes away what is presented over this page, or this page itself.
     void dismissViewControllerAnimated(bool animated) const;
     void dismissAnimated(bool animated) const;
 

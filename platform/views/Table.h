@@ -1,9 +1,12 @@
 #pragma once
 
+#include "platform/views/IndexPath.h"
 #include "platform/views/RefreshControl.h"
+#include "platform/views/TableCell.h"
 #include "platform/views/View.h"
 
 #include <cstdint>
+#include <functional>
 #include <memory>
 #include <utility>
 
@@ -28,9 +31,20 @@ public:
         _refreshControl = std::move(control);
     }
 
+    /// Gives the cell of the row at `path` where the host shows that row now, or else null.
+    using CellSource = std::function<std::shared_ptr<TableCell>(const IndexPath& path)>;
+    /// For the host that draws the table.
+    void setCellSource(CellSource source) { _cellSource = std::move(source); }
+
+    /// The cell of the row at `path`; null for a row that is not on the screen.
+    [[nodiscard]] std::shared_ptr<TableCell> cellForRowAtIndexPath(const IndexPath& path) const {
+        return _cellSource ? _cellSource(path) : nullptr;
+    }
+
 private:
     TableStyle _style;
     std::shared_ptr<RefreshControl> _refreshControl;
+    CellSource _cellSource;
 };
 
 } // namespace nimbra

@@ -19,10 +19,13 @@ class PaneWithRows final : public RSPNimbraDriveViewController {
 public:
     using RSPNimbraDriveViewController::_accessCache;
     using RSPNimbraDriveViewController::_appAccessGrantedForBundleID;
+    using RSPNimbraDriveViewController::_collectMRLogs;
     using RSPNimbraDriveViewController::_createSpecifiersForCellularSwitchCell;
+    using RSPNimbraDriveViewController::_diagnosePathForMR;
     using RSPNimbraDriveViewController::_registerContainerPriorityHinting;
     using RSPNimbraDriveViewController::_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState;
     using RSPNimbraDriveViewController::_reloadVantrelAccount;
+    using RSPNimbraDriveViewController::_sanitizeForDiagnoseName;
     using RSPNimbraDriveViewController::_setAppAccessGrantedForBundleID;
     using RSPNimbraDriveViewController::_vantrelAccount;
     using RSPNimbraDriveViewController::RSPNimbraDriveViewController;
@@ -38,6 +41,12 @@ public:
         return apps ? *apps : RSPNimbraDriveViewController::_appSpecifiersForPRVServices();
     }
 
+    std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override {
+        asked.emplace_back("diagnostics");
+        return diagnostics ? diagnostics
+                           : RSPNimbraDriveViewController::_createSpecifiersForDiagnostics();
+    }
+
     std::shared_ptr<Specifier> upgrade;
     /// Whether the upgrade row is the page's own instead.
     bool makesUpgradeRow = false;
@@ -46,6 +55,7 @@ public:
     std::shared_ptr<Specifier> tessary;
     /// Whether the row of the cloud database is the page's own instead.
     bool makesTessaryRow = false;
+    /// Absent: the rows that the page itself makes.
     std::optional<SpecifierArray> diagnostics;
     int appQueries = 0;
     /// The sources that were asked for rows, in order.
@@ -60,10 +70,6 @@ protected:
     std::shared_ptr<Specifier> _specifierForTessary() override {
         asked.emplace_back("tessary");
         return makesTessaryRow ? RSPNimbraDriveViewController::_specifierForTessary() : tessary;
-    }
-    std::optional<SpecifierArray> _createSpecifiersForDiagnostics() override {
-        asked.emplace_back("diagnostics");
-        return diagnostics;
     }
 };
 

@@ -4,6 +4,7 @@
 #include "platform/host/AlertController.h"
 #include "platform/host/Presenter.h"
 #include "platform/host/SetupController.h"
+#include "platform/host/ShareSheet.h"
 
 #include <memory>
 #include <string>
@@ -43,10 +44,27 @@ public:
         accountAlert = shown;
     }
 
+    void presentShareSheet(const std::shared_ptr<ShareSheet>& shown, bool animated) override {
+        // What it has now, not what it is given later.
+        std::string call = animated ? "share, animated:" : "share:";
+        for (const FileURL& item : shown->activityItems()) {
+            call += ' ' + item.path();
+        }
+        for (const ActivityType& type :
+             shown->includedActivityTypes().value_or(std::vector<ActivityType>())) {
+            call += ' ' + type.string();
+        }
+        call += shown->completionWithItemsHandler() ? ", handled" : "";
+        call += shown->popoverPresentationController().sourceView ? ", from a view" : "";
+        _calls.push_back(call);
+        shareSheet = shown;
+    }
+
     /// What was presented last; a test lets it go, as a host does at its end.
     std::shared_ptr<SetupController> presented;
     std::shared_ptr<AlertController> alert;
     std::shared_ptr<AccountAlertView> accountAlert;
+    std::shared_ptr<ShareSheet> shareSheet;
     /// Who wanted to be dismissed last; not to be used but for its identity.
     const ViewController* dismissed = nullptr;
 

@@ -3,6 +3,7 @@
 #include "device/DeviceDescription.h"
 #include "device/documents/ProgressValues.h"
 #include "host/core/AccountPage.h"
+#include "platform/host/ShareSheet.h"
 #include "platform/system/NotificationCenter.h"
 #include "platform/views/Geometry.h"
 
@@ -57,6 +58,10 @@ struct TitleArgument {
     std::string title;
 };
 
+struct ShareArguments {
+    ShareOutcome outcome = ShareOutcome::cancelled;
+};
+
 struct ChangeArguments {
     device::GivenDescription device;
 };
@@ -67,7 +72,7 @@ struct ScenarioStep {
     std::string name;
     std::variant<std::monostate, RowArgument, SetArguments, PostArguments, ProgressArguments,
                  MoveFooterArguments, AdvanceArguments, LayoutArguments, TitleArgument,
-                 ChangeArguments>
+                 ShareArguments, ChangeArguments>
         arguments;
 };
 
@@ -76,8 +81,6 @@ struct Scenario {
     device::GivenDescription device;
     PaneEntry entry;
     std::vector<ScenarioStep> steps;
-    /// One line for each key that the file gives and that has no effect in this version.
-    std::vector<std::string> notes;
 };
 
 } // namespace nimbra::host

@@ -3,8 +3,10 @@
 #include "device/DeviceDirectory.h"
 #include "device/DevicePlatform.h"
 #include "device/bundles/DeviceBundles.h"
+#include "device/documents/DeviceFileManager.h"
 #include "device/store/DeviceAccountStore.h"
 #include "device/store/DevicePrivacyConsentStore.h"
+#include "device/system/DeviceProcesses.h"
 #include "device/system/DeviceSettings.h"
 #include "device/system/StandingTime.h"
 #include "host/core/BundleSearch.h"
@@ -22,12 +24,11 @@
 
 namespace nimbra::host {
 
-/// How a step is done, or why this version cannot do it.
+/// How a step is done.
 struct ScenarioPlayer::Handler {
     std::string_view name;
     Outcome (ScenarioPlayer::*perform)(const ScenarioStep& step) = nullptr;
     bool needsPane = false;
-    std::string_view missing;
 };
 
 const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& name) {
@@ -55,7 +56,7 @@ const ScenarioPlayer::Handler* ScenarioPlayer::handlerFor(const std::string& nam
         Handler{.name = "views", .perform = &ScenarioPlayer::views},
         Handler{.name = "tapButton", .perform = &ScenarioPlayer::tapButton},
         Handler{.name = "alert", .perform = &ScenarioPlayer::alert},
-        Handler{.name = "share", .missing = "no share sheet"},
+        Handler{.name = "share", .perform = &ScenarioPlayer::share},
     };
     const auto* const handler = std::ranges::find(handlers, name, &Handler::name);
     return handler != handlers.end() ? handler : nullptr;
@@ -98,6 +99,9 @@ void ScenarioPlayer::applyToSession(const device::GivenDescription& given) {
     if (given.keys.contains("faults")) {
         _session.device().accountStore().planSaveOutcomes(given.description.saveFaults);
         _session.device().privacyConsentStore().planSetOutcomes(given.description.consentSetFaults);
+        _session.device().fileManager().planRemoveOutcomes(given.description.removeItemFaults);
+        _session.device().fileManager().planCreateOutcomes(given.description.createDirectoryFaults);
+        _session.device().processes().planSpawnOutcomes(given.description.spawnFaults);
     }
 }
 
@@ -105,9 +109,6 @@ ScenarioPlayer::Outcome ScenarioPlayer::perform(const ScenarioStep& step) {
     const Handler* handler = handlerFor(step.name);
     if (handler == nullptr) {
         return std::unexpected("this version does not know the step");
-    }
-    if (handler->perform == nullptr) {
-        return std::unexpected("this version has " + std::string(handler->missing) + " yet");
     }
     if (handler->needsPane && !_session.isPaneOpen()) {
         return std::unexpected("no pane is open");

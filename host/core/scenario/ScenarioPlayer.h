@@ -70,6 +70,7 @@ private:
     Outcome views(const ScenarioStep& step);
     Outcome tapButton(const ScenarioStep& step);
     Outcome alert(const ScenarioStep& step);
+    Outcome share(const ScenarioStep& step);
     Outcome close(const ScenarioStep& step);
 
     const Scenario& _scenario;

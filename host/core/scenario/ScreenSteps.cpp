@@ -1,4 +1,5 @@
-// The steps of a scenario that concern what stands over the page: a screen and alerts.
+// The steps of a scenario that concern what stands over the page: a screen, alerts and a share
+// sheet.
 #include "host/core/PaneSession.h"
 #include "host/core/Presentations.h"
 #include "host/core/RowDescription.h"
@@ -51,6 +52,10 @@ ScenarioPlayer::Outcome ScenarioPlayer::tapButton(const ScenarioStep& step) {
 
 ScenarioPlayer::Outcome ScenarioPlayer::alert(const ScenarioStep& step) {
     return _session.presentations().answerAlert(std::get<TitleArgument>(step.arguments).title);
+}
+
+ScenarioPlayer::Outcome ScenarioPlayer::share(const ScenarioStep& step) {
+    return _session.presentations().endSharing(std::get<ShareArguments>(step.arguments).outcome);
 }
 
 } // namespace nimbra::host

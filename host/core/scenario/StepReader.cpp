@@ -181,12 +181,14 @@ Arguments alert(const JsonReader& step) {
     return TitleArgument{requiredString(step, "choose", "an action's title")};
 }
 
-// This one is checked only: nothing in this version uses it.
-
 Arguments share(const JsonReader& step) {
     step.allowOnly({"do", "outcome"});
-    static_cast<void>(device::readOneOf(step.member("outcome"), {"sent", "cancelled", "failed"}));
-    return {};
+    const std::string outcome =
+        device::readOneOf(step.member("outcome"), {"sent", "cancelled", "failed"});
+    if (outcome == "sent") {
+        return ShareArguments{ShareOutcome::sent};
+    }
+    return ShareArguments{outcome == "failed" ? ShareOutcome::failed : ShareOutcome::cancelled};
 }
 
 struct StepForm {

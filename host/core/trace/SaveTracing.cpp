@@ -20,17 +20,11 @@ void traceSaveStart(Trace& trace, const char* operation, const std::shared_ptr<A
 
 void traceSaveEnd(Trace& trace, const char* operation, const std::shared_ptr<Account>& account,
                   const std::expected<void, Error>& saved) {
-    nlohmann::ordered_json error;
-    if (!saved) {
-        error = {{"domain", saved.error().domain},
-                 {"code", saved.error().code},
-                 {"description", saved.error().description}};
-    }
     trace.write("save", {{"phase", "end"},
                          {"account", identifierOf(account)},
                          {"op", operation},
                          {"success", saved.has_value()},
-                         {"error", std::move(error)}});
+                         {"error", saved ? nullptr : jsonOf(saved.error())}});
 }
 
 } // namespace nimbra::host

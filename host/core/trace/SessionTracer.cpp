@@ -38,7 +38,8 @@ SessionTracer::SessionTracer(const PlatformServices& services, Trace& trace)
       _distributedNotificationCenter(services.distributedNotificationCenter, trace),
       _progressReports(services.progressReports, trace),
       _deviceListRequests(services.deviceListRequests, trace), _bundles(services.bundles, trace),
-      _table(trace), _parent(trace),
+      _fileManager(services.fileManager, trace),
+      _processes(services.processes, services.fileManager, trace), _table(trace), _parent(trace),
       _earlierSyslogSink(replaceSyslogSink([&trace](int priority, const std::string& message) {
           trace.write("syslog", {{"priority", priority}, {"message", message}});
       })) {
@@ -65,7 +66,13 @@ PlatformServices SessionTracer::services() {
     services.progressReports = _progressReports;
     services.deviceListRequests = _deviceListRequests;
     services.bundles = _bundles;
+    services.fileManager = _fileManager;
+    services.processes = _processes;
     return services;
+}
+
+std::shared_ptr<SettingsRootController> SessionTracer::makeRootController() const {
+    return std::make_shared<TracingRootController>(_trace);
 }
 
 std::shared_ptr<Account> SessionTracer::traced(std::shared_ptr<Account> account) const {

@@ -8,10 +8,13 @@
 #include "host/core/trace/TracingDeviceListRequests.h"
 #include "host/core/trace/TracingDistributedNotificationCenter.h"
 #include "host/core/trace/TracingDocumentContainers.h"
+#include "host/core/trace/TracingFileManager.h"
 #include "host/core/trace/TracingNotificationCenter.h"
 #include "host/core/trace/TracingPresenter.h"
 #include "host/core/trace/TracingPrivacyConsentStore.h"
+#include "host/core/trace/TracingProcesses.h"
 #include "host/core/trace/TracingProgressReports.h"
+#include "host/core/trace/TracingRootController.h"
 #include "host/core/trace/TracingSystemLog.h"
 #include "host/core/trace/TracingWorkQueues.h"
 #include "platform/PlatformServices.h"
@@ -42,6 +45,9 @@ public:
     /// The services to be handed to a pane.
     [[nodiscard]] PlatformServices services();
 
+    /// A root controller for panes, whose tasks are traced.
+    [[nodiscard]] std::shared_ptr<SettingsRootController> makeRootController() const;
+
     /// `account`, traced, for a pane that gets it from its host; null for null.
     [[nodiscard]] std::shared_ptr<Account> traced(std::shared_ptr<Account> account) const;
 
@@ -69,6 +75,8 @@ private:
     TracingProgressReports _progressReports;
     TracingDeviceListRequests _deviceListRequests;
     TracingBundles _bundles;
+    TracingFileManager _fileManager;
+    TracingProcesses _processes;
     TableTracer _table;
     ParentTracer _parent;
     SyslogSink _earlierSyslogSink;

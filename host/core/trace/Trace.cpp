@@ -4,7 +4,7 @@
 
 namespace nimbra::host {
 
-void Trace::write(std::string_view event, Keys keys) {
+void Trace::write(std::string_view event, const Keys& keys) {
     nlohmann::ordered_json object;
     object["event"] = event;
     object["queue"] = device::currentQueueLabel();
@@ -22,6 +22,10 @@ void Trace::write(std::string_view event, Keys keys) {
 void Trace::end() {
     const std::scoped_lock lock(_mutex);
     _hasEnded = true;
+}
+
+nlohmann::ordered_json jsonOf(const Error& error) {
+    return {{"domain", error.domain}, {"code", error.code}, {"description", error.description}};
 }
 
 } // namespace nimbra::host

@@ -6,6 +6,8 @@
 #include "platform/host/AlertController.h"
 #include "platform/host/SettingsListController.h"
 #include "platform/host/SetupController.h"
+#include "platform/host/ShareSheet.h"
+#include "platform/views/TableCell.h"
 
 #include <utility>
 
@@ -50,7 +52,8 @@ void TracingPresenter::presentController(const std::shared_ptr<SetupController>&
 }
 
 void TracingPresenter::dismissPresentedController(bool animated) {
-    _trace.write("dismiss", {{"what", "upgrade"}, {"animated", animated}});
+    _trace.write("dismiss",
+                 {{"what", _sheet.expired() ? "upgrade" : "share"}, {"animated", animated}});
     _presenter.dismissPresentedController(animated);
 }
 
@@ -83,6 +86,27 @@ void TracingPresenter::showAccountAlert(const std::shared_ptr<AccountAlertView>&
                   {"actions", nlohmann::ordered_json::array({actionJson(
                                   alert->content().buttonTitle, AlertActionStyle::standard)})}});
     _presenter.showAccountAlert(alert);
+}
+
+void TracingPresenter::presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool animated) {
+    auto items = nlohmann::ordered_json::array();
+    for (const FileURL& item : sheet->activityItems()) {
+        items.push_back(item.path());
+    }
+    auto activities = nlohmann::ordered_json::array();
+    for (const ActivityType& type :
+         sheet->includedActivityTypes().value_or(std::vector<ActivityType>())) {
+        activities.push_back(type.string());
+    }
+    const auto anchor = std::dynamic_pointer_cast<const TableCell>(
+        sheet->popoverPresentationController().sourceView);
+    _sheet = sheet;
+    _trace.write("present", {{"what", "share"},
+                             {"animated", animated},
+                             {"items", std::move(items)},
+                             {"activities", std::move(activities)},
+                             {"anchor", anchor ? jsonOf(anchor->label()) : nullptr}});
+    _presenter.presentShareSheet(sheet, animated);
 }
 
 } // namespace nimbra::host

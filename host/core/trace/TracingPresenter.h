@@ -22,12 +22,15 @@ public:
     void dismissController(const ViewController& controller, bool animated) override;
     void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) override;
     void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) override;
+    void presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool animated) override;
 
 private:
     Presenter& _presenter;
     Trace& _trace;
     /// What was presented last, to know it again.
     std::weak_ptr<const ViewController> _presented;
+    /// It lives as long as it is shown.
+    std::weak_ptr<const ShareSheet> _sheet;
 };
 
 } // namespace nimbra::host

@@ -260,5 +260,78 @@ TEST_F(PresentationsTest, LayOutAScreenThatAsksForIt) {
     EXPECT_EQ(takeCalls(), (Calls{"lays out 320", "lays out 320"}));
 }
 
+TEST(PresentedSheets, ASheetEndsWithWhatTheUserDid) {
+    Presentations presentations;
+    std::vector<ShareOutcome> outcomes;
+    const auto sheet = std::make_shared<ShareSheet>(std::vector{FileURL("/a")});
+    sheet->setCompletionWithItemsHandler([&](ShareOutcome outcome) {
+        // It still stands.
+        EXPECT_EQ(presentations.shareSheet(), sheet);
+        outcomes.push_back(outcome);
+        presentations.dismissLast();
+    });
+    presentations.present(sheet);
+
+    EXPECT_TRUE(presentations.endSharing(ShareOutcome::failed));
+
+    EXPECT_EQ(outcomes, std::vector{ShareOutcome::failed});
+    EXPECT_EQ(presentations.shareSheet(), nullptr);
+}
+
+TEST(PresentedSheets, WithoutASheetNothingIsShared) {
+    Presentations presentations;
+
+    const auto ended = presentations.endSharing(ShareOutcome::sent);
+
+    ASSERT_FALSE(ended);
+    EXPECT_EQ(ended.error(), "no share sheet is presented");
+}
+
+TEST(PresentedSheets, ASheetWithoutAHandlerStaysUntilItIsDismissed) {
+    Presentations presentations;
+    const auto sheet = std::make_shared<ShareSheet>(std::vector{FileURL("/a")});
+    presentations.present(sheet);
+    presentations.present(std::make_shared<ShareSheet>(std::vector{FileURL("/b")}));
+    EXPECT_EQ(presentations.shareSheet(), sheet);
+
+    EXPECT_TRUE(presentations.endSharing(ShareOutcome::sent));
+    EXPECT_EQ(presentations.shareSheet(), sheet);
+    presentations.dismissLast();
+    EXPECT_EQ(presentations.shareSheet(), nullptr);
+    // There is nothing more.
+    presentations.dismissLast();
+}
+
+TEST(PresentedSheets, AllIsTakenAway) {
+    Presentations presentations;
+    const auto sheet = std::make_shared<ShareSheet>(std::vector{FileURL("/a")});
+    presentations.present(sheet);
+
+    presentations.dismissAll();
+
+    EXPECT_EQ(presentations.shareSheet(), nullptr);
+    EXPECT_EQ(sheet.use_count(), 1);
+}
+
+TEST_F(PresentationsTest, ASheetOverAScreenGoesFirst) {
+    present();
+    _presentations.present(std::make_shared<ShareSheet>(std::vector<FileURL>()));
+
+    _presentations.dismissLast();
+    EXPECT_EQ(_presentations.shareSheet(), nullptr);
+    EXPECT_NE(_presentations.screen(), nullptr);
+    _presentations.dismissLast();
+
+    EXPECT_EQ(_presentations.screen(), nullptr);
+}
+
+TEST_F(PresentationsTest, NoScreenComesOverASheet) {
+    _presentations.present(std::make_shared<ShareSheet>(std::vector<FileURL>()));
+
+    present();
+
+    EXPECT_EQ(_presentations.screen(), nullptr);
+}
+
 } // namespace
 } // namespace nimbra::host

@@ -87,5 +87,21 @@ TEST_F(ScenarioPlayerTest, AnApplicationThatCannotBeStartedFailsTheStep) {
               (elsewhere() / "run/nimbra").string() + ": cannot be made: Not a directory");
 }
 
+TEST(ScenarioReading, AShareStepSaysHowTheUserLeavesTheSheet) {
+    const auto scenario = readScenario(R"({"steps": [{"do": "share", "outcome": "sent"},
+                                                     {"do": "share", "outcome": "cancelled"},
+                                                     {"do": "share", "outcome": "failed"}]})",
+                                       "scenario");
+    ASSERT_TRUE(scenario) << scenario.error();
+
+    std::vector<ShareOutcome> outcomes;
+    for (const ScenarioStep& step : scenario->steps) {
+        outcomes.push_back(std::get<ShareArguments>(step.arguments).outcome);
+    }
+
+    EXPECT_EQ(outcomes,
+              (std::vector{ShareOutcome::sent, ShareOutcome::cancelled, ShareOutcome::failed}));
+}
+
 } // namespace
 } // namespace nimbra::host

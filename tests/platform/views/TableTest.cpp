@@ -28,5 +28,24 @@ TEST(TableTest, ATableThatCanBePulledDownHasAControl) {
     EXPECT_EQ(table.refreshControl(), nullptr);
 }
 
+TEST(TableTest, OnlyTheHostKnowsWhichCellsAreOnTheScreen) {
+    test::TestPlatform platform;
+    Table table(platform.services(), {}, TableStyle::grouped);
+    EXPECT_EQ(table.cellForRowAtIndexPath({0, 0}), nullptr);
+    const auto cell = std::make_shared<TableCell>(platform.services(), Rect(), "A");
+
+    table.setCellSource([&](const IndexPath& path) { return path.row == 1 ? cell : nullptr; });
+
+    EXPECT_EQ(table.cellForRowAtIndexPath({0, 1}), cell);
+    EXPECT_EQ(table.cellForRowAtIndexPath({0, 2}), nullptr);
+}
+
+TEST(TableTest, ACellIsCalledAsItsRow) {
+    test::TestPlatform platform;
+
+    EXPECT_EQ(TableCell(platform.services(), {}, "A").description(), "<TableCell: A>");
+    EXPECT_EQ(TableCell(platform.services(), {}, Text()).description(), "<TableCell: (null)>");
+}
+
 } // namespace
 } // namespace nimbra
