@@ -1,7 +1,10 @@
 #include "host/cli/Dialog.h"
 
+#include "device/DevicePlatform.h"
+#include "device/documents/DeviceFileManager.h"
 #include "host/cli/Interruption.h"
 #include "host/cli/ScreenText.h"
+#include "host/cli/Sharing.h"
 #include "host/cli/TextLayout.h"
 #include "host/cli/Waiting.h"
 #include "host/core/PaneSession.h"
@@ -11,7 +14,9 @@
 
 #include <algorithm>
 #include <csignal>
+#include <cstdlib>
 #include <iostream>
+#include <string_view>
 #include <termios.h>
 #include <unicode/unistr.h>
 #include <unistd.h>
@@ -36,6 +41,22 @@ std::size_t indexOf(const host::ShownAlert& alert, AlertActionStyle style) {
 /// letters.
 icu::UnicodeString folded(const std::string& text) {
     return icu::UnicodeString::fromUTF8(text).trim().foldCase();
+}
+
+std::string trimmed(const std::string& text) {
+    std::string blankless;
+    icu::UnicodeString::fromUTF8(text).trim().toUTF8String(blankless);
+    return blankless;
+}
+
+/// A path as a person types it: "~/" is the home.
+std::filesystem::path withHome(const std::string& path) {
+    // NOLINTNEXTLINE(concurrency-mt-unsafe): nobody changes the environment
+    const char* const home = std::getenv("HOME");
+    constexpr std::string_view start = "~/";
+    return path.starts_with(start) && home != nullptr
+               ? std::filesystem::path(home) / path.substr(start.size())
+               : std::filesystem::path(path);
 }
 
 bool isYes(const std::optional<std::string>& answer, const Text& title) {
@@ -72,9 +93,11 @@ Dialog::Dialog(host::PaneSession& session, std::ostream& out, const Terminal& te
 Dialog::Outcome Dialog::lead() {
     Outcome outcome;
     _session.settle();
-    while (_presentations.alert() || _presentations.screen()) {
+    while (_presentations.alert() || _presentations.screen() || _presentations.shareSheet()) {
         if (const auto alert = _presentations.alert()) {
             outcome = answerAlert(alert);
+        } else if (_presentations.shareSheet()) {
+            outcome = goThroughSharing();
         } else if (outcome) {
             outcome = goThroughScreen();
         } else {
@@ -145,6 +168,63 @@ Dialog::Outcome Dialog::answerAlert(const std::shared_ptr<const host::ShownAlert
     _presentations.answerAlert(no);
     return refused(answer ? "cancelled; nothing has been changed"
                           : "nobody answered, so nothing has been changed (--yes answers)");
+}
+
+Dialog::Outcome Dialog::goThroughSharing() {
+    const auto sheet = _presentations.shareSheet();
+    Outcome outcome;
+    ShareOutcome ending = ShareOutcome::cancelled;
+    for (const FileURL& item : sheet->activityItems()) {
+        const auto file = _session.device().fileManager().fileSystemRepresentation(item);
+        if (!file) {
+            outcome = refused(printable(item.path()) + " has no place on this machine");
+            ending = ShareOutcome::failed;
+            continue;
+        }
+        _out << printable(*file) << '\n' << std::flush;
+        if (const auto shared = share(*file, *sheet)) {
+            ending = *shared;
+        } else {
+            outcome = refused(printable(shared.error()));
+            ending = ShareOutcome::failed;
+        }
+    }
+    // The main queue may have run while the user thought: who waits for this sheet is told of it.
+    if (_presentations.shareSheet() == sheet) {
+        static_cast<void>(_presentations.endSharing(ending));
+    }
+    if (_presentations.shareSheet() == sheet) {
+        _presentations.dismissLast();
+    }
+    return outcome;
+}
+
+std::expected<ShareOutcome, std::string> Dialog::share(const std::filesystem::path& file,
+                                                       const ShareSheet& sheet) {
+    if (!_ask) {
+        return ShareOutcome::cancelled;
+    }
+    const auto& types = sheet.includedActivityTypes();
+    const bool mayMail = !types || std::ranges::find(*types, ActivityTypeMail) != types->end();
+    const auto mail = mayMail ? findMailProgram() : std::nullopt;
+    const auto answer = _ask(std::string("  Copy it to which file or folder") +
+                             (mail ? ", or m for a mail" : "") + " (nothing leaves it there): ");
+    const std::string target = trimmed(answer.value_or(""));
+    if (target.empty() || folded(target) == u"n" || folded(target) == u"no") {
+        return ShareOutcome::cancelled;
+    }
+    if (mail && folded(target) == u"m") {
+        if (const auto handed = handToMail(*mail, file); !handed) {
+            return std::unexpected(handed.error());
+        }
+        return ShareOutcome::sent;
+    }
+    const auto copied = copyFile(file, withHome(target));
+    if (!copied) {
+        return std::unexpected(copied.error());
+    }
+    _out << "Copied to " << printable(copied->string()) << '\n' << std::flush;
+    return ShareOutcome::sent;
 }
 
 void Dialog::leaveScreen() {

@@ -2,8 +2,10 @@
 
 #include "host/cli/Failure.h"
 #include "host/cli/Terminal.h"
+#include "platform/host/ShareSheet.h"
 
 #include <expected>
+#include <filesystem>
 #include <functional>
 #include <iosfwd>
 #include <memory>
@@ -26,7 +28,8 @@ using Ask = std::function<std::optional<std::string>(const std::string& prompt)>
 [[nodiscard]] Ask askingStandardInput(std::ostream& out);
 
 /// Leads the user through what a row has opened over the page: shows the screen as text, touches
-/// its button and asks what the page asks. Main queue.
+/// its button, asks what the page asks, and says where the file is that it offers to share. Main
+/// queue.
 class Dialog {
 public:
     /// None is owned; all outlive the dialog. An empty `ask` is a yes to every question.
@@ -40,6 +43,9 @@ private:
     using Outcome = std::expected<void, Failure>;
 
     [[nodiscard]] Outcome goThroughScreen();
+    [[nodiscard]] Outcome goThroughSharing();
+    [[nodiscard]] std::expected<ShareOutcome, std::string> share(const std::filesystem::path& file,
+                                                                 const ShareSheet& sheet);
     [[nodiscard]] Outcome answerAlert(const std::shared_ptr<const host::ShownAlert>& alert);
     [[nodiscard]] bool waitForButton();
     void leaveScreen();

@@ -14,6 +14,7 @@
 
 #include <algorithm>
 #include <clocale>
+#include <csignal>
 #include <iostream>
 #include <unistd.h>
 
@@ -164,6 +165,8 @@ Outcome run(const Arguments& arguments) {
 }
 
 int runProgram(int count, char** words) {
+    // Whoever starts this program may not care how its children end, but it does.
+    static_cast<void>(std::signal(SIGCHLD, SIG_DFL));
     const auto arguments = Arguments::parse(count, words);
     if (!arguments) {
         return arguments.error();

@@ -64,7 +64,11 @@ TEST(DefaultDevice, IsMadeFromTheSampleOnFirstUse) {
               "\n"
               "  Use Cellular Data                                                          off\n"
               "    When you’re not connected to Wi-Fi, Nimbra Drive uses cellular data to\n"
-              "    transfer documents and data.\n");
+              "    transfer documents and data.\n"
+              "\n"
+              "  [Collect Diagnostics]\n"
+              "    Collects information about Nimbra Drive on this device to help find the\n"
+              "    cause of a problem. Names and addresses in the archive are replaced.\n");
     EXPECT_EQ(second.messages, "");
     EXPECT_EQ(second.output, first.output);
 }

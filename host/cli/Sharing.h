@@ -1,0 +1,26 @@
+#pragma once
+
+#include <expected>
+#include <filesystem>
+#include <optional>
+#include <string>
+
+namespace nimbra::cli {
+
+// Ways to share a file of this machine. A failure is told in one line.
+
+/// Copies `file` to `target`, or under its own name into `target` where that is a folder; the copy
+/// is for its owner's eyes only. What stands there already is never replaced, and nothing is left
+/// of a copy that fails. Gives back where the copy is, as an absolute path.
+[[nodiscard]] std::expected<std::filesystem::path, std::string>
+copyFile(const std::filesystem::path& file, const std::filesystem::path& target);
+
+/// The desktop's program that begins a mail, among the user's programs; nothing where there is
+/// none.
+[[nodiscard]] std::optional<std::filesystem::path> findMailProgram();
+
+/// Has `program` begin a mail with `file` in it, and waits until it has.
+[[nodiscard]] std::expected<void, std::string> handToMail(const std::filesystem::path& program,
+                                                          const std::filesystem::path& file);
+
+} // namespace nimbra::cli
