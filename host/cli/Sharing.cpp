@@ -97,7 +97,7 @@ bool isProgram(const std::filesystem::path& path) {
 std::expected<std::filesystem::path, std::string> copyFile(const std::filesystem::path& file,
                                                            const std::filesystem::path& target) {
     std::error_code failure;
-    const std::filesystem::path copy = std::filesystem::absolute(
+    std::filesystem::path copy = std::filesystem::absolute(
         std::filesystem::is_directory(target, failure) ? target / file.filename() : target,
         failure);
     if (failure) {
@@ -126,7 +126,7 @@ std::optional<std::filesystem::path> findMailProgram() {
     const char* const folders = std::getenv("PATH");
     std::istringstream list(folders != nullptr ? folders : "");
     for (std::string folder; std::getline(list, folder, ':');) {
-        const std::filesystem::path program = std::filesystem::path(folder) / mailProgram;
+        std::filesystem::path program = std::filesystem::path(folder) / mailProgram;
         if (!folder.empty() && isProgram(program)) {
             return program;
         }
