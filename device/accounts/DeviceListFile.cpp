@@ -2,7 +2,7 @@
 
 #include "device/DeviceError.h"
 #include "device/description/DescriptionFiles.h"
-#include "device/files/Files.h"
+#include "device/files/PlainFile.h"
 #include "platform/system/SystemLog.h"
 
 #include <cerrno>
@@ -29,7 +29,7 @@ std::expected<DeviceDescription::DeviceList, Error> DeviceListFile::content() co
     if (!path) {
         return std::unexpected(fileError(kDeviceListFile, "cannot be followed", path.error().code));
     }
-    const auto text = readFile(*path);
+    const auto text = readPlainFile(*path);
     if (!text && text.error().code == ENOENT) {
         return DeviceDescription::DeviceList();
     }

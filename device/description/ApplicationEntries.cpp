@@ -3,6 +3,7 @@
 #include "device/DeviceError.h"
 #include "device/files/ApplicationFileName.h"
 #include "device/files/Files.h"
+#include "device/files/PlainFile.h"
 
 #include <algorithm>
 #include <map>
@@ -59,7 +60,7 @@ std::string fileNameOf(const DeviceDescription::Application& application) {
 bool holds(const std::filesystem::path& path, const std::string& content) {
     std::error_code failure;
     return std::filesystem::is_regular_file(std::filesystem::symlink_status(path, failure)) &&
-           readFile(path) == content;
+           readPlainFile(path) == content;
 }
 
 std::expected<void, Error> removeOthers(const std::filesystem::path& directory,

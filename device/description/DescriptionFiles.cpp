@@ -4,6 +4,7 @@
 #include "device/description/DescriptionValues.h"
 #include "device/description/MachineFacts.h"
 #include "device/files/Files.h"
+#include "device/files/PlainFile.h"
 #include "device/json/JsonReader.h"
 
 #include <algorithm>
@@ -122,7 +123,7 @@ std::expected<DeviceDescription, Error> readDescriptionFile(const DevicePaths& p
         paths.isThisMachine() && !std::filesystem::exists(*path, failure) && !failure) {
         return describeMachine(paths.root());
     }
-    const auto text = readFile(*path);
+    const auto text = readPlainFile(*path);
     if (!text) {
         return std::unexpected(text.error());
     }

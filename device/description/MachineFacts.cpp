@@ -1,6 +1,6 @@
 #include "device/description/MachineFacts.h"
 
-#include "device/files/Files.h"
+#include "device/files/PlainFile.h"
 
 #include <algorithm>
 #include <memory>
@@ -19,7 +19,7 @@ namespace {
 /// The lines of the file at `path`; none where it cannot be read: Linux then tells nothing.
 std::vector<std::string> linesOf(const std::filesystem::path& path) {
     std::vector<std::string> lines;
-    std::istringstream text(readFile(path).value_or(std::string()));
+    std::istringstream text(readPlainFile(path).value_or(std::string()));
     for (std::string line; std::getline(text, line);) {
         lines.push_back(line);
     }

@@ -13,7 +13,8 @@
 
 namespace nimbra::device {
 
-/// Everything in the file at `path`, which may also be a pipe.
+/// Everything in the file at `path`, which may also be a pipe: for what the user names. What stands
+/// on a device is read with `readPlainFile`.
 [[nodiscard]] std::expected<std::string, Error> readFile(const std::filesystem::path& path);
 
 /// Makes `content` the whole content of the file at `path`, whose directory exists: it is written

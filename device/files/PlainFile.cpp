@@ -7,11 +7,16 @@
 #include <cerrno>
 #include <fcntl.h>
 #include <sys/stat.h>
+#include <utility>
 
 namespace nimbra::device {
 
-std::expected<PlainFile, Error> PlainFile::read(const std::string& path, std::size_t mostBytes,
-                                                const std::string& name) {
+namespace {
+
+enum class Links { refused, followed };
+
+std::expected<PlainFile, Error> readRegular(const std::string& path, std::size_t mostBytes,
+                                            const std::string& name, Links links) {
     const auto failure = [&name] {
         return std::unexpected(fileError(name, "cannot be read", errno));
     };
@@ -21,7 +26,8 @@ std::expected<PlainFile, Error> PlainFile::read(const std::string& path, std::si
     // What is written from here on is marked with this tick or a later one.
     const auto tick = fileClockNow();
     struct stat status{};
-    if (::lstat(path.c_str(), &status) != 0) {
+    if ((links == Links::refused ? ::lstat(path.c_str(), &status)
+                                 : ::stat(path.c_str(), &status)) != 0) {
         return failure();
     }
     // To open something else may already have an effect.
@@ -29,8 +35,9 @@ std::expected<PlainFile, Error> PlainFile::read(const std::string& path, std::si
         return refusal(S_ISDIR(status.st_mode) ? "is a directory" : "is not a plain file");
     }
     // Between the two calls a pipe may have taken the place.
+    const int noLink = links == Links::refused ? O_NOFOLLOW : 0;
     const Descriptor file(
-        ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
+        ::open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC | noLink));
     if (!file.isOpen() || ::fstat(file.number(), &status) != 0) {
         return failure();
     }
@@ -53,6 +60,21 @@ std::expected<PlainFile, Error> PlainFile::read(const std::string& path, std::si
             return refusal("is larger than " + std::to_string(mostBytes) + " bytes");
         }
     }
+}
+
+} // namespace
+
+std::expected<PlainFile, Error> PlainFile::read(const std::string& path, std::size_t mostBytes,
+                                                const std::string& name) {
+    return readRegular(path, mostBytes, name, Links::refused);
+}
+
+std::expected<std::string, Error> readPlainFile(const std::filesystem::path& path) {
+    auto file = readRegular(path.string(), kMostBytesOfFile, path.string(), Links::followed);
+    if (!file) {
+        return std::unexpected(std::move(file.error()));
+    }
+    return std::move(file->content);
 }
 
 } // namespace nimbra::device

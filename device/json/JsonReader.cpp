@@ -1,7 +1,7 @@
 #include "device/json/JsonReader.h"
 
 #include "device/DeviceError.h"
-#include "device/files/Files.h"
+#include "device/files/PlainFile.h"
 #include "device/json/JsonParser.h"
 
 #include <algorithm>
@@ -53,7 +53,7 @@ std::expected<JsonReader, Error> JsonReader::parse(std::string_view text, const 
 }
 
 std::expected<JsonReader, Error> JsonReader::readFile(const std::filesystem::path& path) {
-    const auto text = device::readFile(path);
+    const auto text = readPlainFile(path);
     if (!text) {
         return std::unexpected(text.error());
     }

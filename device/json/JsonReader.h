@@ -29,7 +29,7 @@ public:
     /// not JSON is an error with line and column.
     [[nodiscard]] static std::expected<JsonReader, Error> parse(std::string_view text,
                                                                 const std::string& name);
-    /// The same for the file at `path`.
+    /// The same for the regular file at `path`, as `readPlainFile` reads it.
     [[nodiscard]] static std::expected<JsonReader, Error>
     readFile(const std::filesystem::path& path);
 

@@ -47,6 +47,29 @@ bool hasPendingChanges(const std::filesystem::path& path) {
     return !absent && size > 0;
 }
 
+/// Whether all that stands at and beside `path` for the database are plain files, in the place of
+/// which a pipe, for example, would be waited for.
+std::expected<void, Error> checkFiles(const std::filesystem::path& path) {
+    std::error_code failure;
+    // The library would make others, or do without them.
+    for (const char* const suffix : {"-wal", "-shm", "-journal"}) {
+        const auto beside = withSuffix(path, suffix);
+        const auto status = std::filesystem::symlink_status(beside, failure);
+        if (std::filesystem::exists(status) && !std::filesystem::is_regular_file(status)) {
+            return std::unexpected(deviceError(beside.string() + ": is not a plain file"));
+        }
+    }
+    failure.clear();
+    const auto status = std::filesystem::status(path, failure);
+    if (std::filesystem::is_regular_file(status)) {
+        return {};
+    }
+    if (!failure && std::filesystem::exists(status) && !std::filesystem::is_directory(status)) {
+        return std::unexpected(deviceError(path.string() + ": is not a plain file"));
+    }
+    return std::unexpected(fileError(path, "cannot be read", failure ? failure.value() : EISDIR));
+}
+
 /// Opens a database in a directory in which nothing can be written, as it stands. Locks and
 /// pending changes need files beside it.
 SQLite::Database openAsItStands(const std::filesystem::path& path) {
@@ -151,10 +174,10 @@ Database::~Database() = default;
 std::expected<std::unique_ptr<Database>, Error> Database::open(const std::filesystem::path& path,
                                                                Access access,
                                                                std::chrono::milliseconds patience) {
-    std::error_code failure;
-    if (access != Access::create && !std::filesystem::is_regular_file(path, failure)) {
-        return std::unexpected(
-            fileError(path, "cannot be read", failure ? failure.value() : EISDIR));
+    if (access != Access::create) {
+        if (auto checked = checkFiles(path); !checked) {
+            return std::unexpected(std::move(checked.error()));
+        }
     }
     const int busyTimeout = static_cast<int>(patience.count());
     const bool foundPendingChanges = hasPendingChanges(path);

@@ -34,7 +34,10 @@ std::expected<void, Error> checkPreferences(const DevicePaths& paths) {
     }
     for (const std::filesystem::path& file : *files) {
         if (file.extension() == ".json") {
-            if (const auto reader = readDomain(file); !reader) {
+            const auto path =
+                paths.resolve(std::string(kPreferencesDirectory) + '/' + file.filename().string());
+            const auto reader = path ? readDomain(*path) : std::unexpected(path.error());
+            if (!reader) {
                 return std::unexpected(reader.error());
             }
         }

@@ -4,19 +4,11 @@
 #include "device/files/PlainFile.h"
 #include "platform/system/SystemLog.h"
 
-#include <cstddef>
 #include <set>
 #include <system_error>
 #include <utility>
 
 namespace nimbra::device {
-
-namespace {
-
-// A profile that forbids the cloud to every application of a device comes nowhere near it.
-constexpr std::size_t largestFile = 16'000'000;
-
-} // namespace
 
 struct DeviceRestrictions::Restrictions {
     std::set<std::string> cloudSyncDenied;
@@ -69,7 +61,7 @@ void DeviceRestrictions::read(const std::filesystem::path& path) const {
         return;
     }
     const auto stamp = stampOfPlainFile(path);
-    const auto file = PlainFile::read(path, largestFile, path.string());
+    const auto file = PlainFile::read(path, kMostBytesOfFile, path.string());
     if (!file) {
         fail(stamp, file.error().description);
         return;

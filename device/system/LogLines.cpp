@@ -27,13 +27,27 @@ std::expected<std::string, Error> endOf(const std::filesystem::path& path) {
     const auto failure = [&path](int number) {
         return std::unexpected(fileError(path, "cannot be read", number));
     };
-    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK));
     struct stat status{};
+    if (::lstat(path.c_str(), &status) != 0) {
+        return failure(errno);
+    }
+    // To open something else may already have an effect.
+    if (S_ISDIR(status.st_mode)) {
+        return failure(EISDIR);
+    }
+    const auto notPlain = [&path] {
+        return std::unexpected(deviceError(path.string() + ": is not a plain file"));
+    };
+    if (!S_ISREG(status.st_mode)) {
+        return notPlain();
+    }
+    const Descriptor file(
+        ::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
     if (!file.isOpen() || ::fstat(file.number(), &status) != 0) {
         return failure(errno);
     }
     if (!S_ISREG(status.st_mode)) {
-        return failure(S_ISDIR(status.st_mode) ? EISDIR : EINVAL);
+        return notPlain();
     }
     const off_t start = std::max<off_t>(0, status.st_size - mostBytes);
     std::string content(static_cast<std::size_t>(status.st_size - start), '\0');

@@ -2,6 +2,7 @@
 
 #include "device/DeviceDescription.h"
 #include "device/DeviceDirectory.h"
+#include "device/files/Files.h"
 #include "device/json/JsonReader.h"
 #include "host/core/BundleSearch.h"
 
@@ -31,7 +32,12 @@ std::unexpected<Failure> badInput(const Error& error) {
 
 std::expected<device::GivenDescription, Failure>
 readDescription(const std::filesystem::path& file) {
-    const auto reader = device::JsonReader::readFile(file);
+    // It may also be a pipe.
+    const auto text = device::readFile(file);
+    if (!text) {
+        return badInput(text.error());
+    }
+    const auto reader = device::JsonReader::parse(*text, file.string());
     if (!reader) {
         return badInput(reader.error());
     }

@@ -1,5 +1,7 @@
 #include "tests/device/accounts/DeviceListFixture.h"
 
+#include <sys/stat.h>
+
 namespace nimbra::test {
 namespace {
 
@@ -108,6 +110,18 @@ TEST_F(DeviceListServiceTest, ABrokenFileIsNoAnswerAndOneLine) {
                                      "needUpgrade, outcome, delay");
 }
 
+TEST_F(DeviceListServiceTest, APipeIsNotWaitedFor) {
+    std::filesystem::create_directories(path().parent_path());
+    ASSERT_EQ(::mkfifo(path().c_str(), 0644), 0);
+
+    ask();
+    pump();
+
+    ASSERT_EQ(answers.size(), 1U);
+    EXPECT_EQ(answers.front(), std::nullopt);
+    EXPECT_EQ(log.lines(), Names{"/var/lib/nimbra/device-list.json: is not a plain file"});
+}
+
 TEST_F(DeviceListServiceTest, AFileThatCannotBeReadIsNoAnswerAndOneLine) {
     std::filesystem::create_directories(path());
     ask();
@@ -121,7 +135,7 @@ TEST_F(DeviceListServiceTest, AFileThatCannotBeReadIsNoAnswerAndOneLine) {
     EXPECT_EQ(answers.front(), std::nullopt);
     EXPECT_EQ(answers.back(), std::nullopt);
     EXPECT_EQ(log.lines(),
-              (Names{"/var/lib/nimbra/device-list.json: cannot be read: Is a directory",
+              (Names{"/var/lib/nimbra/device-list.json: is a directory",
                      "/var/lib/nimbra/device-list.json: cannot be followed: Too many levels of "
                      "symbolic links"}));
 }

@@ -55,5 +55,44 @@ TEST_F(PlainFileTest, WhatIsNoPlainFileIsAnErrorAndNothingWaitsForIt) {
     EXPECT_EQ(errorOf(5), "/the/file: is not a plain file");
 }
 
+TEST_F(PlainFileTest, WithoutAVersionLinksAreFollowed) {
+    test::writeTestFile(directory.path() / "target", "text");
+    std::filesystem::create_symlink("target", path);
+
+    EXPECT_EQ(readPlainFile(path), "text");
+    EXPECT_EQ(readPlainFile(directory.path() / "target"), "text");
+}
+
+TEST_F(PlainFileTest, WithoutAVersionNothingElseIsReadOrWaitedFor) {
+    const auto expectError = [this](const std::string& message) {
+        const auto text = readPlainFile(path);
+        ASSERT_FALSE(text);
+        EXPECT_EQ(text.error().description, path.string() + ": " + message);
+    };
+    expectError("cannot be read: No such file or directory");
+
+    const auto pipe = directory.path() / "pipe";
+    ASSERT_EQ(::mkfifo(pipe.c_str(), 0644), 0);
+    for (const std::filesystem::path& target : {pipe, std::filesystem::path("/dev/zero")}) {
+        std::filesystem::create_symlink(target, path);
+        expectError("is not a plain file");
+        std::filesystem::remove(path);
+    }
+
+    std::filesystem::create_directory(path);
+    expectError("is a directory");
+}
+
+TEST_F(PlainFileTest, WithoutAVersionAFileThatIsTooLargeIsAnErrorToo) {
+    test::writeTestFile(path, "");
+    std::filesystem::resize_file(path, kMostBytesOfFile);
+    EXPECT_TRUE(readPlainFile(path));
+
+    std::filesystem::resize_file(path, kMostBytesOfFile + 1);
+    const auto text = readPlainFile(path);
+    ASSERT_FALSE(text);
+    EXPECT_EQ(text.error().description, path.string() + ": is larger than 16000000 bytes");
+}
+
 } // namespace
 } // namespace nimbra::device

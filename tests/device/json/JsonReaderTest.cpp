@@ -180,8 +180,7 @@ TEST(JsonReaderTest, AFileThatCannotBeReadIsNamed) {
     EXPECT_EQ(missing.error().description, (directory.path() / "missing.json").string() +
                                                ": cannot be read: No such file or directory");
     ASSERT_FALSE(folder);
-    EXPECT_EQ(folder.error().description,
-              directory.path().string() + ": cannot be read: Is a directory");
+    EXPECT_EQ(folder.error().description, directory.path().string() + ": is a directory");
 }
 
 TEST(JsonReaderTest, AFileIsReadUnderItsName) {

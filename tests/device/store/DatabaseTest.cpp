@@ -5,6 +5,7 @@
 
 #include <gtest/gtest.h>
 #include <string>
+#include <sys/stat.h>
 #include <vector>
 
 namespace nimbra::device {
@@ -94,6 +95,36 @@ TEST_F(DatabaseTest, AMissingFileIsNotMade) {
     EXPECT_EQ(opened.error().description,
               missing.string() + ": cannot be read: No such file or directory");
     EXPECT_FALSE(std::filesystem::exists(missing));
+}
+
+TEST_F(DatabaseTest, APipeInItsPlaceOrBesideItIsNotWaitedFor) {
+    const auto other = path().parent_path() / "other.db";
+    for (const auto access : {Database::Access::existing, Database::Access::reading}) {
+        for (const std::string suffix : {"", "-journal", "-wal", "-shm"}) {
+            std::filesystem::copy_file(path(), other);
+            const auto pipe = std::filesystem::path(other.string() + suffix);
+            std::filesystem::remove(pipe);
+            ASSERT_EQ(::mkfifo(pipe.c_str(), 0644), 0);
+
+            const auto opened = Database::open(other, access);
+
+            ASSERT_FALSE(opened) << suffix;
+            EXPECT_EQ(opened.error().description, pipe.string() + ": is not a plain file");
+            std::filesystem::remove(pipe);
+            std::filesystem::remove(other);
+        }
+    }
+}
+
+TEST_F(DatabaseTest, WhatALinkBesideItLeadsToIsNotRead) {
+    const auto other = path().parent_path() / "other.db";
+    std::filesystem::copy_file(path(), other);
+    std::filesystem::create_symlink(path(), other.string() + "-wal");
+
+    const auto opened = Database::open(other, Database::Access::reading);
+
+    ASSERT_FALSE(opened);
+    EXPECT_EQ(opened.error().description, other.string() + "-wal: is not a plain file");
 }
 
 TEST_F(DatabaseTest, AFileThatCannotBeMadeIsAnError) {

@@ -5,6 +5,7 @@
 #include "tests/support/TemporaryDirectory.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 namespace nimbra::device {
 namespace {
@@ -56,6 +57,27 @@ TEST_F(DevicePreferencesTest, AFileThatCannotBeReadMeansNothingAndOneLine) {
     EXPECT_EQ(log().lines(),
               std::vector<std::string>{(directory() / "domain.json").string() +
                                        ": /: expected an object of keys and values, found [1]"});
+}
+
+TEST_F(DevicePreferencesTest, APipeIsNotWaitedFor) {
+    std::filesystem::create_directories(directory());
+    ASSERT_EQ(::mkfifo((directory() / "domain.json").c_str(), 0644), 0);
+    const std::string message = (directory() / "domain.json").string() + ": is not a plain file";
+
+    EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("key", "domain"), std::nullopt);
+    const auto checked = checkPreferences(paths());
+
+    EXPECT_EQ(log().lines(), std::vector<std::string>{message});
+    ASSERT_FALSE(checked);
+    EXPECT_EQ(checked.error().description, message);
+}
+
+TEST_F(DevicePreferencesTest, ACheckFollowsALinkAsTheDeviceWould) {
+    test::writeTestFile(paths().root() / "etc/domain.json", "{}");
+    std::filesystem::create_directories(directory());
+    std::filesystem::create_symlink("/etc/domain.json", directory() / "domain.json");
+
+    EXPECT_TRUE(checkPreferences(paths()));
 }
 
 TEST_F(DevicePreferencesTest, ACheckNamesTheFileThatCannotBeRead) {
