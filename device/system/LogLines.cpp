@@ -22,7 +22,8 @@ namespace {
 // Eight times what the log grows to before another file begins.
 constexpr off_t mostBytes = off_t{8} * 1024 * 1024;
 
-/// The end of the regular file at `path`, from a line's beginning on.
+/// The end of the regular file at `path`, from a line's beginning on. Where that is not all, a line
+/// before it says so.
 std::expected<std::string, Error> endOf(const std::filesystem::path& path) {
     const auto failure = [&path](int number) {
         return std::unexpected(fileError(path, "cannot be read", number));
@@ -65,8 +66,14 @@ std::expected<std::string, Error> endOf(const std::filesystem::path& path) {
         size += static_cast<std::size_t>(std::max<ssize_t>(count, 0));
     }
     content.resize(size);
+    if (start == 0) {
+        return content;
+    }
     // A line without its beginning could hold half a word of what is looked for in it.
-    return start == 0 ? std::move(content) : content.substr(content.find('\n') + 1);
+    const std::size_t end = content.find('\n');
+    content.erase(0, end == std::string::npos ? end : end + 1);
+    const off_t leftOut = status.st_size - static_cast<off_t>(content.size());
+    return "(" + std::to_string(leftOut) + " bytes are left out here)\n" + content;
 }
 
 std::vector<std::string> linesOf(std::string_view content) {
@@ -93,7 +100,10 @@ std::expected<std::vector<std::string>, Error> newestLogLines(const DevicePaths&
     files[2].replace_extension(".2.log");
     std::vector<std::string> lines;
     for (const std::filesystem::path& file : files) {
-        auto content = endOf(file);
+        // Each may be a link of its own, and none leads out of the device.
+        const auto place = paths.resolve(
+            (std::filesystem::path("/") / file.lexically_relative(paths.root())).string());
+        auto content = place ? endOf(*place) : std::unexpected(place.error());
         if (!content && content.error().code == ENOENT && file != files.front()) {
             break;
         }

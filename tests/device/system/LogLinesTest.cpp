@@ -6,6 +6,7 @@
 
 #include <cerrno>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 namespace nimbra::device {
 namespace {
@@ -58,11 +59,71 @@ TEST_F(LogLinesTest, OfALargeFileWholeLinesAreRead) {
     const Lines lines = newest(1'000'000);
 
     std::string end;
-    for (const std::string& line : lines) {
+    for (const std::string& line : Lines(lines.begin() + 1, lines.end())) {
         end += line + '\n';
     }
     EXPECT_GT(end.size(), 8'000'000U);
     EXPECT_TRUE(content.ends_with('\n' + end));
+    EXPECT_EQ(lines.front(),
+              "(" + std::to_string(content.size() - end.size()) + " bytes are left out here)");
+}
+
+TEST_F(LogLinesTest, AHoleBetweenTwoFilesIsTold) {
+    write("settings.1.log", "earlier\n");
+    write("settings.log", std::string(9'000'000, 'x') + "\nlast\n");
+
+    EXPECT_EQ(newest(100), (Lines{"earlier", "(9000001 bytes are left out here)", "last"}));
+    EXPECT_EQ(newest(1), Lines{"last"});
+}
+
+TEST_F(LogLinesTest, ALineThatIsTooLongIsLeftOutAndTold) {
+    for (const std::string end : {"", "\n"}) {
+        write("settings.log", std::string(9'000'000, 'x') + end);
+
+        EXPECT_EQ(newest(100), Lines{"(" + std::to_string(9'000'000 + end.size()) +
+                                     " bytes are left out here)"});
+    }
+}
+
+TEST_F(LogLinesTest, NoFileIsALinkOutOfTheDevice) {
+    const test::TemporaryDirectory outside;
+    test::writeTestFile(outside.path() / "secret", "secret\n");
+    const auto secret = outside.path() / "secret";
+    for (const auto& target :
+         {secret, secret.lexically_relative(paths().root() / "var/log/nimbra")}) {
+        for (const std::string name : {"settings.1.log", "settings.2.log"}) {
+            write("settings.1.log", "earlier\n");
+            write("settings.log", "last\n");
+            const auto link = paths().root() / "var/log/nimbra" / name;
+            std::filesystem::remove(link);
+            std::filesystem::create_symlink(target, link);
+
+            EXPECT_EQ(newest(100),
+                      name == "settings.1.log" ? Lines{"last"} : (Lines{"earlier", "last"}));
+            std::filesystem::remove(link);
+        }
+    }
+}
+
+TEST_F(LogLinesTest, ALinkIsFollowedAsTheDeviceWould) {
+    test::writeTestFile(paths().root() / "var/old/1", "earlier\n");
+    write("settings.log", "last\n");
+    std::filesystem::create_symlink("/var/old/1", paths().root() / "var/log/nimbra/settings.1.log");
+
+    EXPECT_EQ(newest(100), (Lines{"earlier", "last"}));
+}
+
+TEST_F(LogLinesTest, APipeIsNotWaitedFor) {
+    for (const std::string name : {"settings.log", "settings.1.log"}) {
+        write("settings.log", "last\n");
+        const auto pipe = paths().root() / "var/log/nimbra" / name;
+        std::filesystem::remove(pipe);
+        ASSERT_EQ(::mkfifo(pipe.c_str(), 0644), 0);
+
+        EXPECT_EQ(newestLogLines(paths(), 100).error().description,
+                  pipe.string() + ": is not a plain file");
+        std::filesystem::remove(pipe);
+    }
 }
 
 TEST_F(LogLinesTest, BytesThatAreNoTextStayInTheirLine) {
