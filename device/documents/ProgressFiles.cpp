@@ -21,12 +21,20 @@ std::expected<std::vector<ProgressFileContent>, Error> readProgressFiles(const D
     if (!files) {
         return std::unexpected(files.error());
     }
+    return readListedProgressFiles(*files);
+}
+
+std::vector<ProgressFileContent>
+readListedProgressFiles(const std::vector<std::filesystem::path>& files) {
     std::vector<ProgressFileContent> contents;
-    for (const std::filesystem::path& path : *files) {
+    for (const std::filesystem::path& path : files) {
         if (!isProgressFileName(path.filename().string())) {
             continue;
         }
         const auto file = PlainFile::read(path, kMostBytesOfProgressFile, path);
+        if (!file && file.error().code == ENOENT) {
+            continue;
+        }
         contents.push_back({.name = path.stem(),
                             .values = file ? parseProgressFile(file->content, path)
                                            : std::unexpected(file.error())});

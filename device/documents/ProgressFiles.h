@@ -5,6 +5,7 @@
 #include "platform/values/Error.h"
 
 #include <expected>
+#include <filesystem>
 #include <string>
 #include <vector>
 
@@ -21,5 +22,10 @@ struct ProgressFileContent {
 /// Any thread.
 [[nodiscard]] std::expected<std::vector<ProgressFileContent>, Error>
 readProgressFiles(const DevicePaths& paths);
+
+/// Those of `files`, a list of the folder, that tell of a progress and are still there: a sync that
+/// ends takes its file away. Any thread.
+[[nodiscard]] std::vector<ProgressFileContent>
+readListedProgressFiles(const std::vector<std::filesystem::path>& files);
 
 } // namespace nimbra::device

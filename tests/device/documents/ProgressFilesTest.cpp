@@ -48,6 +48,19 @@ TEST_F(ProgressFilesTest, AFolderThatIsMissingHasNoneAndIsNotMade) {
     EXPECT_TRUE(std::filesystem::is_empty(root()));
 }
 
+TEST_F(ProgressFilesTest, AFileThatGoesBeforeItIsReadIsNone) {
+    write("a.json", "{}");
+    write("c.json", "{}");
+    const auto folder = root() / "run/nimbra/progress";
+
+    const auto files =
+        readListedProgressFiles({folder / "a.json", folder / "b.json", folder / "c.json"});
+
+    ASSERT_EQ(files.size(), 2U);
+    EXPECT_EQ(files.front().name, "a");
+    EXPECT_EQ(files.back().name, "c");
+}
+
 TEST_F(ProgressFilesTest, AFolderThatCannotBeReadIsAnError) {
     test::writeTestFile(root() / "run/nimbra/progress", "no folder");
 
