@@ -9,7 +9,6 @@
 #include <ctime>
 #include <memory>
 #include <optional>
-#include <system_error>
 #include <utility>
 
 namespace nimbra::mrctl {
@@ -22,11 +21,6 @@ struct ArchiveFree {
 struct EntryFree {
     void operator()(archive_entry* entry) const { ::archive_entry_free(entry); }
 };
-
-bool isDirectory(const std::filesystem::path& path) {
-    std::error_code failure;
-    return std::filesystem::is_directory(path, failure);
-}
 
 /// An archive while it is written to an open file.
 class Writing {
@@ -84,7 +78,7 @@ private:
 std::expected<void, Error> ArchiveFile::write(const std::filesystem::path& path,
                                               const Report& report) {
     const std::string name = path.filename();
-    if (name.empty() || name == "." || name == ".." || isDirectory(path)) {
+    if (name.empty() || name == "." || name == "..") {
         return std::unexpected(device::fileError(path, "cannot be written", EISDIR));
     }
     auto file = TemporaryFile::make(path, temporaryPrefix);

@@ -115,13 +115,11 @@ private:
         if (!files) {
             return;
         }
-        // Everything that settings are in comes nowhere near it.
-        constexpr std::size_t largestFile = 16'000'000;
         for (const std::filesystem::path& path : *files) {
             if (path.extension() != ".json") {
                 continue;
             }
-            const auto file = device::PlainFile::read(path, largestFile, path);
+            const auto file = device::PlainFile::read(path, device::kMostBytesOfFile, path);
             auto values = part("preferences", file ? device::parseJson(file->content, path)
                                                    : std::unexpected(file.error()));
             if (values) {

@@ -4,11 +4,12 @@
 #include "device/files/Files.h"
 
 #include <cerrno>
-#include <cstdint>
+#include <cstddef>
 #include <cstdio>
 #include <fcntl.h>
 #include <memory>
 #include <random>
+#include <string_view>
 #include <sys/file.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -21,11 +22,45 @@ namespace {
 using device::Descriptor;
 
 constexpr mode_t onlyForOwner = 0600;
-constexpr mode_t readableByEverybody = 0644;
+constexpr mode_t everyNewFile = 0666;
+
+constexpr std::string_view digits = "0123456789abcdef";
+constexpr std::size_t digitsOfName = 16;
 
 std::string randomName(const std::string& prefix) {
     std::random_device random;
-    return prefix + std::to_string((std::uint64_t{random()} << 32U) | random());
+    std::string name = prefix;
+    for (std::size_t count = 0; count < digitsOfName; ++count) {
+        name += digits[random() % digits.size()];
+    }
+    return name;
+}
+
+/// Whether `name` is one that `randomName` makes: the user's own files may begin like these.
+bool isRandomName(std::string_view name, std::string_view prefix) {
+    return name.size() == prefix.size() + digitsOfName && name.starts_with(prefix) &&
+           name.find_first_not_of(digits, prefix.size()) == std::string_view::npos;
+}
+
+/// What the process takes away from the permissions of each new file.
+mode_t permissionsTakenAway() {
+    const mode_t mask = ::umask(everyNewFile & ~onlyForOwner);
+    ::umask(mask);
+    return mask;
+}
+
+/// An archive takes the place of a plain file or of nothing: to replace a link, a pipe or a device
+/// is never what somebody wants who gives its name.
+std::expected<void, Error> checkPlace(const std::filesystem::path& target) {
+    struct stat status{};
+    if (::lstat(target.c_str(), &status) != 0 || S_ISREG(status.st_mode)) {
+        return {};
+    }
+    if (S_ISDIR(status.st_mode)) {
+        return std::unexpected(device::fileError(target, "cannot be written", EISDIR));
+    }
+    return std::unexpected(
+        device::deviceError(target.string() + ": cannot be written: is not a plain file"));
 }
 
 /// Whether the file at `descriptor` has still a name.
@@ -38,6 +73,9 @@ bool hasName(int descriptor) {
 
 std::expected<TemporaryFile, Error> TemporaryFile::make(const std::filesystem::path& target,
                                                         const std::string& prefix) {
+    if (auto checked = checkPlace(target); !checked) {
+        return std::unexpected(std::move(checked.error()));
+    }
     const auto parent = target.parent_path();
     Descriptor directory(
         ::open(parent.empty() ? "." : parent.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
@@ -96,7 +134,7 @@ void TemporaryFile::removeLeftovers(const std::string& prefix) const {
     }
     for (const std::filesystem::path& entry : *entries) {
         const std::string name = entry.filename();
-        if (!name.starts_with(prefix)) {
+        if (!isRandomName(name, prefix)) {
             continue;
         }
         const Descriptor file(::openat(_directory.number(), name.c_str(),
@@ -113,7 +151,11 @@ std::expected<void, Error> TemporaryFile::putInPlace() {
     const auto failure = [this] {
         return std::unexpected(device::fileError(_target, "cannot be written", errno));
     };
-    if (::fchmod(_file.number(), readableByEverybody) != 0 || ::fsync(_file.number()) != 0 ||
+    if (auto checked = checkPlace(_target); !checked) {
+        return checked;
+    }
+    if (::fchmod(_file.number(), everyNewFile & ~permissionsTakenAway()) != 0 ||
+        ::fsync(_file.number()) != 0 ||
         ::renameat(_directory.number(), _name.c_str(), _directory.number(),
                    _target.filename().c_str()) != 0) {
         return failure();

@@ -1,5 +1,6 @@
 #include "tests/device/TestFiles.h"
 #include "tests/tools/mrctl/Diagnosis.h"
+#include "tools/mrctl/TemporaryFile.h"
 
 #include <algorithm>
 #include <array>
@@ -18,6 +19,9 @@ namespace nimbra::test {
 namespace {
 
 using Names = std::vector<std::string>;
+
+/// Called like what a run that was killed leaves.
+constexpr auto leftover = ".mrctl-0123456789abcdef";
 
 // Runs a command whose files can grow to so many kilobytes. What it says goes through a pipe: a
 // file could not grow. The signal of a file that may not is ignored by the program itself; what a
@@ -58,13 +62,19 @@ private:
     Diagnosis _diagnosis;
 };
 
-TEST_F(ArchiveWritingTest, TheArchiveIsForEverybodyToRead) {
-    ASSERT_EQ(diagnose().status, 0);
+TEST_F(ArchiveWritingTest, TheArchiveHasThePermissionsOfANewFile) {
+    for (const auto& [mask, permissions] :
+         std::vector<std::pair<mode_t, mode_t>>{{022, 0644}, {077, 0600}, {0, 0666}, {027, 0640}}) {
+        const mode_t earlier = ::umask(mask);
+        const ProgramResult result = diagnose();
+        ::umask(earlier);
 
-    struct stat status{};
-    ASSERT_EQ(::stat(diagnosis().archive().c_str(), &status), 0);
-    EXPECT_EQ(status.st_mode & 07777U, 0644U);
-    EXPECT_EQ(diagnosis().namesInPlace(), Names{"fault.tar.gz"});
+        ASSERT_EQ(result.status, 0);
+        struct stat status{};
+        ASSERT_EQ(::stat(diagnosis().archive().c_str(), &status), 0);
+        EXPECT_EQ(status.st_mode & 07777U, permissions);
+        EXPECT_EQ(diagnosis().namesInPlace(), Names{"fault.tar.gz"});
+    }
 }
 
 TEST_F(ArchiveWritingTest, AnEarlierArchiveIsReplaced) {
@@ -143,31 +153,85 @@ TEST_F(ArchiveWritingTest, APathThatIsADirectoryIsAFailure) {
     EXPECT_EQ(diagnosis().namesInPlace(), Names{"fault.tar.gz"});
 }
 
+TEST_F(ArchiveWritingTest, APathThatIsNoPlainFileIsAFailureAndStays) {
+    const auto target = diagnosis().root() / "target";
+    writeTestFile(target, "kept");
+    const auto expectRefusal = [this] {
+        const auto before = std::filesystem::symlink_status(diagnosis().archive()).type();
+        expectFailure(diagnose(), "is not a plain file", {"fault.tar.gz"});
+        EXPECT_EQ(std::filesystem::symlink_status(diagnosis().archive()).type(), before);
+        std::filesystem::remove(diagnosis().archive());
+    };
+
+    ASSERT_EQ(::mkfifo(diagnosis().archive().c_str(), 0644), 0);
+    expectRefusal();
+    for (const auto& linked : {target, diagnosis().root(), std::filesystem::path("/dev/null"),
+                               std::filesystem::path("missing")}) {
+        std::filesystem::create_symlink(linked, diagnosis().archive());
+        expectRefusal();
+    }
+    EXPECT_EQ(contentOf(target), "kept");
+}
+
+TEST_F(ArchiveWritingTest, WhatTakesThePlaceMeanwhileStays) {
+    auto file = mrctl::TemporaryFile::make(diagnosis().archive(), ".mrctl-");
+    ASSERT_TRUE(file) << file.error();
+    std::filesystem::create_symlink("elsewhere", diagnosis().archive());
+
+    const auto put = file->putInPlace();
+
+    ASSERT_FALSE(put);
+    EXPECT_TRUE(put.error().description.ends_with("is not a plain file")) << put.error();
+    EXPECT_TRUE(std::filesystem::is_symlink(diagnosis().archive()));
+}
+
+TEST_F(ArchiveWritingTest, NobodyElseReadsTheArchiveWhileItIsWritten) {
+    const mode_t earlier = ::umask(0);
+    const auto file = mrctl::TemporaryFile::make(diagnosis().archive(), ".mrctl-");
+    ::umask(earlier);
+    ASSERT_TRUE(file) << file.error();
+
+    struct stat status{};
+    ASSERT_EQ(::fstat(file->descriptor(), &status), 0);
+    EXPECT_EQ(status.st_mode & 07777U, 0600U);
+}
+
 TEST_F(ArchiveWritingTest, LeftoversGoWithTheNextRun) {
-    writeTestFile(diagnosis().place() / ".mrctl-123", "half an archive");
-    writeTestFile(diagnosis().place() / ".other", "not its own");
+    writeTestFile(diagnosis().place() / leftover, "half an archive");
+    const Names others{".mrctl-",
+                       ".mrctl-0123456789abcde",
+                       ".mrctl-0123456789abcdeF",
+                       ".mrctl-0123456789abcdef0",
+                       ".mrctl-123",
+                       ".mrctl-notes.txt",
+                       ".other"};
+    for (const std::string& name : others) {
+        writeTestFile(diagnosis().place() / name, "not its own");
+    }
 
     ASSERT_EQ(diagnose().status, 0);
 
-    EXPECT_EQ(diagnosis().namesInPlace(), (Names{".other", "fault.tar.gz"}));
+    Names left = others;
+    left.emplace_back("fault.tar.gz");
+    EXPECT_EQ(diagnosis().namesInPlace(), left);
 }
 
 TEST_F(ArchiveWritingTest, WhatAnotherRunIsWritingStays) {
-    const auto other = diagnosis().place() / ".mrctl-123";
+    const auto other = diagnosis().place() / leftover;
     writeTestFile(other, "half an archive");
     const int file = ::open(other.c_str(), O_RDONLY | O_CLOEXEC);
     ASSERT_EQ(::flock(file, LOCK_EX), 0);
 
     ASSERT_EQ(diagnose().status, 0);
 
-    EXPECT_EQ(diagnosis().namesInPlace(), (Names{".mrctl-123", "fault.tar.gz"}));
+    EXPECT_EQ(diagnosis().namesInPlace(), (Names{leftover, "fault.tar.gz"}));
     ::close(file);
 }
 
 TEST_F(ArchiveWritingTest, LinksCalledLikeALeftoverAreNotFollowed) {
     const auto target = diagnosis().root() / "kept";
     writeTestFile(target, "kept");
-    std::filesystem::create_symlink(target, diagnosis().place() / ".mrctl-1");
+    std::filesystem::create_symlink(target, diagnosis().place() / leftover);
 
     ASSERT_EQ(diagnose().status, 0);
 
