@@ -4,6 +4,7 @@
 
 #include <CLI/CLI.hpp>
 #include <iostream>
+#include <sstream>
 
 namespace nimbra::mrctl {
 
@@ -29,6 +30,17 @@ void addStatus(CLI::App& app, Arguments& arguments) {
     command->add_flag("--json", arguments.asJson, "Print an object, for a program");
 }
 
+/// Prints the help or the version that `wish` asks for; the exit status.
+int printed(const CLI::App& app, const CLI::ParseError& wish) {
+    std::ostringstream text;
+    const int status = app.exit(wish, text, text);
+    if (!(std::cout << text.str()).flush()) {
+        std::cerr << "mrctl: the output cannot be written\n";
+        return exitFailed;
+    }
+    return status;
+}
+
 } // namespace
 
 std::expected<Arguments, int> Arguments::parse(int count, char** words) {
@@ -49,7 +61,7 @@ std::expected<Arguments, int> Arguments::parse(int count, char** words) {
         app.parse(count, words);
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
-            return std::unexpected(app.exit(error));
+            return std::unexpected(printed(app, error));
         }
         std::cerr << "mrctl: " + device::oneLine(error.what()) + " (see mrctl --help)\n";
         return std::unexpected(exitBadArguments);

@@ -1,5 +1,6 @@
 #include "tools/mrctl/DeviceContents.h"
 
+#include "device/DeviceError.h"
 #include "device/apps/ApplicationFolders.h"
 #include "device/apps/InstalledApplications.h"
 #include "device/apps/RecordedProcesses.h"
@@ -13,6 +14,7 @@
 #include "device/system/LogLines.h"
 #include "platform/system/SystemLog.h"
 
+#include <algorithm>
 #include <cerrno>
 #include <expected>
 #include <filesystem>
@@ -124,9 +126,22 @@ private:
                                                    : std::unexpected(file.error()));
             if (values) {
                 _contents.preferences.push_back(
-                    {.domain = path.stem(), .values = std::move(*values)});
+                    {.domain = unusedDomain(path.stem()), .values = std::move(*values)});
             }
         }
+    }
+
+    /// A file's name in one line, with a number where another is the same then.
+    [[nodiscard]] std::string unusedDomain(const std::string& fileName) const {
+        const std::string domain = device::oneLine(fileName);
+        std::string name = domain;
+        for (int number = 2;
+             std::ranges::find(_contents.preferences, name, &DeviceContents::Preferences::domain) !=
+             _contents.preferences.end();
+             ++number) {
+            name = domain + '-' + std::to_string(number);
+        }
+        return name;
     }
 
     void readApplications() {

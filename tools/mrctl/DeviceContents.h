@@ -17,6 +17,7 @@ namespace nimbra::mrctl {
 /// and a problem; everything else is read all the same.
 struct DeviceContents {
     struct Preferences {
+        /// In one line, and another one for each.
         std::string domain;
         nlohmann::ordered_json values;
     };

@@ -99,5 +99,32 @@ TEST(OddFilesOfADeviceTest, AFileThatIsTooLargeIsNamed) {
     EXPECT_EQ(diagnosis.run({"status"}).status, 1);
 }
 
+TEST(OddFilesOfADeviceTest, TheManifestHasOneLineForEachFileWhateverItsName) {
+    const Diagnosis diagnosis;
+    diagnosis.make({});
+    const std::string folder = "/var/lib/nimbra/preferences/";
+    for (const char* const name : {"com.odd\n  false.json  7", "com.odd   false.json  7",
+                                   "com.odd\t\t\tfalse.json  7", "com.odd\xff", "com.odd\xfe"}) {
+        diagnosis.write(folder + name + ".json", "{}");
+    }
+
+    const auto files = diagnosis.files();
+
+    std::vector<std::string> names;
+    for (const auto& [name, content] : files) {
+        if (name.starts_with("preferences/com.odd")) {
+            names.push_back(name);
+            EXPECT_NE(files.at("MANIFEST").find("\n  " + name + "  3  preferences "),
+                      std::string::npos)
+                << files.at("MANIFEST");
+        }
+    }
+    EXPECT_EQ(names.size(), 5U);
+    EXPECT_EQ(names.front(), "preferences/com.odd   false.json  7-2.json");
+    const std::string& manifest = files.at("MANIFEST");
+    const std::string list = manifest.substr(0, manifest.find("\n\n"));
+    EXPECT_EQ(static_cast<std::size_t>(std::ranges::count(list, '\n')), files.size() - 1);
+}
+
 } // namespace
 } // namespace nimbra::test
