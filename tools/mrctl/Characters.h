@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <string>
 #include <string_view>
 
@@ -27,6 +28,23 @@ namespace nimbra::mrctl {
 }
 [[nodiscard]] constexpr bool isQuote(char character) {
     return character == '"' || character == '\'' || character == '`';
+}
+
+[[nodiscard]] constexpr bool isLetter(char character) {
+    return isLower(character) || isUpper(character);
+}
+[[nodiscard]] constexpr bool isHexadecimal(char character) {
+    return isDigit(character) || (character >= 'a' && character <= 'f') ||
+           (character >= 'A' && character <= 'F');
+}
+
+/// The end of the part of `text` from `begin` on that consists of `isPart`.
+template <class IsPart>
+[[nodiscard]] std::size_t endOfRun(std::string_view text, std::size_t begin, IsPart isPart) {
+    while (begin < text.size() && isPart(text[begin])) {
+        ++begin;
+    }
+    return begin;
 }
 
 [[nodiscard]] inline std::string lowerCase(std::string_view text) {

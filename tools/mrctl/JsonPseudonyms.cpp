@@ -1,8 +1,10 @@
 #include "tools/mrctl/JsonPseudonyms.h"
 
+#include "tools/mrctl/Characters.h"
 #include "tools/mrctl/Pseudonyms.h"
-#include "tools/mrctl/SecretPatterns.h"
+#include "tools/mrctl/SecretNames.h"
 
+#include <algorithm>
 #include <nlohmann/json.hpp>
 #include <optional>
 #include <string>
@@ -21,14 +23,38 @@ std::optional<std::string> textOf(const Json& value) {
     return value.is_number() ? std::optional(value.dump()) : std::nullopt;
 }
 
+bool isOfSentence(char character) {
+    return isBlank(character) || isBeyondAscii(character);
+}
+
+/// What stands for a value that is neither an array nor an object.
+Json replacedScalar(const Json& value, std::optional<SecretKind> kind, bool hidesSentences,
+                    Pseudonyms& pseudonyms) {
+    const auto text = textOf(value);
+    if (!text) {
+        return value;
+    }
+    if (kind) {
+        return pseudonyms.of(*kind, *text);
+    }
+    const bool isSentence = hidesSentences && std::ranges::any_of(*text, isOfSentence);
+    // A number may be one that an account is called by.
+    if (isSentence || pseudonyms.isKnown(*text)) {
+        return pseudonyms.of(SecretKind::text, *text);
+    }
+    std::string readable = pseudonyms.replaced(*text);
+    return value.is_string() || readable != *text ? Json(std::move(readable)) : value;
+}
+
 // Values are nested no deeper than the reader of files allows.
 // NOLINTBEGIN(misc-no-recursion)
 
-Json replaced(const Json& value, std::optional<SecretKind> kind, Pseudonyms& pseudonyms) {
+Json replaced(const Json& value, std::optional<SecretKind> kind, bool hidesSentences,
+              Pseudonyms& pseudonyms) {
     if (value.is_array()) {
         Json result = Json::array();
         for (const Json& element : value) {
-            result.push_back(replaced(element, kind, pseudonyms));
+            result.push_back(replaced(element, kind, hidesSentences, pseudonyms));
         }
         return result;
     }
@@ -40,15 +66,14 @@ Json replaced(const Json& value, std::optional<SecretKind> kind, Pseudonyms& pse
             while (result.contains(name)) {
                 name += '\'';
             }
-            result[name] = replaced(member, kind ? kind : kindOfValueNamed(key), pseudonyms);
+            // The code of an error is none that lets anybody in.
+            const bool isErrorCode = hidesSentences && key == "code" && member.is_number();
+            const auto named = isErrorCode ? std::nullopt : kindOfValueNamed(key);
+            result[name] = replaced(member, kind ? kind : named, hidesSentences, pseudonyms);
         }
         return result;
     }
-    const auto text = textOf(value);
-    if (text && kind) {
-        return pseudonyms.of(*kind, *text);
-    }
-    return value.is_string() ? Json(pseudonyms.replaced(*text)) : value;
+    return replacedScalar(value, kind, hidesSentences, pseudonyms);
 }
 
 // NOLINTEND(misc-no-recursion)
@@ -56,7 +81,11 @@ Json replaced(const Json& value, std::optional<SecretKind> kind, Pseudonyms& pse
 } // namespace
 
 Json replacedInJson(const Json& value, Pseudonyms& pseudonyms) {
-    return replaced(value, std::nullopt, pseudonyms);
+    return replaced(value, std::nullopt, false, pseudonyms);
+}
+
+Json withoutSentences(const Json& value, Pseudonyms& pseudonyms) {
+    return replaced(value, std::nullopt, true, pseudonyms);
 }
 
 } // namespace nimbra::mrctl

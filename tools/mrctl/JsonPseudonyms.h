@@ -11,4 +11,9 @@ class Pseudonyms;
 [[nodiscard]] nlohmann::ordered_json replacedInJson(const nlohmann::ordered_json& value,
                                                     Pseudonyms& pseudonyms);
 
+/// The same, with a pseudonym for each text that is a sentence: whatever has a blank or is not
+/// ASCII.
+[[nodiscard]] nlohmann::ordered_json withoutSentences(const nlohmann::ordered_json& value,
+                                                      Pseudonyms& pseudonyms);
+
 } // namespace nimbra::mrctl

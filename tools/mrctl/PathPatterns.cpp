@@ -4,15 +4,18 @@
 
 #include <algorithm>
 #include <array>
+#include <system_error>
 #include <utility>
 
 namespace nimbra::mrctl {
 
 namespace {
 
-/// What closes that which `open` opens; empty for what opens nothing.
+constexpr auto nowhere = std::string_view::npos;
+
+/// What closes that which `before` ends with; empty for what opens nothing.
 std::string_view closingOf(std::string_view before) {
-    constexpr std::array<std::pair<std::string_view, std::string_view>, 9> pairs{{
+    constexpr std::array<std::pair<std::string_view, std::string_view>, 10> pairs{{
         {"\"", "\""},
         {"'", "'"},
         {"`", "`"},
@@ -20,6 +23,7 @@ std::string_view closingOf(std::string_view before) {
         {"[", "]"},
         {"<", ">"},
         {"\u201c", "\u201d"},
+        {"\u201e", "\u201c"},
         {"\u2018", "\u2019"},
         {"\u00ab", "\u00bb"},
     }};
@@ -31,58 +35,118 @@ std::string_view closingOf(std::string_view before) {
     return {};
 }
 
-/// Where the path that begins at `begin` ends at the latest.
-std::size_t endOfPath(std::string_view text, std::size_t begin) {
-    const std::size_t lineEnd = std::min(text.find('\n', begin), text.size());
-    const std::string_view line = text.substr(0, lineEnd);
-    if (const std::string_view closing = closingOf(text.substr(0, begin)); !closing.empty()) {
-        if (const std::size_t end = line.find(closing, begin); end != std::string_view::npos) {
-            return end > begin && line[end - 1] == '\\' ? end - 1 : end;
+/// Whether the system says `text` of an error.
+bool isSystemMessage(std::string_view text) {
+    constexpr int lastError = 133;
+    for (int number = 1; number <= lastError; ++number) {
+        if (std::generic_category().message(number) == text) {
+            return true;
         }
     }
-    std::size_t end = std::min({line.find(": ", begin), line.find('"', begin), line.size()});
+    return false;
+}
+
+/// Where the path that begins at `begin` ends at the latest.
+std::size_t endOfPath(std::string_view text, std::size_t begin) {
+    if (const std::string_view closing = closingOf(text.substr(0, begin)); !closing.empty()) {
+        const std::size_t end = text.rfind(closing);
+        if (end != nowhere && end > begin) {
+            return text[end - 1] == '\\' ? end - 1 : end;
+        }
+    }
+    std::size_t end = text.size();
+    if (const std::size_t reason = text.rfind(": ");
+        reason != nowhere && reason > begin && isSystemMessage(text.substr(reason + 2))) {
+        end = reason;
+    }
+    // The words of this system for what is wrong with a file.
+    for (const std::string_view words :
+         {": expected ", ": cannot be ", ": is a ", ": is not ", ": is larger "}) {
+        end = std::min(end, text.find(words, begin));
+    }
     while (end > begin &&
-           (std::string_view(".,;:!?)]}\\'").contains(line[end - 1]) || isBlank(line[end - 1]))) {
+           (std::string_view(".,;:!?)]}\\'\"").contains(text[end - 1]) || isBlank(text[end - 1]))) {
         --end;
     }
     return end;
 }
 
 bool isIn(std::string_view path, std::string_view place) {
-    return path.starts_with(place) && (path.size() == place.size() || path[place.size()] == '/' ||
-                                       !isWord(path[place.size()]));
+    return path.starts_with(place) && (path.size() == place.size() || path[place.size()] == '/');
 }
 
-/// Whether `path` says nothing of its user: a place of the system, or one in a JSON document.
+/// Whether `path` has no name that a user could have given: it goes on with words of letters.
+bool isPlain(std::string_view path) {
+    return std::ranges::all_of(path, [](char character) {
+        return isWord(character) || std::string_view("/.-_").contains(character);
+    });
+}
+
+/// Whether `path`, to its end, says nothing of its user: a place of the system, or one in a JSON
+/// document.
 bool isEverywhere(std::string_view path) {
-    constexpr std::array places{"/var/lib/nimbra",
+    constexpr std::array wholes{"/var/lib/nimbra",
+                                "/var/lib/nimbra/accounts.db",
+                                "/var/lib/nimbra/consent.db",
+                                "/var/lib/nimbra/device.json",
+                                "/var/lib/nimbra/device-list.json",
+                                "/var/lib/nimbra/documents.json",
+                                "/var/lib/nimbra/restrictions.json",
+                                "/var/lib/nimbra/preferences",
                                 "/var/log/nimbra",
+                                "/var/log/nimbra/settings.log",
+                                "/var/log/nimbra/settings.1.log",
+                                "/var/log/nimbra/settings.2.log",
                                 "/run/nimbra",
-                                "/usr",
-                                "/System",
-                                "/etc",
-                                "/proc",
-                                "/sys",
-                                "/dev",
-                                "/containers",
-                                "/abilities",
-                                "/screen",
-                                "/lastSyncDate",
-                                "/lastSyncText",
-                                "/incompatible",
-                                "/needUpgrade",
-                                "/cloudSyncDenied"};
-    constexpr std::array nowhere{"/..",       "/run/nimbra/progress/",
-                                 "/home",     "/run/nimbra/priority-hints/",
-                                 "/Users/",   "/.cache/",
-                                 "/.config/", "/.local/"};
-    return std::ranges::any_of(places, [path](const char* place) { return isIn(path, place); }) &&
-           std::ranges::none_of(nowhere, [path](const char* part) { return path.contains(part); });
+                                "/run/nimbra/progress",
+                                "/run/nimbra/priority-hints",
+                                "/run/nimbra/notifications",
+                                "/etc/os-release",
+                                "/etc/localtime",
+                                "/dev/null"};
+    constexpr std::array places{
+        "/usr/bin",          "/usr/lib",        "/usr/libexec", "/usr/sbin",
+        "/usr/share",        "/System/Library", "/containers",  "/abilities",
+        "/screen",           "/incompatible",   "/needUpgrade", "/cloudSyncDenied",
+        "/lastSyncDate",     "/lastSyncText",   "/name",        "/locale",
+        "/timeZone",         "/idiom",          "/identity",    "/wirelessVariant",
+        "/description",      "/additional",     "/fraction",    "/indeterminate",
+        "/fileOperationKind"};
+    if (!isPlain(path) || path.contains("/..")) {
+        return false;
+    }
+    const auto isWhole = [path](const char* whole) { return path == whole; };
+    const auto isBelow = [path](const char* place) { return isIn(path, place); };
+    if (std::ranges::any_of(wholes, isWhole) || std::ranges::any_of(places, isBelow)) {
+        return true;
+    }
+    // What is of an application is called by its identifier.
+    constexpr std::string_view settings = "/var/lib/nimbra/preferences/com.";
+    constexpr std::string_view processes = "/run/nimbra/com.";
+    return path.starts_with(settings) || path.starts_with(processes);
+}
+
+/// The end of the path that begins at `begin` where it says nothing of its user: before ": ", a
+/// quotation mark or a blank, without the end of a sentence; `begin` where it does say something.
+std::size_t endOfPublicPath(std::string_view text, std::size_t begin, std::size_t skipped) {
+    std::size_t end = begin;
+    while (end < text.size() && !isBlank(text[end]) && !isQuote(text[end]) &&
+           !std::string_view(",;<>)]}:").contains(text[end])) {
+        ++end;
+    }
+    // "/usr/share/a b" may be one path: what follows begins a sentence or another place.
+    while (end > begin && text[end - 1] == '.') {
+        --end;
+    }
+    return isEverywhere(
+               text.substr(begin + skipped, std::max(end, begin + skipped) - begin - skipped))
+               ? end
+               : begin;
 }
 
 bool canStartName(char character) {
     return isWord(character) || isBeyondAscii(character) ||
-           std::string_view("._~@+-%").contains(character);
+           std::string_view("._~@+-%$ ").contains(character);
 }
 
 /// Where the path begins whose first "/" stands at `slash`; the text's end where none does.
@@ -92,69 +156,79 @@ std::size_t startOfPath(std::string_view text, std::size_t slash) {
         --begin;
     }
     const char before = begin > 0 ? text[begin - 1] : ' ';
-    const bool isInside = isWord(before) || before == '/' || before == '<';
-    const bool goesOn = slash + 1 < text.size() && canStartName(text[slash + 1]);
+    const bool isInside = isWord(before) || isBeyondAscii(before) || before == '/' || before == '<';
+    const bool goesOn = slash + 1 < text.size() && canStartName(text[slash + 1]) &&
+                        (text[slash + 1] != ' ' || begin < slash);
     return isInside || !goesOn ? text.size() : begin;
 }
 
-bool looksLikePath(std::string_view path) {
-    return std::ranges::count(path, '/') >= 2 || path.contains('.') || path.starts_with('~') ||
-           path.starts_with("/root") || path.starts_with("/home");
+/// The beginning of the first place in `text` that only homes have, whatever stands before it.
+std::size_t startOfHome(std::string_view text) {
+    constexpr std::array<std::string_view, 6> signs{"\\Users\\", "\\home\\",      "$HOME",
+                                                    "${HOME}",   "%USERPROFILE%", "/var/mobile"};
+    constexpr std::array<std::string_view, 7> folders{"home", "Users",   "root",    "media",
+                                                      "mnt",  "Volumes", "run/user"};
+    constexpr std::size_t longestHost = 64;
+    std::size_t first = nowhere;
+    for (const std::string_view sign : signs) {
+        first = std::min(first, text.find(sign));
+    }
+    for (const std::string_view folder : folders) {
+        first = std::min(first, text.find('/' + std::string(folder) + '/'));
+    }
+    constexpr std::string_view file = "file:///";
+    if (const std::size_t at = text.find(file); at != nowhere) {
+        first = std::min(first, at + file.size() - 1);
+    }
+    for (std::size_t at = 0; at + 2 < text.size() && at < first; ++at) {
+        const bool isApart = at == 0 || (!isWord(text[at - 1]) && text[at - 1] != '/' &&
+                                         !isBeyondAscii(text[at - 1]));
+        const std::string_view rest = text.substr(at);
+        const bool isDrive = isLetter(rest[0]) && rest[1] == ':' && rest[2] == '\\';
+        const bool isNamed = rest[0] == '~' && (isLetter(rest[1]) || rest[1] == '/');
+        const bool isShare = rest.starts_with("\\\\") && isWord(rest[2]) &&
+                             rest.substr(0, longestHost).find('\\', 3) != nowhere &&
+                             (at == 0 || text[at - 1] != '\\');
+        const bool isRelative = rest.starts_with("home/") || rest.starts_with("Users/");
+        if (isApart && (isDrive || isNamed || isShare || isRelative)) {
+            return at;
+        }
+    }
+    return first;
 }
 
 } // namespace
 
 void findPaths(std::string_view text, std::string_view root, std::vector<FoundSecret>& found) {
-    for (std::size_t slash = text.find('/'); slash != std::string_view::npos;
-         slash = text.find('/', slash + 1)) {
+    const auto add = [&](std::size_t begin) {
+        const std::size_t end = endOfPath(text, begin);
+        found.push_back({.begin = begin, .size = end - begin, .kind = SecretKind::path});
+        return end;
+    };
+    for (std::size_t slash = text.find('/'); slash != nowhere; slash = text.find('/', slash + 1)) {
         const std::size_t begin = startOfPath(text, slash);
         if (begin == text.size()) {
             continue;
         }
-        const std::size_t end = endOfPath(text, begin);
-        const std::string_view path = text.substr(begin, std::max(end, begin) - begin);
-        if (root.size() > 1 && path.starts_with(root) &&
-            (path.size() == root.size() || isEverywhere(path.substr(root.size())))) {
-            found.push_back({begin, root.size(), SecretKind::path});
-            slash = begin + root.size();
-        } else if (looksLikePath(path) && !isEverywhere(path)) {
-            found.push_back({begin, path.size(), SecretKind::path});
+        const bool isOfRoot = root.size() > 1 && text.substr(begin).starts_with(root);
+        const std::string_view behind =
+            isOfRoot ? text.substr(begin + root.size()) : std::string_view();
+        const bool isRoot =
+            isOfRoot && (behind.empty() || std::string_view(": \"'.,)").contains(behind.front()));
+        if (const std::size_t end = isRoot
+                                        ? begin + root.size()
+                                        : endOfPublicPath(text, begin, isOfRoot ? root.size() : 0);
+            end > begin) {
+            if (isOfRoot) {
+                found.push_back({.begin = begin, .size = root.size(), .kind = SecretKind::path});
+            }
             slash = std::max(slash, end - 1);
+        } else {
+            slash = std::max(slash, add(begin) - 1);
         }
     }
-}
-
-bool isDocumentName(std::string_view name) {
-    constexpr std::array endings{"pdf", "doc",  "docx", "xls",  "xlsx",  "ppt",    "pptx", "txt",
-                                 "rtf", "odt",  "ods",  "odp",  "csv",   "md",     "epub", "jpg",
-                                 "png", "jpeg", "gif",  "heic", "svg",   "tiff",   "mov",  "mp3",
-                                 "mp4", "m4a",  "wav",  "zip",  "pages", "numbers"};
-    const std::size_t dot = name.rfind('.');
-    return dot != std::string_view::npos && dot > 0 &&
-           std::ranges::find(endings, lowerCase(name.substr(dot + 1))) != endings.end();
-}
-
-void findDocumentNames(std::string_view text, std::vector<FoundSecret>& found) {
-    for (std::size_t dot = text.find('.'); dot != std::string_view::npos;
-         dot = text.find('.', dot + 1)) {
-        std::size_t end = dot + 1;
-        while (end < text.size() && isWord(text[end])) {
-            ++end;
-        }
-        std::size_t begin = dot;
-        while (begin > 0 && !isBlank(text[begin - 1]) && !isQuote(text[begin - 1]) &&
-               text[begin - 1] != '/') {
-            --begin;
-        }
-        if (!isDocumentName(text.substr(begin, end - begin))) {
-            continue;
-        }
-        const std::string_view line = text.substr(0, end);
-        if (const std::size_t quote = line.find_last_of("\"'`", begin);
-            end < text.size() && quote != std::string_view::npos && text[quote] == text[end]) {
-            begin = quote + 1;
-        }
-        found.push_back({begin, end - begin, SecretKind::file});
+    if (const std::size_t home = startOfHome(text); home != nowhere) {
+        add(home);
     }
 }
 
@@ -162,14 +236,17 @@ PathNames namesInPath(std::string_view path) {
     PathNames names;
     for (const std::string homes : {"/home", "/Users", "/media"}) {
         const std::size_t at = path.find(homes + '/');
-        if (at != std::string_view::npos) {
+        if (at != nowhere) {
             const std::string_view rest = path.substr(at + homes.size() + 1);
-            names.user = std::string(rest.substr(0, rest.find_first_of("/ ")));
+            names.user = std::string(rest.substr(0, rest.find_first_of("/ :,;\"'`")));
         }
     }
+    std::vector<FoundSecret> documents;
     const std::string_view last = path.substr(path.rfind('/') + 1);
-    if (isDocumentName(last)) {
-        names.document = std::string(last);
+    findDocumentNames(last, documents);
+    if (!documents.empty()) {
+        names.document =
+            std::string(last.substr(0, documents.front().begin + documents.front().size));
     }
     return names;
 }

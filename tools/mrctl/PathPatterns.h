@@ -8,12 +8,10 @@
 
 namespace nimbra::mrctl {
 
-/// Adds the paths in `text` to `found`, as `findSecrets` says.
+/// Adds the paths in `text` to `found`, as `findSecrets` says. A name may have blanks, colons and
+/// quotation marks: a path goes on to the last of the marks that close it, else to the end of the
+/// text or before the words of the system for an error.
 void findPaths(std::string_view text, std::string_view root, std::vector<FoundSecret>& found);
-
-/// Adds the names of document files in `text`: with their blanks where they stand in quotation
-/// marks, else the last word.
-void findDocumentNames(std::string_view text, std::vector<FoundSecret>& found);
 
 /// What a path tells beyond itself: whose home it is in, and what a document is called.
 struct PathNames {
@@ -21,5 +19,9 @@ struct PathNames {
     std::string document;
 };
 [[nodiscard]] PathNames namesInPath(std::string_view path);
+
+/// Adds the names of document files in `text` to `found`: with their blanks where they stand in
+/// quotation marks, else from the first of the words with a capital that they end.
+void findDocumentNames(std::string_view text, std::vector<FoundSecret>& found);
 
 } // namespace nimbra::mrctl

@@ -1,93 +1,80 @@
 #include "tools/mrctl/Pseudonyms.h"
 
-#include "device/DeviceError.h"
-#include "device/files/PercentEncoding.h"
 #include "tools/mrctl/Characters.h"
+#include "tools/mrctl/DecodedText.h"
+#include "tools/mrctl/FoldedText.h"
 #include "tools/mrctl/PathPatterns.h"
+#include "tools/mrctl/SecretNames.h"
 #include "tools/mrctl/SecretPatterns.h"
 
 #include <algorithm>
 #include <array>
-#include <nlohmann/json.hpp>
 #include <utility>
 
 namespace nimbra::mrctl {
 
 namespace {
 
-/// How many bytes the search looks at first.
-constexpr std::size_t startSize = 3;
-
-std::uint32_t startOf(std::string_view text) {
-    std::uint32_t start = 0;
-    for (const char character : text.substr(0, startSize)) {
-        start = start * 256U + static_cast<unsigned char>(character);
-    }
-    return start;
-}
+/// Shorter ones are searched for nowhere.
+constexpr std::size_t leastSearched = 3;
+/// Longer ones stand in no second text.
+constexpr std::size_t mostSearched = 512;
 
 /// Whether a device may be called so without that everything is called so.
 bool isOrdinaryWord(const std::string& value) {
-    constexpr std::array words{"able",      "account",     "accounts",     "and",
-                               "app",       "application", "are",          "array",
-                               "cannot",    "cellular",    "cloud",        "com",
-                               "container", "data",        "debug",        "default",
-                               "device",    "devices",     "disk",         "document",
-                               "documents", "drive",       "email",        "error",
-                               "example",   "expected",    "fails",        "failed",
-                               "false",     "file",        "files",        "for",
-                               "found",     "from",        "has",          "home",
-                               "http",      "https",       "identity",     "info",
-                               "json",      "kind",        "last",         "lib",
-                               "line",      "log",         "more",         "name",
-                               "new",       "nimbra",      "nimbra drive", "nimbra-settings",
-                               "not",       "nothing",     "notice",       "null",
-                               "number",    "object",      "off",          "org",
-                               "pad",       "path",        "phone",        "preferences",
-                               "primary",   "program",     "progress",     "read",
-                               "root",      "run",         "secret",       "service",
-                               "set",       "settings",    "stands",       "standard",
-                               "string",    "sync",        "system",       "text",
-                               "the",       "there",       "true",         "user",
-                               "usr",       "var",         "was",          "with",
-                               "written",   "you"};
+    constexpr std::array words{
+        "able",          "account",   "accounts",   "and",      "app",          "application",
+        "applications",  "are",       "array",      "cannot",   "cellular",     "cloud",
+        "com",           "container", "containers", "data",     "database",     "databases",
+        "debug",         "default",   "device",     "devices",  "disk",         "document",
+        "documentation", "documents", "drive",      "email",    "error",        "example",
+        "expected",      "expired",   "failed",     "fails",    "false",        "file",
+        "files",         "for",       "found",      "from",     "has",          "home",
+        "http",          "https",     "identity",   "info",     "invalid",      "json",
+        "kind",          "last",      "lib",        "line",     "log",          "missing",
+        "more",          "name",      "new",        "nimbra",   "nimbra drive", "nimbra-settings",
+        "not",           "nothing",   "notice",     "null",     "number",       "object",
+        "off",           "org",       "pad",        "path",     "phone",        "preferences",
+        "primary",       "private",   "program",    "progress", "public",       "read",
+        "required",      "root",      "run",        "secret",   "service",      "set",
+        "settings",      "shared",    "standard",   "stands",   "stratafile",   "string",
+        "sync",          "system",    "tablet",     "text",     "the",          "there",
+        "true",          "user",      "usr",        "var",      "was",          "with",
+        "written",       "you"};
     const std::string lower = lowerCase(value);
     return std::ranges::find(words, lower) != words.end();
 }
 
-bool isOwnFieldOnly(const std::string& value) {
+bool isShortNumber(const std::string& value) {
     constexpr std::size_t mostDigits = 5;
-    const bool isShortNumber = value.size() <= mostDigits && std::ranges::all_of(value, isDigit);
-    return value.size() < startSize || isShortNumber || isOrdinaryWord(value);
+    return value.size() <= mostDigits && std::ranges::all_of(value, isDigit);
+}
+
+/// Whether `value` begins like a date or consists of the signs of a time.
+bool isTime(std::string_view value) {
+    constexpr std::string_view form = "0000-00-00";
+    const bool isDate =
+        value.size() >= form.size() &&
+        std::ranges::equal(value.substr(0, form.size()), form, [](char character, char expected) {
+            return expected == '0' ? isDigit(character) : character == expected;
+        });
+    constexpr std::size_t longestTime = 8;
+    return isDate || (value.size() <= longestTime && value.contains(':') &&
+                      std::ranges::all_of(value, [](char character) {
+                          return isDigit(character) || character == ':';
+                      }));
+}
+
+/// Whether `value` is a name that this system gives to data classes and services.
+bool isSystemName(std::string_view value) {
+    return std::ranges::any_of(std::array{"kAccountDataclass", "kPRVService"},
+                               [value](const char* start) { return value.starts_with(start); }) &&
+           std::ranges::all_of(value, isLetter);
 }
 
 bool isWholeWordOnly(const std::string& value) {
     constexpr std::size_t mostBytes = 7;
     return value.size() <= mostBytes && std::ranges::none_of(value, isBeyondAscii);
-}
-
-/// Whether the word from `begin` to `end` does not go on in `text`. Where it begins or ends with a
-/// sign, it does not go on there.
-bool isWholeWord(std::string_view text, std::size_t begin, std::size_t end) {
-    const bool goesOnBefore = begin > 0 && isWord(text[begin - 1]) && isWord(text[begin]);
-    const bool goesOnBehind = end < text.size() && isWord(text[end]) && isWord(text[end - 1]);
-    return !goesOnBefore && !goesOnBehind;
-}
-
-std::string inJson(const std::string& value, bool isAscii) {
-    using Json = nlohmann::json;
-    const std::string text = Json(value).dump(-1, ' ', isAscii, Json::error_handler_t::replace);
-    return text.substr(1, text.size() - 2);
-}
-
-std::vector<std::string> spellingsOf(const std::string& value) {
-    return {value,
-            device::oneLine(value),
-            inJson(value, false),
-            inJson(value, true),
-            device::percentEncoded(value),
-            device::percentEncoded(value, "/.@:+~"),
-            fileNamePart(value)};
 }
 
 } // namespace
@@ -115,71 +102,122 @@ void Pseudonyms::learn(SecretKind kind, const std::string& value, Search search)
         return;
     }
     const std::size_t index = valueOf(kind, value);
-    if (search == Search::ownFields || isOwnFieldOnly(value)) {
-        return;
-    }
-    for (const std::string& spelling : spellingsOf(value)) {
-        this->search(spelling, index);
+    if (search == Search::everywhere && !isOwnFieldOnly(value)) {
+        this->search(value, index);
     }
 }
 
+void Pseudonyms::learnWords(SecretKind kind, std::string_view value) {
+    constexpr std::size_t leastWord = 5;
+    const auto isPart = [](char character) {
+        return isWord(character) || isBeyondAscii(character);
+    };
+    for (std::size_t begin = 0; begin < value.size();) {
+        const std::size_t end = endOfRun(value, begin, isPart);
+        const std::string word(value.substr(begin, end - begin));
+        // An application may be called by the same word.
+        const bool isKept = std::ranges::any_of(_kept, [&word](const std::string& name) {
+            return lowerCase(name).contains(lowerCase(word));
+        });
+        if (word.size() >= leastWord && !isKept && !std::ranges::all_of(word, isDigit)) {
+            learn(kind, word);
+        }
+        begin = end + 1;
+    }
+}
+
+void Pseudonyms::keep(const std::string& name) {
+    _kept.insert(name);
+}
+
 void Pseudonyms::learnFrom(std::string_view text) {
-    for (const auto& [begin, size, kind] : findSecrets(text, _root)) {
+    if (text.size() > kLongestText) {
+        return;
+    }
+    for (const auto& [begin, size, kind, searched] : findSecrets(text, _root)) {
         const std::string value(text.substr(begin, size));
-        if (kind == SecretKind::path || kind == SecretKind::text) {
+        if (kind == SecretKind::path || kind == SecretKind::text || searched < size) {
             // They are found again by what they look like.
             static_cast<void>(valueOf(kind, value));
-        } else {
-            learn(kind, value);
+        }
+        if (kind != SecretKind::path && kind != SecretKind::text) {
+            learn(kind, value.substr(0, searched));
         }
         if (kind == SecretKind::email) {
             // Many are called like the first half of their address.
-            learn(SecretKind::user, value.substr(0, std::min(value.find('@'), value.find("%40"))));
+            const std::string address = DecodedText(value).text;
+            learn(SecretKind::user, address.substr(0, address.find('@')));
         }
         if (kind == SecretKind::path) {
-            const PathNames names = namesInPath(value);
+            const PathNames names = namesInPath(DecodedText(value).text);
             learn(SecretKind::user, names.user);
             learn(SecretKind::file, names.document);
         }
     }
 }
 
-std::size_t Pseudonyms::valueOf(SecretKind kind, const std::string& text) {
-    const auto [place, isNew] = _valueOfText.emplace(text, _values.size());
-    if (isNew) {
-        _values.push_back({.kind = kind, .pseudonym = {}, .places = 0});
-    }
-    return place->second;
+bool Pseudonyms::isOwnFieldOnly(const std::string& value) const {
+    return value.size() < leastSearched || value.size() > mostSearched || isShortNumber(value) ||
+           isTime(value) || isSystemName(value) || isOrdinaryWord(value) || _kept.contains(value) ||
+           // "password" is no password.
+           (std::ranges::all_of(value, isLetter) && kindOfValueNamed(value));
 }
 
-void Pseudonyms::search(const std::string& spelling, std::size_t value) {
-    if (isOwnFieldOnly(spelling) || _spellings.contains(spelling)) {
-        return;
+bool Pseudonyms::isKnown(const std::string& value) const {
+    constexpr std::size_t leastKnown = 4;
+    return value.size() >= leastKnown && _valueOfText.contains(value) &&
+           (!isOwnFieldOnly(value) || isShortNumber(value));
+}
+
+std::size_t Pseudonyms::valueOf(SecretKind kind, const std::string& text) {
+    const auto [place, isNew] = _valueOfText.emplace(text, _values.size());
+    if (!isNew) {
+        return place->second;
     }
-    // Another spelling of a value may be a value of its own.
-    const std::size_t owner = _valueOfText.emplace(spelling, value).first->second;
-    _spellings.emplace(spelling,
-                       Spelling{.value = owner, .asWholeWord = isWholeWordOnly(spelling)});
-    _sizesOfStart[startOf(spelling)].insert(spelling.size());
+    const std::size_t index = place->second;
+    // An address is the same in capitals.
+    const std::string lower = kind == SecretKind::email ? lowerCase(text) : text;
+    if (const auto [other, isFirst] = _valueOfText.emplace(lower, index);
+        !isFirst && lower != text) {
+        return _valueOfText[text] = other->second;
+    }
+    _values.push_back({.kind = kind, .pseudonym = {}, .places = 0});
+    return index;
+}
+
+void Pseudonyms::search(const std::string& value, std::size_t index) {
+    _spellings.add(value, {.value = index, .asWholeWord = isWholeWordOnly(value)});
+    const FoldedText folded(value);
+    // Of a name of signs alone nothing is left to be searched for.
+    if (folded.text.size() >= leastSearched && !isShortNumber(folded.text) &&
+        !isOrdinaryWord(folded.text)) {
+        _foldedSpellings.add(folded.text,
+                             {.value = index,
+                              .asWholeWord = isWholeWordOnly(folded.text),
+                              .gaps = folded.gaps[folded.text.size() - 1] - folded.gaps.front()});
+    }
 }
 
 void Pseudonyms::findSpellings(std::string_view text, std::vector<Match>& matches) const {
-    for (std::size_t begin = 0; begin + startSize <= text.size(); ++begin) {
-        const auto sizes = _sizesOfStart.find(startOf(text.substr(begin)));
-        if (sizes == _sizesOfStart.end()) {
-            continue;
+    const auto goesOn = [](std::string_view word, std::size_t index) {
+        return index > 0 && index < word.size() && isWord(word[index - 1]) && isWord(word[index]);
+    };
+    _spellings.find(text, [&](std::size_t begin, std::size_t end, const Spelling& found) {
+        if (!found.asWholeWord || (!goesOn(text, begin) && !goesOn(text, end))) {
+            matches.push_back({begin, end, found.value});
         }
-        for (const std::size_t size : sizes->second) {
-            if (begin + size > text.size()) {
-                break;
+    });
+    const FoldedText folded(text);
+    const auto& gaps = folded.gaps;
+    _foldedSpellings.find(
+        folded.text, [&](std::size_t begin, std::size_t end, const Spelling& found) {
+            const bool isWhole = (!goesOn(folded.text, begin) || gaps[begin] != gaps[begin - 1]) &&
+                                 (!goesOn(folded.text, end) || gaps[end] != gaps[end - 1]);
+            // A short one is not put together from several words.
+            if (!found.asWholeWord || (isWhole && gaps[end - 1] - gaps[begin] <= found.gaps)) {
+                matches.push_back({folded.begins[begin], folded.ends[end - 1], found.value});
             }
-            const auto found = _spellings.find(text.substr(begin, size));
-            if (found != _spellings.end() &&
-                (!found->second.asWholeWord || isWholeWord(text, begin, begin + size))) {
-                matches.push_back({begin, begin + size, found->second.value});
-            }
-        }
-    }
+        });
 }
 
 std::string Pseudonyms::of(SecretKind kind, const std::string& value) {
@@ -194,11 +232,19 @@ std::string Pseudonyms::replaced(std::string_view text) {
         learnFrom(text);
         return std::string(text);
     }
+    if (isSystemName(text)) {
+        return std::string(text);
+    }
+    if (text.size() > kLongestText) {
+        return "(a line of " + std::to_string(text.size()) + " bytes is left out)";
+    }
     std::vector<Match> matches;
     findSpellings(text, matches);
-    for (const auto& [begin, size, kind] : findSecrets(text, _root)) {
-        matches.push_back(
-            {begin, begin + size, valueOf(kind, std::string(text.substr(begin, size)))});
+    for (const auto& [begin, size, kind, searched] : findSecrets(text, _root)) {
+        if (!_kept.contains(text.substr(begin, size))) {
+            matches.push_back(
+                {begin, begin + size, valueOf(kind, std::string(text.substr(begin, size)))});
+        }
     }
     // The longest first where several begin, so that it gives its name to what they cover.
     std::ranges::stable_sort(matches, [](const Match& left, const Match& right) {

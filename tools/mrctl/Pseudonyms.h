@@ -1,9 +1,9 @@
 #pragma once
 
 #include "tools/mrctl/SecretKind.h"
+#include "tools/mrctl/SpellingIndex.h"
 
 #include <cstddef>
-#include <cstdint>
 #include <functional>
 #include <map>
 #include <set>
@@ -21,10 +21,10 @@ namespace nimbra::mrctl {
 /// the same pseudonym, whatever it was met as; no pseudonym is a value itself.
 ///
 /// First everything is learned, then everything is replaced. What was learned is searched for in
-/// all texts: in its own spelling, and as it stands in a URL, in JSON, in one line and in the name
-/// of a file. How, depends on the value, so that one that is also a word does not spoil the texts:
-/// - only in fields of its own: a value of one or two bytes, a number of up to five digits, and a
-///   word that the reports themselves are written in ("error", "phone");
+/// all texts: in its own spelling, and in every other that `FoldedText` makes the same. How,
+/// depends on the value, so that one that is also a word does not spoil the texts:
+/// - only in fields of its own: a value of one or two bytes, a number of up to five digits, a date,
+///   a name of this system, and a word that the reports themselves are written in ("error");
 /// - as a whole word: another value of ASCII characters and up to seven bytes;
 /// - wherever it stands: every other one.
 /// Where values overlap, all that they cover is replaced. Not thread-safe.
@@ -38,6 +38,10 @@ public:
 
     /// From here on `value` is a secret, if it is not empty.
     void learn(SecretKind kind, const std::string& value, Search search = Search::everywhere);
+    /// From here on each word of `value` that is long enough to be told from others is a secret.
+    void learnWords(SecretKind kind, std::string_view value);
+    /// `name` stays readable in all texts, unless its own field tells more.
+    void keep(const std::string& name);
     /// From here on everything in `text` that looks like a secret is one.
     void learnFrom(std::string_view text);
 
@@ -47,7 +51,10 @@ public:
 
     /// What stands for `value` in a field that holds nothing else. Empty for an empty one.
     [[nodiscard]] std::string of(SecretKind kind, const std::string& value);
-    /// `text` with pseudonyms for every value that was learned and all that looks like a secret.
+    /// Whether `value`, where it is all of a field, is one that was learned; a short number may be.
+    [[nodiscard]] bool isKnown(const std::string& value) const;
+    /// `text` with pseudonyms for every value that was learned and all that looks like a secret;
+    /// one that is too long to be searched is left out as a whole.
     [[nodiscard]] std::string replaced(std::string_view text);
 
     /// How often something was replaced.
@@ -64,19 +71,6 @@ private:
         std::string pseudonym;
         std::size_t places = 0;
     };
-    /// A spelling that texts are searched for.
-    struct Spelling {
-        std::size_t value;
-        bool asWholeWord;
-    };
-    /// Finds a spelling by a piece of a text.
-    struct SpellingHash {
-        // NOLINTNEXTLINE(readability-identifier-naming): the library looks for this name
-        using is_transparent = void;
-        std::size_t operator()(std::string_view text) const {
-            return std::hash<std::string_view>()(text);
-        }
-    };
     struct Match {
         std::size_t begin;
         std::size_t end;
@@ -84,7 +78,8 @@ private:
     };
 
     std::size_t valueOf(SecretKind kind, const std::string& text);
-    void search(const std::string& spelling, std::size_t value);
+    void search(const std::string& value, std::size_t index);
+    [[nodiscard]] bool isOwnFieldOnly(const std::string& value) const;
     void findSpellings(std::string_view text, std::vector<Match>& matches) const;
     [[nodiscard]] const std::string& use(std::size_t value);
     [[nodiscard]] std::string freshPseudonym(SecretKind kind);
@@ -93,9 +88,10 @@ private:
     bool _isLearning = false;
     std::vector<Value> _values;
     std::unordered_map<std::string, std::size_t> _valueOfText;
-    std::unordered_map<std::string, Spelling, SpellingHash, std::equal_to<>> _spellings;
-    /// How long the spellings are that begin with three bytes.
-    std::unordered_map<std::uint32_t, std::set<std::size_t>> _sizesOfStart;
+    /// What stays readable.
+    std::set<std::string, std::less<>> _kept;
+    SpellingIndex _spellings;
+    SpellingIndex _foldedSpellings;
     std::map<SecretKind, std::size_t> _lastNumbers;
 };
 

@@ -56,9 +56,12 @@ private:
     void learnFields() {
         for (const auto& application : _contents.applications) {
             _bundles.insert(application.identifier);
+            if (isMadeByProgram(application.identifier)) {
+                _pseudonyms.keep(application.identifier);
+            }
         }
         if (_contents.facts) {
-            _pseudonyms.learn(SecretKind::device, _contents.facts->name);
+            learnName(SecretKind::device, _contents.facts->name);
         }
         constexpr std::size_t longestHostName = 256;
         std::array<char, longestHostName> buffer{};
@@ -67,30 +70,41 @@ private:
             _pseudonyms.learn(SecretKind::device, host);
         }
         for (const auto& account : accounts()) {
+            // What stands behind the sign of an address is a host, which many share.
+            const std::string_view id = account.identifier;
             _pseudonyms.learn(SecretKind::account, account.identifier);
+            _pseudonyms.learnWords(SecretKind::account, id.substr(0, id.find('@')));
             _pseudonyms.learnFrom(account.identifier);
             _pseudonyms.learn(SecretKind::account, account.tessaryAccount.value_or(""));
         }
         if (_contents.documents) {
-            _pseudonyms.learn(SecretKind::identity, _contents.documents->identity.value_or(""));
+            learnName(SecretKind::identity, _contents.documents->identity.value_or(""));
             for (const auto& container : _contents.documents->containers) {
                 _pseudonyms.learn(SecretKind::container, container.identifier,
                                   _bundles.contains(container.identifier)
                                       ? Pseudonyms::Search::ownFields
                                       : Pseudonyms::Search::everywhere);
+                _pseudonyms.learnWords(SecretKind::container,
+                                       std::string_view(container.identifier)
+                                           .substr(container.identifier.rfind('.') + 1));
             }
         }
         for (const auto* const names : deviceNames()) {
             for (const std::string& name : *names) {
-                _pseudonyms.learn(SecretKind::device, name);
+                learnName(SecretKind::device, name);
             }
         }
         for (const auto& [name, values] : _contents.progress) {
-            _pseudonyms.learn(SecretKind::file, name);
+            learnName(SecretKind::file, name);
             for (const Text& text : {values.description, values.additional}) {
                 _pseudonyms.learn(SecretKind::text, text.string());
             }
         }
+    }
+
+    void learnName(SecretKind kind, const std::string& name) {
+        _pseudonyms.learn(kind, name);
+        _pseudonyms.learnWords(kind, name);
     }
 
     [[nodiscard]] std::vector<device::DeviceDescription::AccountDescription> accounts() const {
@@ -117,9 +131,21 @@ private:
     Json replacedAll(const Names& names) {
         Json result = Json::array();
         for (const std::string& name : names) {
-            result.push_back(_pseudonyms.replaced(name));
+            result.push_back(word(name));
         }
         return result;
+    }
+
+    /// A name that a program gave, which stays readable if it is made like one; what somebody wrote
+    /// does not.
+    std::string word(const std::string& name) {
+        return isMadeByProgram(name) ? _pseudonyms.replaced(name)
+                                     : _pseudonyms.of(SecretKind::text, name);
+    }
+    static bool isMadeByProgram(const std::string& name) {
+        return std::ranges::all_of(name, [](char character) {
+            return isWord(character) || std::string_view(".-_").contains(character);
+        });
     }
 
     template <class Names>
@@ -142,7 +168,7 @@ private:
         device::DeviceDescription facts = *_contents.facts;
         facts.name = _pseudonyms.of(SecretKind::device, facts.name);
         if (facts.wirelessVariant) {
-            facts.wirelessVariant = _pseudonyms.replaced(*facts.wirelessVariant);
+            facts.wirelessVariant = word(*facts.wirelessVariant);
         }
         add("device.json", "the device: screen, language, time zone, abilities",
             device::deviceFile.content(facts));
@@ -181,12 +207,12 @@ private:
         const Json sentence = documents.lastSyncText;
         Json content{{"identity", orNull(SecretKind::identity, documents.identity)},
                      {"containers", containers},
-                     {"lastSyncDate", replacedInJson(documents.lastSyncDate, _pseudonyms)}};
+                     {"lastSyncDate", withoutSentences(documents.lastSyncDate, _pseudonyms)}};
         if (!documents.composesLastSyncText) {
             content["lastSyncText"] =
                 sentence.is_string()
                     ? Json(_pseudonyms.of(SecretKind::text, sentence.get<std::string>()))
-                    : replacedInJson(sentence, _pseudonyms);
+                    : withoutSentences(sentence, _pseudonyms);
         }
         add("documents.json", "the identity, the document containers and the last sync", content);
     }
@@ -202,15 +228,15 @@ private:
         if (_contents.consent) {
             Json list = Json::array();
             for (const auto& [service, bundle, granted] : *_contents.consent) {
-                list.push_back(Json{{"service", _pseudonyms.replaced(service)},
+                list.push_back(Json{{"service", word(service)},
                                     {"bundle", bundle ? Json(bundleName(*bundle)) : Json(nullptr)},
                                     {"granted", granted ? Json(*granted) : Json(nullptr)}});
             }
             add("consent.json", "what the user allows to applications", list);
         }
         for (const auto& [domain, values] : _contents.preferences) {
-            add("preferences/" + _pseudonyms.replaced(domain) + ".json",
-                "preferences of an application", replacedInJson(values, _pseudonyms));
+            add("preferences/" + domainName(domain) + ".json", "preferences of an application",
+                replacedInJson(values, _pseudonyms));
         }
         if (_contents.restrictions) {
             auto restrictions = device::restrictionsFile.content(*_contents.restrictions);
@@ -223,14 +249,23 @@ private:
         }
     }
 
-    /// An application's identifier stays readable, where it is made like one.
+    /// An application's identifier stays readable, where it is made like one and holds no account.
     std::string bundleName(const std::string& identifier) {
-        const bool isPlain =
-            identifier.contains('.') && std::ranges::all_of(identifier, [](char character) {
-                return isWord(character) || std::string_view(".-_").contains(character);
-            });
-        return isPlain && _bundles.contains(identifier) ? identifier
-                                                        : _pseudonyms.replaced(identifier);
+        const bool holdsAccount = std::ranges::any_of(accounts(), [&](const auto& account) {
+            constexpr std::size_t leastSize = 6;
+            return account.identifier.size() >= leastSize &&
+                   lowerCase(identifier).contains(lowerCase(account.identifier));
+        });
+        if (holdsAccount || !identifier.contains('.')) {
+            return _pseudonyms.of(SecretKind::text, identifier);
+        }
+        return _bundles.contains(identifier) && isMadeByProgram(identifier) ? identifier
+                                                                            : word(identifier);
+    }
+
+    /// The domain of preferences in the name of a file.
+    std::string domainName(const std::string& domain) {
+        return domain.contains('.') ? word(domain) : _pseudonyms.of(SecretKind::file, domain);
     }
 
     void addApplications() {
@@ -254,10 +289,9 @@ private:
                 Json{{"file", _pseudonyms.of(SecretKind::file, name)},
                      {"fraction", values.fraction},
                      {"indeterminate", values.indeterminate},
-                     {"fileOperationKind",
-                      !values.fileOperationKind.isPresent()
-                          ? Json(nullptr)
-                          : Json(_pseudonyms.replaced(values.fileOperationKind.string()))},
+                     {"fileOperationKind", !values.fileOperationKind.isPresent()
+                                               ? Json(nullptr)
+                                               : Json(word(values.fileOperationKind.string()))},
                      {"description", text(values.description)},
                      {"additional", text(values.additional)}});
         }
@@ -267,8 +301,14 @@ private:
     void addTexts() {
         if (_contents.log) {
             std::string text;
+            // The lines of a private key tell nothing by themselves.
+            bool isInKey = false;
             for (const std::string& line : *_contents.log) {
-                text += _pseudonyms.replaced(line) + '\n';
+                const bool isEnd = line.contains("-----END ");
+                text += isInKey && !isEnd ? "(a line of a key is left out)"
+                                          : _pseudonyms.replaced(line);
+                text += '\n';
+                isInKey = !isEnd && (isInKey || line.contains("-----BEGIN "));
             }
             addText("log.txt", "the newest lines of the device's log", std::move(text));
         }
