@@ -1,10 +1,13 @@
 #pragma once
 
-#include <cstdlib>
+#include <atomic>
+#include <cerrno>
 #include <filesystem>
 #include <stdexcept>
 #include <string>
+#include <sys/stat.h>
 #include <system_error>
+#include <unistd.h>
 
 namespace nimbra::test {
 
@@ -12,11 +15,16 @@ namespace nimbra::test {
 class TemporaryDirectory {
 public:
     TemporaryDirectory() {
-        std::string name = (std::filesystem::temp_directory_path() / "nimbra-test.XXXXXX").string();
-        if (::mkdtemp(name.data()) == nullptr) {
+        // Of numbers alone: letters by chance may be a word that means something to what is tested.
+        static std::atomic<int> count = 0;
+        const auto folder = std::filesystem::temp_directory_path();
+        do {
+            _path = folder /
+                    ("nimbra-test." + std::to_string(::getpid()) + '-' + std::to_string(count++));
+        } while (::mkdir(_path.c_str(), 0700) != 0 && errno == EEXIST);
+        if (!std::filesystem::is_directory(_path)) {
             throw std::runtime_error("no temporary directory");
         }
-        _path = name;
     }
     TemporaryDirectory(const TemporaryDirectory&) = delete;
     TemporaryDirectory& operator=(const TemporaryDirectory&) = delete;
