@@ -1,7 +1,11 @@
 #include "device/system/LanguageChain.h"
 
 #include <algorithm>
+#include <array>
+#include <cstdint>
 #include <unicode/locid.h>
+#include <unicode/uloc.h>
+#include <utility>
 
 namespace nimbra::device {
 
@@ -36,6 +40,15 @@ std::vector<std::string> languageChain(const std::string& locale) {
         add(language);
     }
     return chain;
+}
+
+bool isLanguageTag(const std::string& tag) {
+    std::array<char, ULOC_FULLNAME_CAPACITY> locale{};
+    std::int32_t parsed = 0;
+    UErrorCode status = U_ZERO_ERROR;
+    const auto length =
+        uloc_forLanguageTag(tag.c_str(), locale.data(), ULOC_FULLNAME_CAPACITY, &parsed, &status);
+    return U_SUCCESS(status) != 0 && length > 0 && std::cmp_equal(parsed, tag.size());
 }
 
 } // namespace nimbra::device

@@ -10,4 +10,7 @@ namespace nimbra::device {
 /// "zh-TW" gives "zh-Hant" but not "zh", whose script another user reads.
 [[nodiscard]] std::vector<std::string> languageChain(const std::string& locale);
 
+/// Whether `tag` is a BCP 47 tag, from its beginning to its end.
+[[nodiscard]] bool isLanguageTag(const std::string& tag);
+
 } // namespace nimbra::device

@@ -1,13 +1,12 @@
 #include "host/cli/Arguments.h"
 
+#include "device/system/LanguageChain.h"
 #include "host/cli/Failure.h"
 
 #include <CLI/CLI.hpp>
-#include <array>
 #include <cstring>
 #include <iostream>
 #include <string_view>
-#include <unicode/uloc.h>
 #include <utility>
 
 namespace nimbra::cli {
@@ -34,13 +33,8 @@ constexpr const char* examples =
     "manual page settingsctl(1) all there is.";
 
 std::string checkLocale(const std::string& tag) {
-    std::array<char, ULOC_FULLNAME_CAPACITY> locale{};
-    std::int32_t parsed = 0;
-    UErrorCode status = U_ZERO_ERROR;
-    const auto length =
-        uloc_forLanguageTag(tag.c_str(), locale.data(), ULOC_FULLNAME_CAPACITY, &parsed, &status);
-    const bool isTag = U_SUCCESS(status) != 0 && length > 0 && std::cmp_equal(parsed, tag.size());
-    return isTag ? std::string() : '"' + tag + "\" is not a language tag such as \"de-DE\"";
+    return device::isLanguageTag(tag) ? std::string()
+                                      : '"' + tag + "\" is not a language tag such as \"de-DE\"";
 }
 
 /// The command line, and where its words go.

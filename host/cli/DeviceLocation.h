@@ -9,13 +9,6 @@
 
 namespace nimbra::cli {
 
-/// Where the program keeps what it remembers: $XDG_STATE_HOME/nimbra, else
-/// ~/.local/state/nimbra.
-[[nodiscard]] std::filesystem::path stateDirectory();
-
-/// The device directory that is used when none is named.
-[[nodiscard]] std::filesystem::path defaultDeviceDirectory();
-
 /// Sees to it that there is something at `root`: where nothing is, the sample device is made there
 /// and `messages` says so in one line. What is there stays as it is.
 [[nodiscard]] std::expected<void, Failure> provideDevice(const std::filesystem::path& root,

@@ -4,12 +4,12 @@
 #include "device/documents/DeviceFileManager.h"
 #include "host/cli/Interruption.h"
 #include "host/cli/ScreenText.h"
-#include "host/cli/Sharing.h"
 #include "host/cli/TextLayout.h"
 #include "host/cli/Waiting.h"
 #include "host/core/PaneSession.h"
 #include "host/core/Presentations.h"
 #include "host/core/ScreenDescription.h"
+#include "host/core/Sharing.h"
 #include "platform/views/Button.h"
 
 #include <algorithm>
@@ -206,7 +206,7 @@ std::expected<ShareOutcome, std::string> Dialog::share(const std::filesystem::pa
     }
     const auto& types = sheet.includedActivityTypes();
     const bool mayMail = !types || std::ranges::find(*types, ActivityTypeMail) != types->end();
-    const auto mail = mayMail ? findMailProgram() : std::nullopt;
+    const auto mail = mayMail ? host::findMailProgram() : std::nullopt;
     const auto answer = _ask(std::string("  Copy it to which file or folder") +
                              (mail ? ", or m for a mail" : "") + " (nothing leaves it there): ");
     const std::string target = trimmed(answer.value_or(""));
@@ -214,12 +214,12 @@ std::expected<ShareOutcome, std::string> Dialog::share(const std::filesystem::pa
         return ShareOutcome::cancelled;
     }
     if (mail && folded(target) == u"m") {
-        if (const auto handed = handToMail(*mail, file); !handed) {
+        if (const auto handed = host::handToMail(*mail, file); !handed) {
             return std::unexpected(handed.error());
         }
         return ShareOutcome::sent;
     }
-    const auto copied = copyFile(file, withHome(target));
+    const auto copied = host::copyFile(file, withHome(target));
     if (!copied) {
         return std::unexpected(copied.error());
     }

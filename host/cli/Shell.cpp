@@ -1,8 +1,8 @@
 #include "host/cli/Shell.h"
 
-#include "host/cli/DeviceLocation.h"
 #include "host/cli/ShellWords.h"
 #include "host/cli/TextLayout.h"
+#include "host/core/DeviceLocation.h"
 #include "host/core/PaneSession.h"
 
 #include <algorithm>
@@ -75,7 +75,7 @@ int Shell::run() {
 int Shell::runAtTerminal() {
     _out << "The page is open. \"list\" shows its rows, \"help\" all commands.\n";
     LineEditor editor({.prompt = "nimbra> ",
-                       .history = stateDirectory() / "history",
+                       .history = host::stateDirectory() / "history",
                        .wakeUpDescriptor = _session.loop().wakeUpDescriptor(),
                        .whenWoken = [this] { return takeChanges(); },
                        .complete = [this](std::string_view line) { return completionsFor(line); }});

@@ -1,5 +1,4 @@
 #include "device/DevicePlatform.h"
-#include "device/store/DeviceAccountStore.h"
 #include "host/cli/Arguments.h"
 #include "host/cli/Completion.h"
 #include "host/cli/DeviceLocation.h"
@@ -10,6 +9,8 @@
 #include "host/cli/Shell.h"
 #include "host/cli/TextLayout.h"
 #include "host/cli/WatchCommand.h"
+#include "host/core/AccountCheck.h"
+#include "host/core/DeviceLocation.h"
 #include "host/core/PaneSession.h"
 
 #include <algorithm>
@@ -29,24 +30,8 @@ std::unexpected<Failure> badInput(const std::string& message) {
     return std::unexpected(Failure{exitBadInput, message});
 }
 
-/// Says which accounts there are when the device has none called `account`.
-Outcome checkAccount(host::PaneSession& session, const std::string& account) {
-    const auto known = session.device().accountStore().accountIdentifiers();
-    if (!known) {
-        return badInput(known.error().description);
-    }
-    if (std::ranges::find(*known, AccountIdentifier(account)) != known->end()) {
-        return {};
-    }
-    std::string list;
-    for (const AccountIdentifier& identifier : *known) {
-        list += (list.empty() ? "\"" : ", \"") + identifier.string() + '"';
-    }
-    return badInput("no account \"" + account + "\" (accounts: " + list + ')');
-}
-
 SessionOutcome openPane(const Arguments& arguments) {
-    const auto root = arguments.root.value_or(defaultDeviceDirectory());
+    const auto root = arguments.root.value_or(host::defaultDeviceDirectory());
     if (const auto provided = provideDevice(root, std::cerr); !provided) {
         return std::unexpected(provided.error());
     }
@@ -56,8 +41,8 @@ SessionOutcome openPane(const Arguments& arguments) {
         return badInput(session.error().description);
     }
     if (arguments.account) {
-        if (const auto known = checkAccount(**session, *arguments.account); !known) {
-            return std::unexpected(known.error());
+        if (const auto known = host::checkAccount(**session, *arguments.account); !known) {
+            return badInput(known.error().description);
         }
     }
     const auto opened =
@@ -118,7 +103,8 @@ Outcome runOnPane(const Arguments& arguments) {
 void printRows(const Arguments& arguments,
                std::vector<std::string> (PaneCommands::*names)() const) {
     std::error_code ignored;
-    if (!std::filesystem::exists(arguments.root.value_or(defaultDeviceDirectory()), ignored)) {
+    if (!std::filesystem::exists(arguments.root.value_or(host::defaultDeviceDirectory()),
+                                 ignored)) {
         return;
     }
     if (const auto session = openPane(arguments)) {

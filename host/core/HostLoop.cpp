@@ -62,6 +62,7 @@ void HostLoop::async(Work work) {
     {
         const std::scoped_lock lock(_mutex);
         _pending.push_back(std::move(work));
+        ++_queued;
     }
     _wakeUp->signal();
 }
@@ -102,12 +103,35 @@ bool HostLoop::runPending() {
         piece();
         piece = nullptr;
         _turnObserver();
+        const std::scoped_lock lock(_mutex);
+        ++_ended;
     }
     return hadWork;
 }
 
-void HostLoop::runUntilIdle(device::DeviceWorkQueues& queues) {
+void HostLoop::follow(device::DeviceWorkQueues& queues) {
     queues.setIdleObserver([wakeUp = _wakeUp] { wakeUp->signal(); });
+}
+
+bool HostLoop::isIdle(const device::DeviceWorkQueues& queues) const {
+    std::size_t before = 0;
+    {
+        const std::scoped_lock lock(_mutex);
+        before = _queued;
+        if (_ended != _queued) {
+            return false;
+        }
+    }
+    if (!queues.isIdle()) {
+        return false;
+    }
+    // Where nothing has come since, nothing ran here while the queues were found idle.
+    const std::scoped_lock lock(_mutex);
+    return _queued == before;
+}
+
+void HostLoop::runUntilIdle(device::DeviceWorkQueues& queues) {
+    follow(queues);
     while (true) {
         if (runPending()) {
             continue;
@@ -119,7 +143,6 @@ void HostLoop::runUntilIdle(device::DeviceWorkQueues& queues) {
         }
         _wakeUp->wait();
     }
-    queues.setIdleObserver({});
 }
 
 bool HostLoop::isEmpty() const {

@@ -2,6 +2,7 @@
 
 #include "platform/system/WorkQueue.h"
 
+#include <cstddef>
 #include <deque>
 #include <functional>
 #include <memory>
@@ -29,9 +30,18 @@ public:
     void async(Work work) override;
     void sync(Work work) override;
 
-    /// A file descriptor that is readable while work is queued, for the caller's own `poll`; the
-    /// `run` operations take its signal back. Owned by the loop.
+    /// A file descriptor that is readable while work is queued, and once `queues` that are followed
+    /// have become idle, for the caller's own `poll`; the `run` operations take its signal back.
+    /// Owned by the loop.
     [[nodiscard]] int wakeUpDescriptor() const;
+
+    /// From now on wakes up also each time `queues` become idle, although they may have handed
+    /// nothing over: whoever waits for the end of everything asks `isIdle` then. It takes the place
+    /// of the queues' idle observer.
+    void follow(device::DeviceWorkQueues& queues);
+    /// Whether nothing is left to do, at one moment: no work is queued or under way here nor on
+    /// `queues`. It is not idle while it runs the work that asks. Any thread.
+    [[nodiscard]] bool isIdle(const device::DeviceWorkQueues& queues) const;
 
     /// Calls `observer` at the start of each run and after each piece of work: what follows what
     /// the main queue has done stands before what it does next.
@@ -42,7 +52,7 @@ public:
     bool runPending();
 
     /// Runs work, waiting for more, until none is queued here and `queues` are idle: what the
-    /// background hands over at its end is run, too.
+    /// background hands over at its end is run, too. It follows `queues` from then on.
     void runUntilIdle(device::DeviceWorkQueues& queues);
 
 private:
@@ -55,6 +65,9 @@ private:
     std::shared_ptr<WakeUp> _wakeUp;
     mutable std::mutex _mutex;
     std::deque<Work> _pending;
+    /// How many pieces of work have come, and how many of them have ended.
+    std::size_t _queued = 0;
+    std::size_t _ended = 0;
     std::function<void()> _turnObserver = [] {};
 };
 

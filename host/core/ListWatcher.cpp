@@ -2,49 +2,45 @@
 
 namespace nimbra::host {
 
-void ListWatcher::didBeginUpdates() {
-    if (_next != nullptr) {
-        _next->didBeginUpdates();
+template <class... Parameters, class... Arguments>
+void ListWatcher::tell(void (SettingsListObserver::*change)(Parameters...),
+                       const Arguments&... arguments) {
+    for (SettingsListObserver* const other : _others) {
+        if (other != nullptr) {
+            (other->*change)(arguments...);
+        }
     }
+}
+
+void ListWatcher::didBeginUpdates() {
+    tell(&SettingsListObserver::didBeginUpdates);
 }
 
 void ListWatcher::didEndUpdates() {
-    if (_next != nullptr) {
-        _next->didEndUpdates();
-    }
+    tell(&SettingsListObserver::didEndUpdates);
 }
 
 void ListWatcher::didInsert(const SpecifierArray& rows, const Specifier& after, bool animated) {
-    if (_next != nullptr) {
-        _next->didInsert(rows, after, animated);
-    }
+    tell(&SettingsListObserver::didInsert, rows, after, animated);
     _rowsChanged();
 }
 
 void ListWatcher::didAppend(const SpecifierArray& rows, bool animated) {
-    if (_next != nullptr) {
-        _next->didAppend(rows, animated);
-    }
+    tell(&SettingsListObserver::didAppend, rows, animated);
     _rowsChanged();
 }
 
 void ListWatcher::didRemove(const SpecifierArray& rows, bool animated) {
-    if (_next != nullptr) {
-        _next->didRemove(rows, animated);
-    }
+    tell(&SettingsListObserver::didRemove, rows, animated);
     _rowsChanged();
 }
 
 void ListWatcher::didReloadRow(const Specifier& row, bool animated) {
-    if (_next != nullptr) {
-        _next->didReloadRow(row, animated);
-    }
+    tell(&SettingsListObserver::didReloadRow, row, animated);
 }
 
 void ListWatcher::didReload(const SpecifierArray& rows) {
-    if (_next != nullptr) {
-        _next->didReload(rows);
-    }
+    tell(&SettingsListObserver::didReload, rows);
     _rowsChanged();
 }
 

@@ -2,19 +2,22 @@
 
 #include "platform/host/SettingsListObserver.h"
 
+#include <array>
 #include <functional>
 #include <utility>
 
 namespace nimbra::host {
 
-/// Says that rows may have come or gone, and hands each change of the list on. Main queue.
+/// Says that rows may have come or gone, after it has handed each change of the list on. Main
+/// queue.
 class ListWatcher final : public SettingsListObserver {
 public:
     explicit ListWatcher(std::function<void()> rowsChanged)
         : _rowsChanged(std::move(rowsChanged)) {}
 
-    /// Who is told of each change as well, before; null for nobody. Not owned.
-    void setNext(SettingsListObserver* next) { _next = next; }
+    /// Who writes each change down, and who is told of it then; null for nobody. Not owned.
+    void setTracer(SettingsListObserver* tracer) { _others.front() = tracer; }
+    void setNext(SettingsListObserver* next) { _others.back() = next; }
 
     void didBeginUpdates() override;
     void didEndUpdates() override;
@@ -25,8 +28,11 @@ public:
     void didReload(const SpecifierArray& rows) override;
 
 private:
+    template <class... Parameters, class... Arguments>
+    void tell(void (SettingsListObserver::*change)(Parameters...), const Arguments&... arguments);
+
     std::function<void()> _rowsChanged;
-    SettingsListObserver* _next = nullptr;
+    std::array<SettingsListObserver*, 2> _others{};
 };
 
 } // namespace nimbra::host

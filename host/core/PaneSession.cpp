@@ -25,8 +25,11 @@ std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configurat
         return std::unexpected(device.error());
     }
     session->_device = std::move(*device);
-    session->_services.emplace(
-        session->_device->servicesFor({*session, session->_viewMetrics, session->_viewAnimations}));
+    session->_loop.follow(session->_device->workQueues());
+    ViewMetrics* const viewMetrics = session->_configuration.viewMetrics;
+    session->_services.emplace(session->_device->servicesFor(
+        {*session, viewMetrics != nullptr ? *viewMetrics : session->_fixedViewMetrics,
+         session->_viewAnimations}));
     if (const auto& locale = session->_configuration.locale) {
         session->_device->settings().overrideLocale(*locale);
     }
@@ -69,11 +72,13 @@ void PaneSession::runPending() {
     layOut();
 }
 
+bool PaneSession::isSettled() const {
+    return _loop.isIdle(_device->workQueues());
+}
+
 void PaneSession::layOut() {
-    // What a terminal shows has no width in points: this is a phone's.
-    constexpr double listWidth = 390;
     if (_footers) {
-        _footers->layOut(listWidth);
+        _footers->layOut(_listWidth);
     }
     _presentations.layOut();
 }
@@ -85,7 +90,7 @@ void PaneSession::replaceTexts(std::map<std::string, std::string> texts) {
     }
 }
 
-std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
+std::expected<void, Error> PaneSession::openAccountPage(const PaneEntry& entry) {
     if (const auto loaded = loadBundle(); !loaded) {
         return loaded;
     }
@@ -99,13 +104,21 @@ std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
     const Text title =
         _bundle->localizedStringForKeyValueTable("CLOUD_DRIVE", "Nimbra Drive", "Localizable");
     _accountPage = std::make_shared<AccountPage>(services, title, paneClass, std::move(*userInfo));
-    _pane = paneClass.create(services);
+    return {};
+}
+
+std::expected<void, Error> PaneSession::openPane(const PaneEntry& entry) {
+    if (auto opened = openAccountPage(entry); !opened) {
+        return opened;
+    }
+    const PlatformServices services = servicesForPane();
+    _pane = _bundle->principalClass().create(services);
     _pane->setSpecifier(_accountPage->entryRow());
     _pane->setParentController(_accountPage);
     _pane->setRootController(_rootController);
     if (_tracer) {
         _tracer->observeParent(*_accountPage);
-        _listWatcher.setNext(&_tracer->listObserver());
+        _listWatcher.setTracer(&_tracer->listObserver());
     }
     _pane->setObserver(&_listWatcher);
     _footers = std::make_unique<GroupFooters>(_device->classes(), services, _device->systemLog());
@@ -193,43 +206,48 @@ std::expected<std::shared_ptr<Specifier>, RowRefusal> PaneSession::row(std::stri
     return findRow(rows(), name);
 }
 
-std::expected<std::shared_ptr<Specifier>, RowRefusal>
-PaneSession::uncoveredRow(std::string_view name) {
-    auto found = row(name);
+std::expected<void, RowRefusal> PaneSession::uncoverRows() {
     // A share sheet may stand beside the list.
-    if (found && (_presentations.alert() != nullptr || _presentations.screen())) {
+    if (_presentations.alert() != nullptr || _presentations.screen()) {
         return std::unexpected(refusalOfCoveredPage());
     }
-    if (found) {
-        _detailPage.leave();
-    }
-    return found;
+    _detailPage.leave();
+    return {};
 }
 
 std::expected<void, RowRefusal> PaneSession::setRow(std::string_view name, bool isOn) {
-    const auto found = uncoveredRow(name);
-    if (!found) {
-        return std::unexpected(found.error());
+    const auto found = row(name);
+    return found ? setRow(*found, isOn) : std::unexpected(found.error());
+}
+
+std::expected<void, RowRefusal> PaneSession::setRow(const std::shared_ptr<Specifier>& row,
+                                                    bool isOn) {
+    if (auto uncovered = uncoverRows(); !uncovered) {
+        return uncovered;
     }
-    if (auto refusal = refusalToSet(**found)) {
+    if (auto refusal = refusalToSet(*row)) {
         return std::unexpected(std::move(*refusal));
     }
-    (*found)->setValue(isOn);
+    row->setValue(isOn);
     return {};
 }
 
 std::expected<void, RowRefusal> PaneSession::tapRow(std::string_view name) {
-    const auto found = uncoveredRow(name);
-    if (!found) {
-        return std::unexpected(found.error());
+    const auto found = row(name);
+    return found ? tapRow(*found) : std::unexpected(found.error());
+}
+
+std::expected<void, RowRefusal> PaneSession::tapRow(const std::shared_ptr<Specifier>& row) {
+    if (auto uncovered = uncoverRows(); !uncovered) {
+        return uncovered;
     }
-    if (auto refusal = refusalToTap(**found)) {
+    if (auto refusal = refusalToTap(*row)) {
         return std::unexpected(std::move(*refusal));
     }
-    if ((*found)->cellType() == LinkListCell) {
-        openDetail(*found);
+    if (row->cellType() == LinkListCell) {
+        openDetail(row);
     } else {
-        (*found)->performButtonAction();
+        row->performButtonAction();
     }
     return {};
 }
@@ -251,6 +269,10 @@ void PaneSession::post(const Notification& notification) {
 
 void PaneSession::postDistributed(const Notification& notification) {
     _services->distributedNotificationCenter->postNotification(notification);
+}
+
+void PaneSession::setListObserver(SettingsListObserver* observer) {
+    _listWatcher.setNext(observer);
 }
 
 void PaneSession::setActivityObserver(std::function<void()> observer) {

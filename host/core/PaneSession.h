@@ -54,6 +54,9 @@ public:
         Trace* trace = nullptr;
         /// What the device takes its time from; null for the machine's time.
         std::shared_ptr<device::TimeSource> timeSource;
+        /// How large what the host draws comes out; null for a host without a screen. Not owned,
+        /// outlives the session.
+        ViewMetrics* viewMetrics = nullptr;
     };
 
     /// Starts using the device. An error names the file that cannot be used.
@@ -75,9 +78,20 @@ public:
     void settle();
     /// Runs the work that is queued now, and lays out what asks for it.
     void runPending();
+    /// Whether nothing is left to do anywhere, as after `settle`. Who runs the main queue with
+    /// `runPending`, whenever the loop's `wakeUpDescriptor` is readable, asks afterwards: the last
+    /// background work to end wakes it up as well. Any thread.
+    [[nodiscard]] bool isSettled() const;
 
     /// Uses `texts` as the pane's own string table in every language, from now on.
     void replaceTexts(std::map<std::string, std::string> texts);
+
+    /// Makes the page of the account from which the pane is opened; no pane is open before. An
+    /// error names what is missing.
+    [[nodiscard]] std::expected<void, Error> openAccountPage(const PaneEntry& entry);
+    /// The page of the account; null where neither it nor the pane has been opened, and after the
+    /// pane has been closed.
+    [[nodiscard]] const std::shared_ptr<AccountPage>& accountPage() const { return _accountPage; }
 
     /// Opens the pane from the row of the account's page: it has its view and its rows then. No
     /// pane is open before. An error names what is missing.
@@ -85,6 +99,13 @@ public:
     [[nodiscard]] bool isPaneOpen() const { return _pane != nullptr; }
     /// Dismisses the open pane, which disappears first if it is shown, and lets it go.
     void closePane();
+
+    /// Sets who is told of each change of the pane's list, also of panes that are opened later;
+    /// null for nobody. Not owned: to be taken back before it goes.
+    void setListObserver(SettingsListObserver* observer);
+    /// Lays the list out `width` points wide from the next layout on; a phone's width to begin
+    /// with.
+    void setListWidth(double width) { _listWidth = width; }
 
     /// What the pane is busy with, as it says; absent while it is not.
     [[nodiscard]] const Text& activity() const { return _activity; }
@@ -111,8 +132,11 @@ public:
     /// The row that `name` stands for.
     [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal> row(std::string_view name);
     [[nodiscard]] std::expected<void, RowRefusal> setRow(std::string_view name, bool isOn);
+    [[nodiscard]] std::expected<void, RowRefusal> setRow(const std::shared_ptr<Specifier>& row,
+                                                         bool isOn);
     /// Presses a button row, or opens the page of a link row; one without a page opens nothing.
     [[nodiscard]] std::expected<void, RowRefusal> tapRow(std::string_view name);
+    [[nodiscard]] std::expected<void, RowRefusal> tapRow(const std::shared_ptr<Specifier>& row);
 
     // What happens on the device, pane or no pane.
 
@@ -138,9 +162,8 @@ private:
     void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) override;
     void presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool animated) override;
 
-    /// The row, where the user can reach it now; from a page behind a link the user comes back.
-    [[nodiscard]] std::expected<std::shared_ptr<Specifier>, RowRefusal>
-    uncoveredRow(std::string_view name);
+    /// Comes back from a page behind a link to the rows, where the user can reach them now.
+    [[nodiscard]] std::expected<void, RowRefusal> uncoverRows();
     void openDetail(const std::shared_ptr<Specifier>& row);
     void setActivity(Text activity);
     void updateFootersSoon();
@@ -154,7 +177,7 @@ private:
     Configuration _configuration;
     HostLoop _loop;
     device::CurrentQueueScope _scope;
-    FixedViewMetrics _viewMetrics;
+    FixedViewMetrics _fixedViewMetrics;
     ViewAnimations _viewAnimations;
     /// The device's own services, not traced.
     std::optional<PlatformServices> _services;
@@ -167,6 +190,8 @@ private:
     std::shared_ptr<AccountPage> _accountPage;
     std::shared_ptr<SettingsListController> _pane;
     ListWatcher _listWatcher;
+    /// What a terminal shows has no width in points: this is a phone's.
+    double _listWidth = 390;
     std::unique_ptr<GroupFooters> _footers;
     Presentations _presentations;
     DetailPage _detailPage;

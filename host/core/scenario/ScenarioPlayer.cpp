@@ -69,20 +69,37 @@ ScenarioPlayer::ScenarioPlayer(const Scenario& scenario, PaneSession& session,
       _trace(trace) {}
 
 std::expected<void, StepFailure> ScenarioPlayer::play() {
-    applyToSession(_scenario.device);
+    begin();
     std::expected<void, StepFailure> result;
-    for (std::size_t index = 0; result && index < _scenario.steps.size(); ++index) {
-        const ScenarioStep& step = _scenario.steps[index];
-        _trace.write("step", {{"index", index}, {"do", step.name}});
-        const Outcome outcome = perform(step);
+    while (result && hasNext()) {
+        result = performNext();
         _session.settle();
-        if (!outcome) {
-            result = std::unexpected(StepFailure{index, step.name, outcome.error()});
-        }
     }
-    // That the session then closes a pane that is still open is no step's doing.
-    _trace.end();
+    end();
     return result;
+}
+
+void ScenarioPlayer::begin() {
+    applyToSession(_scenario.device);
+}
+
+bool ScenarioPlayer::hasNext() const {
+    return _next < _scenario.steps.size();
+}
+
+std::expected<void, StepFailure> ScenarioPlayer::performNext() {
+    const std::size_t index = _next++;
+    const ScenarioStep& step = _scenario.steps[index];
+    _trace.write("step", {{"index", index}, {"do", step.name}});
+    if (const Outcome outcome = perform(step); !outcome) {
+        _next = _scenario.steps.size();
+        return std::unexpected(StepFailure{index, step.name, outcome.error()});
+    }
+    return {};
+}
+
+void ScenarioPlayer::end() {
+    _trace.end();
 }
 
 void ScenarioPlayer::applyToSession(const device::GivenDescription& given) {

@@ -25,8 +25,8 @@ struct StepFailure {
     std::string reason;
 };
 
-/// Does the steps of a scenario on a session, one after the other, the way a person would. After
-/// each step it waits until nothing is left to do. Main queue.
+/// Does the steps of a scenario on a session, one after the other, the way a person would: all with
+/// `play`, or each when its time has come, for a host that must not be kept waiting. Main queue.
 class ScenarioPlayer {
 public:
     /// `session` uses the device that was made from the scenario's description, on which
@@ -35,8 +35,22 @@ public:
     ScenarioPlayer(const Scenario& scenario, PaneSession& session,
                    RunningApplications& applications, device::StandingTime& time, Trace& trace);
 
-    /// Does all steps, or those up to the first that cannot be done, and ends the trace.
+    /// Does all steps, or those up to the first that cannot be done, and ends the trace. After each
+    /// step it waits until nothing is left to do.
     [[nodiscard]] std::expected<void, StepFailure> play();
+
+    // The same in steps, which the caller takes one after the other; it sees to it that the session
+    // settles after each.
+
+    /// Does what of the scenario's device stands in no file; before the first step.
+    void begin();
+    /// Whether a step is left to do; none after one that could not be done.
+    [[nodiscard]] bool hasNext() const;
+    /// Does the next step, which there is. It waits for nothing but where the step says so: the
+    /// pane has its list when it is open, and what falls due while the time goes by is done.
+    [[nodiscard]] std::expected<void, StepFailure> performNext();
+    /// Ends the trace: that the session then closes a pane that is still open is no step's doing.
+    void end();
 
 private:
     /// Nothing, or why the step could not be done.
@@ -78,6 +92,7 @@ private:
     RunningApplications& _applications;
     device::StandingTime& _time;
     Trace& _trace;
+    std::size_t _next = 0;
 };
 
 } // namespace nimbra::host

@@ -1,7 +1,7 @@
 #include "device/apps/SystemdUnits.h"
 
 #include "tests/device/apps/ManagerStandIn.h"
-#include "tests/device/apps/PrivateBus.h"
+#include "tests/support/PrivateBus.h"
 
 #include <chrono>
 #include <functional>

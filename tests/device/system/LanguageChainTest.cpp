@@ -32,5 +32,14 @@ TEST(LanguageChainTest, ALanguageThatNobodyKnowsIsLookedForAsItIs) {
     EXPECT_EQ(languageChain("xx-YY").back(), "xx");
 }
 
+TEST(LanguageChainTest, ATagIsOneFromItsBeginningToItsEnd) {
+    for (const char* const tag : {"de", "de-DE", "zh-Hant-TW", "de-DE-u-co-phonebk"}) {
+        EXPECT_TRUE(isLanguageTag(tag)) << tag;
+    }
+    for (const char* const other : {"", "de_DE", "de-", "german language", "de-DE-", "1"}) {
+        EXPECT_FALSE(isLanguageTag(other)) << other;
+    }
+}
+
 } // namespace
 } // namespace nimbra::device

@@ -4,6 +4,7 @@
 #include "device/system/DeviceWorkQueues.h"
 
 #include <atomic>
+#include <future>
 #include <gtest/gtest.h>
 #include <memory>
 #include <poll.h>
@@ -17,6 +18,13 @@ namespace {
 bool isReadable(int descriptor) {
     pollfd request{.fd = descriptor, .events = POLLIN, .revents = 0};
     return ::poll(&request, 1, 0) == 1;
+}
+
+/// Waits for the descriptor; whether it became readable.
+bool becomesReadable(int descriptor) {
+    constexpr int farTooLong = 60'000;
+    pollfd request{.fd = descriptor, .events = POLLIN, .revents = 0};
+    return ::poll(&request, 1, farTooLong) == 1;
 }
 
 TEST(HostLoop, RunsWorkInTheOrderInWhichItCame) {
@@ -147,6 +155,112 @@ TEST(HostLoop, TakesWorkFromManyThreads) {
     loop.runUntilIdle(queues);
 
     EXPECT_EQ(runs, threads * pieces);
+}
+
+TEST(HostLoop, IsIdleOnlyBeforeWorkComesAndAfterItHasEnded) {
+    HostLoop loop;
+    const device::DeviceWorkQueues queues(loop);
+    bool wasIdleAtWork = true;
+    bool wasIdleElsewhere = true;
+    EXPECT_TRUE(loop.isIdle(queues));
+
+    loop.async([&] {
+        wasIdleAtWork = loop.isIdle(queues);
+        std::thread([&] { wasIdleElsewhere = loop.isIdle(queues); }).join();
+    });
+    EXPECT_FALSE(loop.isIdle(queues));
+    loop.runPending();
+
+    EXPECT_FALSE(wasIdleAtWork);
+    EXPECT_FALSE(wasIdleElsewhere);
+    EXPECT_TRUE(loop.isIdle(queues));
+}
+
+TEST(HostLoop, IsNotIdleWhileTheBackgroundIsAtWork) {
+    HostLoop loop;
+    device::DeviceWorkQueues queues(loop);
+    loop.follow(queues);
+    std::promise<void> end;
+    queues.serialQueueWithLabel("background")->async([&end] { end.get_future().wait(); });
+
+    EXPECT_FALSE(loop.runPending());
+    EXPECT_FALSE(loop.isIdle(queues));
+    EXPECT_FALSE(isReadable(loop.wakeUpDescriptor()));
+
+    // Although it hands nothing over.
+    end.set_value();
+    EXPECT_TRUE(becomesReadable(loop.wakeUpDescriptor()));
+    EXPECT_TRUE(loop.isIdle(queues));
+}
+
+TEST(HostLoop, WhoRunsItWhenItWakesUpSeesTheEndOfEverything) {
+    HostLoop loop;
+    device::DeviceWorkQueues queues(loop);
+    loop.follow(queues);
+    const auto background = queues.serialQueueWithLabel("background");
+    constexpr int hops = 200;
+    int done = 0;
+    std::function<void()> hop = [&] {
+        ++done;
+        // The last one ends in the background.
+        background->async([&, goesOn = done < hops] {
+            if (goesOn) {
+                loop.async([&] { hop(); });
+            }
+        });
+    };
+    loop.async([&] { hop(); });
+
+    while (!loop.isIdle(queues)) {
+        ASSERT_TRUE(becomesReadable(loop.wakeUpDescriptor()));
+        loop.runPending();
+    }
+
+    EXPECT_EQ(done, hops);
+}
+
+TEST(HostLoop, GoesOnFollowingTheQueuesThatItHasWaitedFor) {
+    HostLoop loop;
+    device::DeviceWorkQueues queues(loop);
+    loop.runUntilIdle(queues);
+
+    queues.serialQueueWithLabel("background")->async([] {});
+
+    EXPECT_TRUE(becomesReadable(loop.wakeUpDescriptor()));
+}
+
+TEST(HostLoop, IsNeverFoundIdleFromElsewhereWhileWorkGoesToAndFro) {
+    HostLoop loop;
+    device::DeviceWorkQueues queues(loop);
+    loop.follow(queues);
+    const auto background = queues.serialQueueWithLabel("background");
+    constexpr int hops = 5000;
+    std::atomic<int> done = 0;
+    std::function<void()> hop = [&] {
+        if (done < hops) {
+            background->async([&] {
+                loop.async([&] {
+                    ++done;
+                    hop();
+                });
+            });
+        }
+    };
+    std::promise<void> started;
+    hop();
+    int doneWhenIdle = 0;
+    std::thread watcher([&] {
+        started.set_value();
+        while (!loop.isIdle(queues)) {
+        }
+        doneWhenIdle = done;
+    });
+    started.get_future().wait();
+
+    loop.runUntilIdle(queues);
+    watcher.join();
+
+    EXPECT_EQ(doneWhenIdle, hops);
 }
 
 TEST(HostLoopDeathTest, AMainQueueThatWaitsForItselfStopsTheProgram) {

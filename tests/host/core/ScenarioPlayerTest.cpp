@@ -17,6 +17,7 @@
 #include <gtest/gtest.h>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace nimbra::host {
 namespace {
@@ -85,6 +86,65 @@ TEST_F(ScenarioPlayerTest, AnApplicationThatCannotBeStartedFailsTheStep) {
     EXPECT_EQ(played.error().index, 1U);
     EXPECT_EQ(played.error().reason,
               (elsewhere() / "run/nimbra").string() + ": cannot be made: Not a directory");
+}
+
+TEST_F(ScenarioPlayerTest, AStepOfItsOwnWaitsForNothing) {
+    const auto scenario =
+        readScenario(R"({"device": {"accounts": [{"identifier": "primary", "usesStratafile": true,
+                                                  "enabled": ["kAccountDataclassTidewater"]}]},
+                         "steps": [{"do": "open"}, {"do": "set", "row": "Nimbra Drive",
+                                                    "value": false}]})",
+                     "scenario");
+    ASSERT_TRUE(scenario) << scenario.error();
+    ASSERT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
+    std::vector<std::string> lines;
+    Trace trace([&lines](const std::string& line) { lines.push_back(line); });
+    const auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
+    const auto session = PaneSession::start(
+        {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
+    ASSERT_TRUE(session) << session.error();
+    RunningApplications applications(root());
+    ScenarioPlayer player(*scenario, **session, applications, *time, trace);
+
+    player.begin();
+    ASSERT_TRUE(player.hasNext());
+    ASSERT_TRUE(player.performNext());
+    ASSERT_TRUE(player.hasNext());
+    ASSERT_TRUE(player.performNext());
+
+    EXPECT_FALSE(player.hasNext());
+    // The save is yet to be told of.
+    EXPECT_FALSE((*session)->isSettled());
+    (*session)->settle();
+    EXPECT_TRUE((*session)->isSettled());
+    player.end();
+    const auto written = lines.size();
+    (*session)->closePane();
+    EXPECT_EQ(lines.size(), written);
+}
+
+TEST_F(ScenarioPlayerTest, NoStepIsLeftAfterOneThatCannotBeDone) {
+    const auto scenario =
+        readScenario(R"({"steps": [{"do": "list"}, {"do": "open"}]})", "scenario");
+    ASSERT_TRUE(scenario) << scenario.error();
+    ASSERT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
+    Trace trace([](const std::string&) {});
+    const auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
+    const auto session = PaneSession::start(
+        {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
+    ASSERT_TRUE(session) << session.error();
+    RunningApplications applications(root());
+    ScenarioPlayer player(*scenario, **session, applications, *time, trace);
+    player.begin();
+
+    const auto done = player.performNext();
+
+    ASSERT_FALSE(done);
+    EXPECT_EQ(done.error().index, 0U);
+    EXPECT_EQ(done.error().name, "list");
+    EXPECT_EQ(done.error().reason, "no pane is open");
+    EXPECT_FALSE(player.hasNext());
+    EXPECT_FALSE((*session)->isPaneOpen());
 }
 
 TEST(ScenarioReading, AShareStepSaysHowTheUserLeavesTheSheet) {

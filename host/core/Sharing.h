@@ -4,8 +4,9 @@
 #include <filesystem>
 #include <optional>
 #include <string>
+#include <sys/types.h>
 
-namespace nimbra::cli {
+namespace nimbra::host {
 
 // Ways to share a file of this machine. A failure is told in one line.
 
@@ -19,8 +20,18 @@ copyFile(const std::filesystem::path& file, const std::filesystem::path& target)
 /// none.
 [[nodiscard]] std::optional<std::filesystem::path> findMailProgram();
 
+/// Has `program` begin a mail with `file` in it, without waiting for it. Gives back the process,
+/// a child of this one, which `awaitMail` is then called for.
+[[nodiscard]] std::expected<pid_t, std::string> beginMail(const std::filesystem::path& program,
+                                                          const std::filesystem::path& file);
+
+/// Waits until the `process` of `program` has ended, and takes its status: whether the mail was
+/// begun. Who must not wait watches the process and calls this at its end.
+[[nodiscard]] std::expected<void, std::string> awaitMail(const std::filesystem::path& program,
+                                                         pid_t process);
+
 /// Has `program` begin a mail with `file` in it, and waits until it has.
 [[nodiscard]] std::expected<void, std::string> handToMail(const std::filesystem::path& program,
                                                           const std::filesystem::path& file);
 
-} // namespace nimbra::cli
+} // namespace nimbra::host

@@ -1,4 +1,4 @@
-#include "tests/device/apps/PrivateBus.h"
+#include "tests/support/PrivateBus.h"
 
 #include "tests/device/TestFiles.h"
 

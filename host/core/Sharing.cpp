@@ -1,4 +1,4 @@
-#include "host/cli/Sharing.h"
+#include "host/core/Sharing.h"
 
 #include "device/files/Descriptor.h"
 #include "device/system/SpawnSettings.h"
@@ -15,7 +15,7 @@
 #include <system_error>
 #include <unistd.h>
 
-namespace nimbra::cli {
+namespace nimbra::host {
 
 namespace {
 
@@ -134,7 +134,7 @@ std::optional<std::filesystem::path> findMailProgram() {
     return std::nullopt;
 }
 
-std::expected<void, std::string> handToMail(const std::filesystem::path& program,
+std::expected<pid_t, std::string> beginMail(const std::filesystem::path& program,
                                             const std::filesystem::path& file) {
     // It may stay, and is to keep nothing of this program's.
     const device::SpawnActions actions;
@@ -145,6 +145,10 @@ std::expected<void, std::string> handToMail(const std::filesystem::path& program
                                           attributes.get(), arguments.get(), environ)) {
         return refused(program, failure);
     }
+    return process;
+}
+
+std::expected<void, std::string> awaitMail(const std::filesystem::path& program, pid_t process) {
     int status = 0;
     while (::waitpid(process, &status, 0) < 0) {
         if (errno != EINTR) {
@@ -157,4 +161,10 @@ std::expected<void, std::string> handToMail(const std::filesystem::path& program
     return {};
 }
 
-} // namespace nimbra::cli
+std::expected<void, std::string> handToMail(const std::filesystem::path& program,
+                                            const std::filesystem::path& file) {
+    const auto process = beginMail(program, file);
+    return process ? awaitMail(program, *process) : std::unexpected(process.error());
+}
+
+} // namespace nimbra::host
