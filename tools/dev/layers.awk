@@ -29,7 +29,7 @@ BEGIN {
     library("spdlog/|fmt/", "device")
     library("systemd/|sdbus-c[+][+]/", "device")
     library("nlohmann/", "device host/core host/cli host/qt tools")
-    library("CLI/", "host/cli tools")
+    library("CLI/", "host/cli host/qt tools")
     library("histedit|editline/", "host/cli")
 
     # These need nothing but the standard library and POSIX.

@@ -1,0 +1,34 @@
+#include "host/qt/Screenshot.h"
+
+#include "host/core/PaneSession.h"
+
+#include <QQuickWindow>
+#include <chrono>
+#include <utility>
+
+namespace nimbra::window {
+
+Screenshot::Screenshot(QQuickWindow& window, host::PaneSession& session)
+    : _window(window), _session(session) {
+    // Longer than the pause between any two frames of what moves.
+    _timer.setInterval(std::chrono::milliseconds(80));
+    connect(&_timer, &QTimer::timeout, this, &Screenshot::look);
+    _timer.start();
+}
+
+void Screenshot::look() {
+    constexpr int enough = 3;
+    constexpr int tooMany = 250;
+    const QImage picture = _window.grabWindow();
+    const QImage last = std::exchange(_last, picture);
+    _equals = _session.isSettled() && picture == last ? _equals + 1 : 0;
+    if (_equals == enough) {
+        _timer.stop();
+        Q_EMIT taken(picture);
+    } else if (++_looks == tooMany) {
+        _timer.stop();
+        Q_EMIT gaveUp();
+    }
+}
+
+} // namespace nimbra::window

@@ -1,0 +1,41 @@
+#pragma once
+
+#include <QImage>
+#include <QObject>
+#include <QTimer>
+#include <functional>
+
+class QQuickWindow;
+
+namespace nimbra::host {
+class PaneSession;
+}
+
+namespace nimbra::window {
+
+/// Takes a picture of a window once nothing moves on it any more. Main thread.
+class Screenshot final : public QObject {
+    Q_OBJECT
+
+public:
+    /// Begins to look at `window`, which shows `session`; both outlive it.
+    Screenshot(QQuickWindow& window, host::PaneSession& session);
+
+Q_SIGNALS:
+    /// Once: the window was the same over some time in which nothing was left to do.
+    void taken(const QImage& picture);
+    /// Once, instead: something still moved after a long time.
+    void gaveUp();
+
+private:
+    void look();
+
+    QQuickWindow& _window;
+    host::PaneSession& _session;
+    QTimer _timer;
+    QImage _last;
+    int _equals = 0;
+    int _looks = 0;
+};
+
+} // namespace nimbra::window

@@ -1,0 +1,226 @@
+#include "host/qt/SettingsHost.h"
+
+#include "device/DevicePlatform.h"
+#include "device/system/DeviceSettings.h"
+#include "host/core/AccountCheck.h"
+#include "host/core/BundleSearch.h"
+#include "host/core/DeviceLocation.h"
+#include "host/core/PaneSession.h"
+#include "host/qt/ApplicationIcons.h"
+#include "host/qt/Strings.h"
+
+#include <QGuiApplication>
+#include <QQmlContext>
+#include <QQuickItem>
+#include <QQuickWindow>
+#include <QUrl>
+#include <iostream>
+#include <utility>
+
+namespace nimbra::window {
+
+namespace {
+
+using Problem = std::unexpected<std::string>;
+
+/// What the user loses nothing by but a word later on; told where a terminal looks on.
+void warn(const std::expected<void, Error>& outcome) {
+    if (!outcome) {
+        std::cerr << "settingshost: " << outcome.error().description << '\n';
+    }
+}
+
+} // namespace
+
+std::expected<std::unique_ptr<SettingsHost>, std::string>
+SettingsHost::make(const Arguments& arguments) {
+    std::unique_ptr<SettingsHost> host(new SettingsHost(arguments));
+    if (auto started = host->start(arguments); !started) {
+        return Problem(std::move(started.error()));
+    }
+    return host;
+}
+
+SettingsHost::SettingsHost(const Arguments& arguments)
+    : _appearance(arguments.appearance), _openPanes(host::stateDirectory() / "settingshost"),
+      _trace([](const std::string&) {}) {}
+
+SettingsHost::~SettingsHost() {
+    // The window looks at the models until it has gone.
+    _engine.reset();
+    if (_session != nullptr && _session->isPaneOpen()) {
+        warn(_openPanes.closed());
+    }
+}
+
+void SettingsHost::closePane() {
+    _session->closePane();
+    _pump->run();
+}
+
+host::ScenarioPlayer* SettingsHost::player() {
+    return _scenario ? &_scenario->player() : nullptr;
+}
+
+std::expected<void, std::string> SettingsHost::start(const Arguments& arguments) {
+    _metrics.setTextScale(_appearance.textScale());
+    connect(&_appearance, &Appearance::textScaleChanged, this,
+            [this] { _metrics.setTextScale(_appearance.textScale()); });
+    if (auto started = startSession(arguments); !started) {
+        return started;
+    }
+    _bundle = arguments.bundle.value_or(host::findPaneBundle(_session->root()));
+    makeModels(arguments);
+    QString notice;
+    if (!_scenario) {
+        notice = noticeOfDied();
+        _keepsToAccount = !notice.isEmpty();
+        if (arguments.row && !_keepsToAccount) {
+            // Before there is a window: nothing slides then, and nothing below has to be made.
+            _pane->open();
+        }
+        if (!_pane->isOpen()) {
+            if (const auto shown = _pane->showAccount(); !shown) {
+                return Problem(shown.error().description);
+            }
+        }
+    }
+    return loadWindow(arguments, notice);
+}
+
+std::expected<void, std::string> SettingsHost::startSession(const Arguments& arguments) {
+    if (arguments.scenario) {
+        auto scenario = host::ScenarioSession::prepare({.file = arguments.scenario->string(),
+                                                        .bundle = arguments.bundle,
+                                                        .locale = arguments.locale,
+                                                        .viewMetrics = &_metrics},
+                                                       _trace);
+        if (!scenario) {
+            return Problem(scenario.error().description);
+        }
+        _scenario = std::move(*scenario);
+        _session = &_scenario->session();
+        return {};
+    }
+    const auto root = arguments.root.value_or(host::defaultDeviceDirectory());
+    const auto provided = host::provideDevice(root);
+    if (!provided) {
+        return Problem(provided.error().description);
+    }
+    if (*provided) {
+        std::cerr << "settingshost: made the sample device in " << root.string() << '\n';
+    }
+    auto session = host::PaneSession::start({.root = root,
+                                             .bundle = arguments.bundle,
+                                             .locale = arguments.locale,
+                                             .viewMetrics = &_metrics});
+    if (!session) {
+        return Problem(session.error().description);
+    }
+    _ownSession = std::move(*session);
+    _session = _ownSession.get();
+    if (arguments.account) {
+        if (const auto known = host::checkAccount(*_session, *arguments.account); !known) {
+            return Problem(known.error().description);
+        }
+    }
+    return {};
+}
+
+void SettingsHost::makeModels(const Arguments& arguments) {
+    _texts.emplace(_session->device().settings().localeIdentifier());
+    _pump.emplace(*_session);
+    const DrawnViews::Look look{
+        .metrics = _metrics,
+        .pictureUrl = [this](const std::string& name) { return pictureUrl(name); },
+        .isMirrored = _texts->isRightToLeft()};
+    _pane.emplace(*_session, *_pump,
+                  host::PaneEntry{.account = arguments.account, .firstSetup = arguments.firstSetup},
+                  look);
+    _screen.emplace(*_session, *_pump, look);
+    _sharing.emplace(*_session, *_pump, *_texts);
+    watchPane();
+}
+
+void SettingsHost::watchPane() {
+    if (_scenario) {
+        return;
+    }
+    // A pane may die while it opens.
+    connect(&*_pane, &PaneModel::paneOpening, this, [this](const QString& title) {
+        warn(_openPanes.opened(_session->root(), title.toStdString()));
+    });
+    connect(&*_pane, &PaneModel::paneClosed, this, [this] { warn(_openPanes.closed()); });
+    connect(qGuiApp, &QGuiApplication::applicationStateChanged, this,
+            [this](Qt::ApplicationState state) {
+                if (state == Qt::ApplicationActive) {
+                    _pane->becomeActive();
+                }
+            });
+}
+
+QString SettingsHost::noticeOfDied() {
+    const auto findings = _openPanes.takeDied(_session->root());
+    if (findings.problem) {
+        warn(std::unexpected(*findings.problem));
+    }
+    return findings.died ? _texts->text(QStringLiteral("died"), qString(findings.died->paneTitle))
+                         : QString();
+}
+
+std::expected<void, std::string> SettingsHost::loadWindow(const Arguments& arguments,
+                                                          const QString& notice) {
+    _engine.emplace();
+    _engine->addImageProvider(QLatin1String(ApplicationIcons::kProvider), new ApplicationIcons);
+    _engine->addImportPath(QStringLiteral("qrc:/qt/qml"));
+    QQmlContext* const context = _engine->rootContext();
+    context->setContextProperty(QStringLiteral("appearance"), &_appearance);
+    context->setContextProperty(QStringLiteral("texts"), &*_texts);
+    context->setContextProperty(QStringLiteral("pane"), &*_pane);
+    context->setContextProperty(QStringLiteral("presented"), &*_screen);
+    context->setContextProperty(QStringLiteral("sharing"), &*_sharing);
+
+    _engine->setInitialProperties({{QStringLiteral("width"), arguments.size.width()},
+                                   {QStringLiteral("height"), arguments.size.height()},
+                                   {QStringLiteral("notice"), notice}});
+    _engine->load(QUrl(QStringLiteral("qrc:/qt/qml/Nimbra/Window/qml/Main.qml")));
+    if (_engine->rootObjects().isEmpty()) {
+        return Problem("the window cannot be made");
+    }
+    _window = qobject_cast<QQuickWindow*>(_engine->rootObjects().constFirst());
+    // The platform says later how large the window is: until then a row is found by this.
+    _window->contentItem()->setSize(_window->size());
+    return {};
+}
+
+std::expected<void, std::string> SettingsHost::showRow(const std::string& name) {
+    if (_keepsToAccount) {
+        return {};
+    }
+    _pane->open();
+    if (!_pane->isOpen()) {
+        return Problem("the page cannot be opened");
+    }
+    if (const auto row = _session->row(name); !row) {
+        return Problem(row.error().explanation);
+    }
+    QVariant isShown;
+    QMetaObject::invokeMethod(_window, "showRow", Q_RETURN_ARG(QVariant, isShown),
+                              Q_ARG(QVariant, qString(name)));
+    return isShown.toBool() ? std::expected<void, std::string>()
+                            : Problem("the row cannot be shown");
+}
+
+QString SettingsHost::pictureUrl(const std::string& name) const {
+    // The one with the most pixels, as everywhere.
+    for (const char* const scale : {"@3x", "@2x", ""}) {
+        const auto file = _bundle / (name + scale + ".png");
+        std::error_code ignored;
+        if (std::filesystem::is_regular_file(file, ignored)) {
+            return QUrl::fromLocalFile(qString(file.string())).toString();
+        }
+    }
+    return {};
+}
+
+} // namespace nimbra::window

@@ -1,0 +1,143 @@
+import QtQuick
+import Nimbra.Window
+
+// Views where their page has put them.
+Item {
+    id: tree
+
+    property var views
+    // What they say together, for those who cannot see them; empty where each speaks for itself.
+    property string spokenText
+    property color ground: Theme.page
+    // How far down the lowest text comes that grows beyond its place.
+    property real textBottom: 0
+    signal touched(string button)
+
+    Accessible.role: Accessible.StaticText
+    Accessible.name: spokenText
+    Accessible.ignored: spokenText === ""
+
+    Repeater {
+        model: tree.views
+
+        Item {
+            id: view
+
+            required property string kind
+            required property rect frame
+            required property string text
+            required property string plainText
+            required property var textFont
+            required property real viewOpacity
+            required property var isEnabled
+            required property var progress
+            required property var isTurning
+            required property var source
+
+            readonly property bool isStatus: kind === "label" && tree.spokenText !== ""
+
+            onYChanged: reach()
+            onHeightChanged: reach()
+            function reach() {
+                if (isStatus)
+                    tree.textBottom = y + height;
+            }
+
+            // Frames are as for a reader from left to right.
+            x: texts.rightToLeft ? tree.width - frame.x - frame.width : frame.x
+            y: frame.y
+            width: frame.width
+            // Pages count one line for what they say of themselves; here it may take more.
+            height: isStatus ? Math.max(frame.height, loader.item ? loader.item.contentHeight : 0) : frame.height
+            opacity: viewOpacity
+            visible: opacity > 0
+
+            Behavior on opacity {
+                enabled: Theme.calm > 0
+                NumberAnimation {
+                    duration: Theme.calm
+                }
+            }
+
+            Loader {
+                id: loader
+
+                anchors.fill: parent
+                sourceComponent: view.kind === "label" ? label : (view.kind === "button" ? button : (view.kind === "bar" ? bar : (view.kind === "spinner" ? spinner : picture)))
+            }
+
+            Component {
+                id: label
+
+                Text {
+                    text: view.text
+                    textFormat: Text.RichText
+                    font: view.textFont
+                    color: tree.spokenText === "" ? Theme.text : Theme.faint
+                    LayoutMirroring.enabled: false
+                    // Of itself a rich text keeps standing in the width that it had at first.
+                    onWidthChanged: forceLayout()
+                    Accessible.role: Accessible.StaticText
+                    Accessible.name: view.plainText
+                    Accessible.ignored: tree.spokenText !== "" || view.plainText === ""
+                }
+            }
+            Component {
+                id: button
+
+                PushButton {
+                    objectName: "screenButton"
+                    title: view.plainText
+                    font: view.textFont
+                    enabled: view.isEnabled === true
+                    focus: true
+                    onPressed: tree.touched(view.plainText)
+                }
+            }
+            Component {
+                id: bar
+
+                Rectangle {
+                    radius: height / 2
+                    color: Theme.line
+
+                    Accessible.role: Accessible.ProgressBar
+                    Accessible.name: tree.spokenText
+
+                    Rectangle {
+                        x: texts.rightToLeft ? parent.width - width : 0
+                        width: parent.width * (view.progress || 0)
+                        height: parent.height
+                        radius: height / 2
+                        color: Theme.accent
+
+                        Behavior on width {
+                            enabled: Theme.calm > 0
+                            NumberAnimation {
+                                duration: Theme.calm
+                            }
+                        }
+                    }
+                }
+            }
+            Component {
+                id: spinner
+
+                Spinner {
+                    running: view.isTurning === true
+                }
+            }
+            Component {
+                id: picture
+
+                Image {
+                    source: view.source || ""
+                    fillMode: Image.PreserveAspectFit
+                    smooth: true
+                    mipmap: true
+                    Accessible.ignored: true
+                }
+            }
+        }
+    }
+}
