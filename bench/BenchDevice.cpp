@@ -30,6 +30,11 @@ T valueOf(std::expected<T, Error> result) {
 
 BenchDevice::BenchDevice(std::size_t applications)
     : _directory(valueOf(host::TemporaryDirectory::make())) {
+    valueOf(device::createDeviceDirectory(root(), describe(applications)));
+    reopen();
+}
+
+device::DeviceDescription BenchDevice::describe(std::size_t applications) {
     device::DeviceDescription description;
     description.accounts.at(0).enabled = {kAccountDataclassTidewater.string()};
     for (std::size_t index = 0; index < applications; ++index) {
@@ -43,8 +48,7 @@ BenchDevice::BenchDevice(std::size_t applications)
                                            .granted = false});
         }
     }
-    valueOf(device::createDeviceDirectory(root(), description));
-    reopen();
+    return description;
 }
 
 void BenchDevice::reopen() {

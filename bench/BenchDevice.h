@@ -1,5 +1,6 @@
 #pragma once
 
+#include "device/DeviceDescription.h"
 #include "device/DevicePlatform.h"
 #include "host/core/FixedViewMetrics.h"
 #include "host/core/HostLoop.h"
@@ -25,6 +26,9 @@ public:
     /// With so many applications, of which every second has consent records of both services and
     /// the others of cloud documents alone.
     explicit BenchDevice(std::size_t applications = 0);
+
+    /// Such a device, for whoever makes one elsewhere.
+    [[nodiscard]] static device::DeviceDescription describe(std::size_t applications);
 
     /// Ends the platform and opens it again: it knows nothing that it has read before.
     void reopen();
