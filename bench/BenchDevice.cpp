@@ -1,6 +1,7 @@
 #include "bench/BenchDevice.h"
 
 #include "bench/MemoryServices.h"
+#include "bench/ValueOf.h"
 #include "device/DeviceDirectory.h"
 #include "device/bundles/DeviceBundle.h"
 #include "device/bundles/DeviceBundles.h"
@@ -8,25 +9,7 @@
 #include "platform/privacy/PrivacyConsentStore.h"
 #include "platform/system/ClassRegistry.h"
 
-#include <stdexcept>
-#include <type_traits>
-#include <utility>
-
 namespace nimbra::bench {
-
-namespace {
-
-template <class T>
-T valueOf(std::expected<T, Error> result) {
-    if (!result) {
-        throw std::runtime_error(result.error().line());
-    }
-    if constexpr (!std::is_void_v<T>) {
-        return std::move(*result);
-    }
-}
-
-} // namespace
 
 BenchDevice::BenchDevice(std::size_t applications)
     : _directory(valueOf(host::TemporaryDirectory::make())) {

@@ -1,6 +1,7 @@
 #include "bench/window/BenchWindow.h"
 
 #include "bench/BenchDevice.h"
+#include "bench/ValueOf.h"
 #include "bench/window/Stopwatch.h"
 #include "device/DeviceDirectory.h"
 #include "host/core/PaneSession.h"
@@ -10,24 +11,9 @@
 #include <QTimer>
 #include <chrono>
 #include <stdexcept>
-#include <type_traits>
 #include <utility>
 
 namespace nimbra::bench {
-
-namespace {
-
-template <class T>
-T valueOf(std::expected<T, Error> result) {
-    if (!result) {
-        throw std::runtime_error(result.error().line());
-    }
-    if constexpr (!std::is_void_v<T>) {
-        return std::move(*result);
-    }
-}
-
-} // namespace
 
 BenchWindow::BenchWindow(std::size_t applications)
     : _directory(valueOf(host::TemporaryDirectory::make())) {
