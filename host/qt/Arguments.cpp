@@ -1,6 +1,7 @@
 #include "host/qt/Arguments.h"
 
 #include "device/system/LanguageChain.h"
+#include "host/core/ExitStatus.h"
 
 #include <CLI/CLI.hpp>
 #include <QString>
@@ -21,8 +22,6 @@ constexpr const char* description =
 constexpr const char* keys = "Keys: Tab and the arrows go from row to row, Space flips or presses, "
                              "Escape goes back,\n"
                              "F5 fetches anew, Ctrl+F searches, Ctrl+Q quits.";
-
-constexpr int exitBadInput = 2;
 
 /// The number that `word` is; nothing for what is none, or too small or large for a window.
 std::optional<int> extentOf(const QString& word) {
@@ -63,7 +62,7 @@ public:
             return _app.exit(error);
         }
         std::cerr << "settingshost: " << error.what() << " (see settingshost --help)\n";
-        return exitBadInput;
+        return host::exitBadInput;
     }
 
 private:

@@ -1,3 +1,4 @@
+#include "host/core/ExitStatus.h"
 #include "host/core/PaneSession.h"
 #include "host/core/scenario/TerminationGuard.h"
 #include "host/qt/ScenarioDrive.h"
@@ -23,8 +24,8 @@ namespace nimbra::window {
 
 namespace {
 
-constexpr int exitRefused = 1;
-constexpr int exitBadInput = 2;
+using host::exitBadInput;
+using host::exitRefused;
 
 int complain(const std::string& problem, int status) {
     std::cerr << "settingshost: " << problem << '\n';
