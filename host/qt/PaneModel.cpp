@@ -158,8 +158,12 @@ void PaneModel::setListWidth(qreal width) {
 }
 
 void PaneModel::becomeActive() {
-    if (isReplaceable() && host::AccountFlags::of(_session, _entry) != _account) {
-        openAnew();
+    if (isReplaceable()) {
+        auto account = host::AccountFlags::of(_session, _entry);
+        if (account != _account) {
+            _account = std::move(account);
+            openAnew();
+        }
     }
     _session.becomeActive();
     _pump.run();
@@ -176,7 +180,6 @@ void PaneModel::openAnew() {
     // Nobody asks the rows of the pane that goes, who are shown until the others come.
     _rows.rows().describeAll();
     _session.closePane();
-    _account = host::AccountFlags::of(_session, _entry);
     if (const auto opened = _session.openPane(_entry); !opened) {
         Q_EMIT failed(qString(opened.error().description));
         return;
