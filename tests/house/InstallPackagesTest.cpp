@@ -82,8 +82,22 @@ TEST_F(InstallPackages, AFailureShowsWhatTheInstallerSaid) {
     const CommandResult result = install("absent\n");
 
     EXPECT_EQ(result.status, 1);
-    EXPECT_EQ(result.output, "Installing absent\nno space left\n"
-                             "install-packages: could not install absent\n");
+    EXPECT_EQ(result.output, "Installing absent\n"
+                             "install-packages: could not install them: no space left\n");
+}
+
+TEST_F(InstallPackages, WithoutANetworkOneLineSaysSo) {
+    program("apt-get", R"sh(case $* in
+        *update) echo 'Err:1 somewhere'; echo 'W: Failed to fetch a: failure resolving b'
+                 echo 'W: Failed to fetch c: failure resolving b' ;;
+        *) echo 'Reading package lists...'; echo 'E: Unable to locate package absent'; exit 100 ;;
+        esac)sh");
+
+    const CommandResult result = install("absent\n");
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.output, "Installing absent\ninstall-packages: could not install them: "
+                             "W: Failed to fetch a: failure resolving b\n");
 }
 
 TEST_F(InstallPackages, WithoutRootItAsksSudo) {
@@ -95,6 +109,18 @@ TEST_F(InstallPackages, WithoutRootItAsksSudo) {
     EXPECT_EQ(result.status, 0);
     EXPECT_THAT(called(), HasSubstr("sudo -n\n"));
     EXPECT_THAT(called(), HasSubstr("install --no-install-recommends absent\n"));
+}
+
+TEST_F(InstallPackages, NothingIsBegunWhereSudoRefuses) {
+    program("id", "echo 1000");
+    program("sudo", "echo 'sudo: a password is required' >&2; exit 1");
+
+    const CommandResult result = install("absent\n");
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_EQ(result.output, "install-packages: sudo: a password is required; to be installed as "
+                             "root: absent\n");
+    EXPECT_THAT(called(), HasSubstr("No such file"));
 }
 
 TEST_F(InstallPackages, WithNeitherRootNorSudoItSaysWhatIsMissing) {
