@@ -122,6 +122,13 @@ TEST(DocsCheck, PlacesAndLinksThatAreNotThereAreFound) {
                 AllOf(HasSubstr(":1: host/tk/ is not there"), HasSubstr(":1: no.md is not there")));
 }
 
+TEST(DocsCheck, ADocumentThatIsNotThereIsFound) {
+    const CommandResult result = run({program, NIMBRA_BUILD_DIR, "no-such-page.md"});
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_THAT(result.output, HasSubstr("no-such-page.md: cannot be followed to its end"));
+}
+
 TEST(DocsCheck, TheExamplesOfAManualPageAreRun) {
     const std::string page = ".Sh NAME\n.Dl $ false\n.Sh EXAMPLES\n.Dl $ settingsctl get ";
     EXPECT_EQ(saidOf(page + "\\(dqUse Cellular Data\\(dq\n", "notes.1"), "");
