@@ -12,20 +12,24 @@ Item {
     implicitWidth: 8
     implicitHeight: 14
 
-    Repeater {
-        model: 2
-
-        Rectangle {
-            required property int index
-
-            x: (chevron.width - width) / 2
-            y: chevron.height / 2 - height / 2 + (index === 0 ? -2.9 : 2.9)
-            width: 9
-            height: 2
-            radius: 1
-            color: chevron.color
-            antialiasing: true
-            rotation: (index === 0) === chevron.pointsLeft ? -45 : 45
-        }
+    Rectangle {
+        x: (chevron.width - width) / 2
+        y: (chevron.height - height) / 2 - 2.9
+        width: 9
+        height: 2
+        radius: 1
+        color: chevron.color
+        antialiasing: true
+        rotation: chevron.pointsLeft ? -45 : 45
+    }
+    Rectangle {
+        x: (chevron.width - width) / 2
+        y: (chevron.height - height) / 2 + 2.9
+        width: 9
+        height: 2
+        radius: 1
+        color: chevron.color
+        antialiasing: true
+        rotation: chevron.pointsLeft ? 45 : -45
     }
 }

@@ -208,6 +208,23 @@ FocusScope {
                 page.refresh();
         }
 
+        // Around the card of the row that has the focus.
+        Rectangle {
+            readonly property Item row: list.currentItem
+
+            parent: list.contentItem
+            visible: row !== null && row.activeFocus
+            x: visible ? row.card.x + 1 : 0
+            y: visible ? row.y + row.card.y + 1 : 0
+            z: 2
+            width: visible ? row.card.width - 2 : 0
+            height: visible ? row.card.height - 2 : 0
+            radius: Theme.radius - 1
+            color: "transparent"
+            border.color: Theme.accent
+            border.width: Theme.strong ? 4 : 3
+        }
+
         delegate: RowItem {
             id: rowItem
 

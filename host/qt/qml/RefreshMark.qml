@@ -26,20 +26,24 @@ Item {
         height: 9
         color: mark.ground
     }
-    Repeater {
-        model: 2
-
-        Rectangle {
-            required property int index
-
-            x: 9.5
-            y: index === 0 ? 0.2 : 4.8
-            width: 8
-            height: 2
-            radius: 1
-            color: mark.color
-            antialiasing: true
-            rotation: index === 0 ? 45 : -45
-        }
+    Rectangle {
+        x: 9.5
+        y: 0.2
+        width: 8
+        height: 2
+        radius: 1
+        color: mark.color
+        antialiasing: true
+        rotation: 45
+    }
+    Rectangle {
+        x: 9.5
+        y: 4.8
+        width: 8
+        height: 2
+        radius: 1
+        color: mark.color
+        antialiasing: true
+        rotation: -45
     }
 }

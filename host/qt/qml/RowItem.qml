@@ -23,14 +23,26 @@ FocusScope {
     readonly property bool isGroup: kind === "group"
     readonly property bool isSwitch: kind === "switch"
     readonly property bool isUsable: !isLocked
+    readonly property alias card: card
     // Whether the user has been led here.
     property bool isLit: false
     property var list
     signal used
 
-    // Side by side where there is room, else the value below its title.
-    readonly property real room: card.width - 2 * Theme.gap - icon.space - marks.space
-    readonly property bool isStacked: valueLabel.text !== "" && titleLabel.implicitWidth + valueLabel.implicitWidth + 12 > room
+    readonly property real columnWidth: Math.min(width - 2 * Theme.gap, Theme.widestColumn)
+    readonly property real margin: (width - columnWidth) / 2
+
+    // What stands beside the title, from its leading edge: an icon; to its trailing edge: marks.
+    readonly property real iconSpace: application !== "" ? icon.width + 12 : 0
+    readonly property real lockSpace: isLocked ? 12 + 10 : 0
+    readonly property real markSpace: (isSwitch ? 52 + 12 : (kind === "link" ? 8 + 12 : 0)) + lockSpace
+    readonly property real room: columnWidth - 2 * Theme.gap - iconSpace - markSpace
+
+    // The value, side by side with the title where there is room, else below it.
+    readonly property real valueWidth: valueLoader.item ? valueLoader.item.implicitWidth : 0
+    readonly property real valueHeight: valueLoader.item ? valueLoader.item.height : 0
+    readonly property bool isStacked: valueWidth > 0 && titleLabel.implicitWidth + valueWidth + 12 > room
+    readonly property real labelsHeight: isStacked ? titleLabel.height + 4 + valueHeight : Math.max(titleLabel.height, valueHeight)
 
     function use() {
         if (!isUsable)
@@ -43,7 +55,7 @@ FocusScope {
     }
 
     width: ListView.view ? ListView.view.width : 320
-    implicitHeight: heading.height + card.height + below.height
+    implicitHeight: below.y + below.height
     activeFocusOnTab: false
     // The list keeps what it does not need for other rows: nobody is told of that.
     ListView.onPooled: visible = false
@@ -91,8 +103,8 @@ FocusScope {
 
                 anchors.bottom: parent.bottom
                 anchors.bottomMargin: 6
-                x: Theme.gap + column.margin
-                width: column.width - 2 * Theme.gap
+                x: row.margin + Theme.gap
+                width: row.columnWidth - 2 * Theme.gap
                 text: row.title
                 textFormat: Text.PlainText
                 color: Theme.faint
@@ -104,66 +116,42 @@ FocusScope {
         }
     }
 
-    QtObject {
-        id: column
-
-        readonly property real width: Math.min(row.width - 2 * Theme.gap, Theme.widestColumn)
-        readonly property real margin: (row.width - width) / 2
-    }
-
-    Item {
+    MouseArea {
         id: card
 
-        anchors.top: heading.bottom
-        x: column.margin
-        width: column.width
-        height: row.isGroup ? 0 : Math.max(52, Math.ceil(labels.implicitHeight) + 22)
+        x: row.margin
+        y: heading.height
+        width: row.columnWidth
+        height: row.isGroup ? 0 : Math.max(52, Math.ceil(row.labelsHeight) + 22)
         visible: !row.isGroup
         clip: true
+        onClicked: {
+            if (row.ListView.view)
+                row.ListView.view.focusRow(row.index, Qt.MouseFocusReason);
+            row.use();
+        }
 
         // Rounded where the card begins and ends; what is beyond is cut.
         Rectangle {
-            id: face
-
             y: row.isFirst ? 0 : -Theme.radius
             width: parent.width
             height: parent.height + (row.isFirst ? 0 : Theme.radius) + (row.isLast ? 0 : Theme.radius)
             radius: Theme.radius
-            color: area.pressed && row.isUsable ? Theme.pressed : (row.isLit ? Theme.lit : Theme.card)
+            color: card.pressed && row.isUsable ? Theme.pressed : (row.isLit ? Theme.lit : Theme.card)
             border.width: Theme.strong ? 1 : 0
             border.color: Theme.line
-
-            Behavior on color {
-                enabled: Theme.quick > 0 && !area.pressed
-                ColorAnimation {
-                    duration: Theme.quick
-                }
-            }
         }
         Rectangle {
-            anchors.right: parent.right
-            anchors.bottom: parent.bottom
-            width: parent.width - Theme.gap - icon.space
+            x: texts.rightToLeft ? 0 : parent.width - width
+            y: parent.height - 1
+            width: parent.width - Theme.gap - row.iconSpace
             height: 1
             color: Theme.line
             visible: !row.isLast
         }
 
-        MouseArea {
-            id: area
-
-            anchors.fill: parent
-            onClicked: {
-                if (row.ListView.view)
-                    row.ListView.view.focusRow(row.index, Qt.MouseFocusReason);
-                row.use();
-            }
-        }
-
         Image {
             id: icon
-
-            readonly property real space: row.application !== "" ? width + 12 : 0
 
             anchors.left: parent.left
             anchors.leftMargin: Theme.gap
@@ -175,39 +163,31 @@ FocusScope {
             sourceSize: Qt.size(64, 64)
             source: row.iconSource
         }
-
-        Item {
-            id: labels
+        Text {
+            id: titleLabel
 
             anchors.left: parent.left
-            anchors.leftMargin: Theme.gap + icon.space
+            anchors.leftMargin: Theme.gap + row.iconSpace
+            y: row.isStacked ? (parent.height - row.labelsHeight) / 2 : (parent.height - height) / 2
+            width: row.room - (row.isStacked || row.valueWidth === 0 ? 0 : row.valueWidth + 12)
+            text: row.title
+            textFormat: Text.PlainText
+            color: row.isLocked ? Theme.faint : (row.kind === "button" ? Theme.accent : Theme.text)
+            font.pixelSize: Theme.body
+            wrapMode: Text.Wrap
+            horizontalAlignment: Text.AlignLeft
+            Accessible.ignored: true
+        }
+        Loader {
+            id: valueLoader
+
             anchors.right: parent.right
-            anchors.rightMargin: Theme.gap + marks.space
-            anchors.verticalCenter: parent.verticalCenter
-            implicitHeight: row.isStacked ? titleLabel.height + 4 + valueLabel.height : Math.max(titleLabel.height, valueLabel.height)
-            height: implicitHeight
-
-            Text {
-                id: titleLabel
-
-                anchors.left: parent.left
-                width: parent.width - (row.isStacked || valueLabel.text === "" ? 0 : valueLabel.width + 12)
-                y: row.isStacked ? 0 : (parent.height - height) / 2
-                text: row.title
-                textFormat: Text.PlainText
-                color: row.isLocked ? Theme.faint : (row.kind === "button" ? Theme.accent : Theme.text)
-                font.pixelSize: Theme.body
-                wrapMode: Text.Wrap
-                horizontalAlignment: Text.AlignLeft
-                Accessible.ignored: true
-            }
-            Text {
-                id: valueLabel
-
-                x: row.isStacked || texts.rightToLeft ? 0 : parent.width - width
-                width: row.isStacked ? parent.width : implicitWidth
-                y: row.isStacked ? titleLabel.height + 4 : (parent.height - height) / 2
-                text: row.isSwitch ? "" : row.value
+            anchors.rightMargin: Theme.gap + row.markSpace
+            y: row.isStacked ? titleLabel.y + titleLabel.height + 4 : (parent.height - height) / 2
+            width: row.isStacked ? row.room : row.valueWidth
+            active: row.value !== "" && !row.isSwitch
+            sourceComponent: Text {
+                text: row.value
                 textFormat: Text.PlainText
                 color: Theme.faint
                 font.pixelSize: Theme.body
@@ -216,75 +196,54 @@ FocusScope {
                 Accessible.ignored: true
             }
         }
-
-        Item {
-            id: marks
-
-            readonly property real lockSpace: row.isLocked ? 12 + 10 : 0
-            readonly property real space: (row.isSwitch ? 52 + 12 : (row.kind === "link" ? 8 + 12 : 0)) + lockSpace
+        Loader {
+            id: mark
 
             anchors.right: parent.right
             anchors.rightMargin: Theme.gap
             anchors.verticalCenter: parent.verticalCenter
-            width: row.isSwitch ? 52 : 8
-            height: 32
+            sourceComponent: row.isSwitch ? switchMark : (row.kind === "link" ? chevron : null)
+        }
+        Loader {
+            anchors.right: mark.left
+            anchors.rightMargin: 10
+            anchors.verticalCenter: parent.verticalCenter
+            active: row.isLocked
+            sourceComponent: LockMark {}
+        }
+        Component {
+            id: switchMark
 
-            Loader {
-                anchors.right: parent.left
-                anchors.rightMargin: 10
-                anchors.verticalCenter: parent.verticalCenter
-                active: row.isLocked
-                sourceComponent: LockMark {}
-            }
-            Loader {
-                anchors.verticalCenter: parent.verticalCenter
-                active: row.isSwitch
-                sourceComponent: SwitchMark {
-                    isOn: row.isOn
-                    isLocked: row.isLocked
-                }
-            }
-            Loader {
-                anchors.verticalCenter: parent.verticalCenter
-                active: row.kind === "link"
-                sourceComponent: Chevron {}
+            SwitchMark {
+                isOn: row.isOn
+                isLocked: row.isLocked
             }
         }
+        Component {
+            id: chevron
 
-        Loader {
-            anchors.fill: parent
-            anchors.margins: 1
-            active: row.activeFocus
-            sourceComponent: Rectangle {
-                radius: Theme.radius - 1
-                color: "transparent"
-                border.color: Theme.accent
-                border.width: Theme.strong ? 4 : 3
-            }
+            Chevron {}
         }
     }
 
     // Under the card of a group.
-    Item {
+    Loader {
         id: below
 
-        readonly property bool isHere: row.isLast && (row.footer !== "" || row.hasStatus)
+        x: row.margin + Theme.gap
+        y: card.y + card.height
+        width: row.columnWidth - 2 * Theme.gap
+        height: item ? item.height : 0
+        active: row.isLast && (row.footer !== "" || row.hasStatus)
+        sourceComponent: Item {
+            height: status.y + status.height
 
-        anchors.top: card.bottom
-        x: column.margin + Theme.gap
-        width: column.width - 2 * Theme.gap
-        height: isHere ? footer.space + status.height : 0
-        visible: isHere
+            Text {
+                id: footer
 
-        Loader {
-            id: footer
-
-            readonly property real space: active ? Math.ceil(implicitHeight) + 12 : 0
-
-            y: 8
-            width: parent.width
-            active: below.isHere && row.footer !== ""
-            sourceComponent: Text {
+                y: 8
+                width: parent.width
+                visible: row.footer !== ""
                 text: row.footer
                 textFormat: Text.PlainText
                 color: Theme.faint
@@ -294,17 +253,17 @@ FocusScope {
                 Accessible.role: Accessible.StaticText
                 Accessible.name: text
             }
-        }
-        Loader {
-            id: status
+            Loader {
+                id: status
 
-            y: footer.space
-            width: parent.width
-            height: active ? Math.ceil(Math.max(pane.statusHeight, status.item ? status.item.textBottom : 0)) : 0
-            active: below.isHere && row.hasStatus
-            sourceComponent: ViewTree {
-                views: pane.status
-                spokenText: pane.statusText
+                y: footer.visible ? Math.ceil(footer.implicitHeight) + 12 : 0
+                width: parent.width
+                height: active ? Math.ceil(Math.max(pane.statusHeight, item ? item.textBottom : 0)) : 0
+                active: row.hasStatus
+                sourceComponent: ViewTree {
+                    views: pane.status
+                    spokenText: pane.statusText
+                }
             }
         }
     }
