@@ -9,10 +9,12 @@
 #include "host/qt/ApplicationIcons.h"
 #include "host/qt/Strings.h"
 
+#include <QFontMetricsF>
 #include <QGuiApplication>
 #include <QQmlContext>
 #include <QQuickItem>
 #include <QQuickWindow>
+#include <QThreadPool>
 #include <QUrl>
 #include <iostream>
 #include <utility>
@@ -22,6 +24,10 @@ namespace nimbra::window {
 namespace {
 
 using Problem = std::unexpected<std::string>;
+
+QUrl mainPage() {
+    return QUrl(QStringLiteral("qrc:/qt/qml/Nimbra/Window/qml/Main.qml"));
+}
 
 /// What the user loses nothing by but a word later on; told where a terminal looks on.
 void warn(const std::expected<void, Error>& outcome) {
@@ -47,6 +53,7 @@ SettingsHost::SettingsHost(const Arguments& arguments)
 
 SettingsHost::~SettingsHost() {
     // The window looks at the models until it has gone.
+    _pages.reset();
     _engine.reset();
     if (_session != nullptr && _session->isPaneOpen()) {
         warn(_openPanes.closed());
@@ -63,6 +70,7 @@ host::ScenarioPlayer* SettingsHost::player() {
 }
 
 std::expected<void, std::string> SettingsHost::start(const Arguments& arguments) {
+    readAhead();
     _metrics.setTextScale(_appearance.textScale());
     connect(&_appearance, &Appearance::textScaleChanged, this,
             [this] { _metrics.setTextScale(_appearance.textScale()); });
@@ -86,6 +94,17 @@ std::expected<void, std::string> SettingsHost::start(const Arguments& arguments)
         }
     }
     return loadWindow(arguments, notice);
+}
+
+void SettingsHost::readAhead() {
+    // The machine's fonts: a pane is measured with them as soon as it opens.
+    QThreadPool::globalInstance()->start(
+        [] { static_cast<void>(QFontMetricsF(QGuiApplication::font()).height()); });
+    _engine.emplace();
+    _engine->addImportPath(QStringLiteral("qrc:/qt/qml"));
+    // The pages import Qt Quick, which comes with this thread's help only; all else comes without.
+    QQmlComponent(&*_engine).setData("import QtQuick\nItem {}", QUrl());
+    _pages.emplace(&*_engine, mainPage(), QQmlComponent::Asynchronous);
 }
 
 std::expected<void, std::string> SettingsHost::startSession(const Arguments& arguments) {
@@ -170,9 +189,7 @@ QString SettingsHost::noticeOfDied() {
 
 std::expected<void, std::string> SettingsHost::loadWindow(const Arguments& arguments,
                                                           const QString& notice) {
-    _engine.emplace();
     _engine->addImageProvider(QLatin1String(ApplicationIcons::kProvider), new ApplicationIcons);
-    _engine->addImportPath(QStringLiteral("qrc:/qt/qml"));
     QQmlContext* const context = _engine->rootContext();
     context->setContextProperty(QStringLiteral("appearance"), &_appearance);
     context->setContextProperty(QStringLiteral("texts"), &*_texts);
@@ -183,7 +200,8 @@ std::expected<void, std::string> SettingsHost::loadWindow(const Arguments& argum
     _engine->setInitialProperties({{QStringLiteral("width"), arguments.size.width()},
                                    {QStringLiteral("height"), arguments.size.height()},
                                    {QStringLiteral("notice"), notice}});
-    _engine->load(QUrl(QStringLiteral("qrc:/qt/qml/Nimbra/Window/qml/Main.qml")));
+    _engine->load(mainPage());
+    _pages.reset();
     if (_engine->rootObjects().isEmpty()) {
         return Problem("the window cannot be made");
     }

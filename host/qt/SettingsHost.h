@@ -13,6 +13,7 @@
 #include "host/qt/WindowMetrics.h"
 
 #include <QQmlApplicationEngine>
+#include <QQmlComponent>
 #include <QString>
 #include <expected>
 #include <memory>
@@ -63,6 +64,8 @@ private:
     explicit SettingsHost(const Arguments& arguments);
 
     [[nodiscard]] std::expected<void, std::string> start(const Arguments& arguments);
+    /// Begins what takes long and needs nothing of the device, beside what comes after it.
+    void readAhead();
     [[nodiscard]] std::expected<void, std::string> startSession(const Arguments& arguments);
     void makeModels(const Arguments& arguments);
     /// What there is to say of an earlier host that died; empty for nothing.
@@ -91,6 +94,8 @@ private:
     std::optional<SharingModel> _sharing;
     /// Before all that it shows.
     std::optional<QQmlApplicationEngine> _engine;
+    /// The pages, while they are read ahead.
+    std::optional<QQmlComponent> _pages;
     QQuickWindow* _window = nullptr;
 };
 
