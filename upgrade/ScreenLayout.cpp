@@ -12,7 +12,6 @@
 #include "upgrade/RSPUpgradeViewController.h"
 #include "upgrade/RSPUpgradeViewControllerDelegate.h"
 
-#include <algorithm>
 #include <cmath>
 #include <utility>
 
@@ -123,8 +122,8 @@ void RSPUpgradeViewController::viewWillLayoutSubviews() {
     const auto centred = [&](double extent) {
         return RoundToViewScale((width - extent) * 0.5, mainScreen);
     };
-    // A view narrower than its margins leaves nothing, not less.
-    const auto within = [width](double margin) { return std::max(width - (2 * margin), 0.0); };
+    // Less than nothing where the view is narrower than its margins.
+    const auto within = [width](double margin) { return width - (2 * margin); };
     constexpr double padTextMargin = 36;
     constexpr double textMargin = 16;
     constexpr double padButtonMargin = 44;

