@@ -85,8 +85,16 @@ private:
     void _dismiss();
 
     [[nodiscard]] std::shared_ptr<Account> _account() const;
+
+    // Two ways to the bundle, and both are meant. What stands on the screen from the start, its
+    // titles and its picture, is of the bundle that the screen's own class came with. Warnings and
+    // alerts ask for the bundle of the page by its name, which may not be found.
+
+    [[nodiscard]] std::shared_ptr<Bundle> _ownBundle() const;
+    [[nodiscard]] Text _ownLocalizedString(const Text& key) const;
     [[nodiscard]] std::shared_ptr<Bundle> _paneBundle() const;
     [[nodiscard]] Text _localizedString(const Text& key) const;
+
     [[nodiscard]] std::shared_ptr<RSPUpgradeViewController> sharedFromThis();
 
     std::shared_ptr<ScrollView> _scrollView;

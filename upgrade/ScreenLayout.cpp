@@ -57,7 +57,7 @@ void RSPUpgradeViewController::loadView() {
     add(*_scrollView, _contentView, "_contentView");
 
     _titleLabel = std::make_shared<Label>(services(), Rect());
-    _titleLabel->setText(_localizedString("CLOUD_DRIVE_UPGRADE_TITLE"));
+    _titleLabel->setText(_ownLocalizedString("CLOUD_DRIVE_UPGRADE_TITLE"));
     _titleLabel->setNumberOfLines(0);
     _titleLabel->setTextAlignment(TextAlignment::center);
     _titleLabel->setFont(Font::_lightSystemFontOfSize(32.0));
@@ -74,13 +74,13 @@ void RSPUpgradeViewController::loadView() {
         std::make_shared<ActivityIndicatorView>(services(), ActivityIndicatorViewStyle::gray);
     add(*_contentView, _spinner, "_spinner");
 
-    const auto ownBundle = services().bundles->bundleForClass(typeid(RSPUpgradeViewController));
+    const std::shared_ptr<Bundle> ownBundle = _ownBundle();
     _cloudDriveLogo = std::make_shared<ImageView>(
         services(), ownBundle ? ownBundle->imageNamed("NimbraDrive") : nullptr);
     add(*_contentView, _cloudDriveLogo, "_cloudDriveLogo");
 
     _upgradeButton = Button::buttonWithType(ButtonType::system, services());
-    _upgradeButton->setTitleForState(_localizedString("CLOUD_DRIVE_UPGRADE_BUTTON"),
+    _upgradeButton->setTitleForState(_ownLocalizedString("CLOUD_DRIVE_UPGRADE_BUTTON"),
                                      ControlState::normal);
     _upgradeButton->addTargetActionForControlEvents(
         weak_from_this(),
@@ -106,7 +106,7 @@ void RSPUpgradeViewController::loadView() {
 
 void RSPUpgradeViewController::viewDidLoad() {
     AccountSettingsPane::viewDidLoad();
-    setTitle(_localizedString("CLOUD_DRIVE"));
+    setTitle(_ownLocalizedString("CLOUD_DRIVE"));
     if (!isPresentedAsModalSheet()) {
         navigationItem().setLeftBarButtonItem(std::nullopt);
     }
@@ -193,8 +193,16 @@ std::shared_ptr<Bundle> RSPUpgradeViewController::_paneBundle() const {
         BundleIdentifier("com.vantrel.NimbraDriveSettings"));
 }
 
+std::shared_ptr<Bundle> RSPUpgradeViewController::_ownBundle() const {
+    return services().bundles->bundleForClass(typeid(RSPUpgradeViewController));
+}
+
 Text RSPUpgradeViewController::_localizedString(const Text& key) const {
     return RSPLocalizedString(key, "Localizable", _paneBundle());
+}
+
+Text RSPUpgradeViewController::_ownLocalizedString(const Text& key) const {
+    return RSPLocalizedString(key, "Localizable", _ownBundle());
 }
 
 std::shared_ptr<RSPUpgradeViewController> RSPUpgradeViewController::sharedFromThis() {

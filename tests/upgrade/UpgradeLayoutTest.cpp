@@ -47,6 +47,7 @@ struct UpgradeLayout : UpgradeFixture {
         const auto logo = platform.bundles.paneBundle->images;
         platform.bundles.paneBundle = std::make_shared<FakeBundle>(changed);
         platform.bundles.paneBundle->images = logo;
+        platform.bundles.bundleOfClasses = platform.bundles.paneBundle;
     }
     /// The three widths that are the view's less its margins, below 0 where those are wider.
     void expectWidths(double textWidth, double buttonWidth) const {
@@ -171,16 +172,18 @@ TEST_F(UpgradeLayout, ALongTitlePushesWhatIsBelow) {
 }
 
 TEST_F(UpgradeLayout, AMissingTitleHasNoHeight) {
-    platform.bundles.paneBundle = nullptr;
+    // The logo goes with it: both are of the bundle that has the screen's class.
+    platform.bundles.bundleOfClasses = nullptr;
     screen->loadViewIfNeeded();
 
     layOut(390, 844);
 
-    EXPECT_EQ(frame("_titleLabel"), rect(16, 105, 358, 0));
+    EXPECT_EQ(frame("_titleLabel"), rect(16, 41, 358, 0));
+    EXPECT_EQ(frame("_warningLabel").origin.y, 52);
 }
 
 TEST_F(UpgradeLayout, WithoutALogoTheTitleStandsHigher) {
-    platform.bundles.bundleOfClasses = nullptr;
+    platform.bundles.bundleOfClasses = std::make_shared<FakeBundle>(texts());
     screen->loadViewIfNeeded();
 
     layOut(390, 844);

@@ -94,8 +94,10 @@ TEST_F(UpgradeScreen, TakesTheLogoFromTheBundleOfItsClass) {
 
     screen->loadViewIfNeeded();
 
-    EXPECT_THAT(platform.bundles.classesAskedFor,
-                testing::ElementsAre(typeid(RSPUpgradeViewController).name()));
+    // For it, the title, the button's title and the bar's.
+    EXPECT_THAT(
+        platform.bundles.classesAskedFor,
+        testing::AllOf(testing::SizeIs(4), testing::Each(typeid(RSPUpgradeViewController).name())));
     const auto logo = screen->viewNamed<ImageView>("_cloudDriveLogo");
     ASSERT_NE(logo->image(), nullptr);
     EXPECT_EQ(logo->image()->name, Text("NimbraDrive"));
@@ -201,6 +203,30 @@ TEST_F(UpgradeScreen, AsksForTheDevicesWhenItsBarIsReady) {
 
     EXPECT_EQ(atRequest, "[page], left, spinning");
     EXPECT_EQ(platform.calls, std::vector<std::string>());
+}
+
+TEST_F(UpgradeScreen, HasItsTitlesWithoutABundleOfThePagesName) {
+    platform.bundles.paneBundle = nullptr;
+
+    screen->loadViewIfNeeded();
+
+    EXPECT_EQ(screen->title(), Text("[page]"));
+    EXPECT_EQ(screen->viewNamed<Label>("_titleLabel")->text(), Text("[title]"));
+    EXPECT_EQ(screen->viewNamed<Button>("_upgradeButton")->titleForState(ControlState::normal),
+              Text("[button]"));
+    // The warning is of the bundle that goes by the name.
+    EXPECT_EQ(screen->viewNamed<Label>("_warningLabel")->attributedText()->string(), "\n");
+    EXPECT_TRUE(syslog.lines.empty());
+}
+
+TEST_F(UpgradeScreen, OfTheTitlesOfItsOwnBundleMissingOnesAreReported) {
+    platform.bundles.bundleOfClasses = std::make_shared<FakeBundle>(std::map<std::string, Text>());
+
+    screen->loadViewIfNeeded();
+
+    EXPECT_THAT(missingKeys(), testing::ElementsAre("CLOUD_DRIVE_UPGRADE_TITLE",
+                                                    "CLOUD_DRIVE_UPGRADE_BUTTON", "CLOUD_DRIVE"));
+    EXPECT_EQ(screen->title(), Text("RSP_LOCALIZED_STRING_UNAVAILABLE"));
 }
 
 } // namespace

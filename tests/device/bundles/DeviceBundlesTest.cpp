@@ -111,6 +111,19 @@ TEST_F(DeviceBundlesTest, AClassFindsABundleThatWasLoadedOnAnotherWay) {
     EXPECT_EQ(bundleOfClassIn(**relative), *relative);
 }
 
+TEST_F(DeviceBundlesTest, ABundleFoundByItsClassHasReplacedTextsAlsoWhereItsNameFindsNone) {
+    makeBundle(folder());
+    const auto bundle = load();
+    bundles().setFindable(BundleIdentifier("com.example.a"), false);
+
+    bundle->replaceTable("Localizable", {{"KEY", "given"}});
+
+    const auto found = bundleOfClassIn(*bundle);
+    ASSERT_NE(found, nullptr);
+    EXPECT_EQ(found->localizedStringForKeyValueTable("KEY", "MISSING", "Localizable"),
+              Text("given"));
+}
+
 TEST_F(DeviceBundlesTest, AClassOfNoLoadedBundleHasNone) {
     makeBundle(folder());
     const auto bundle = load();
