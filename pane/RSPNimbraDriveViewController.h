@@ -97,9 +97,6 @@ protected:
     /// Any queue, from the first `viewDidAppear` on; before that the main queue.
     void _registerContainerPriorityHinting();
 
-    /// What the rows of the applications show and change, read when they were built last.
-    std::optional<RSPServiceAccessCache> _accessCache;
-
 private:
     [[nodiscard]] Text _localizedString(const Text& key) const;
     [[nodiscard]] std::shared_ptr<Specifier> _masterSwitch();
@@ -140,6 +137,12 @@ private:
     SpecifierArray _appSpecifiers;
     std::optional<SpecifierArray> _cellularSpecifiers;
     std::optional<SpecifierArray> _logsSpecifiers;
+
+protected:
+    /// What the rows of the applications show and change, read when they were built last.
+    std::optional<RSPServiceAccessCache> _accessCache;
+
+private:
     std::shared_ptr<Account> _vantrelAccount_;
     std::atomic<bool> _isFirstSetup = false;
     std::shared_ptr<ObserverToken> _uiApplicationDidBecomeActiveObserver;
