@@ -49,7 +49,8 @@ public:
     virtual ~Processes() = default;
 
     /// Starts the program and returns at once, with the process or with an errno. Of this process's
-    /// descriptors the new one has 0, 1 and 2 only, and of those what the file actions leave.
+    /// descriptors the new one has 0, 1 and 2 only, and of those what the file actions leave. It
+    /// ignores no signal and blocks none, whatever this process does.
     [[nodiscard]] virtual std::expected<pid_t, int> posix_spawn(const SpawnRequest& request) = 0;
 
     /// Waits until `process`, which was started here and not waited for, has ended. Its status, as
