@@ -105,5 +105,42 @@ TEST_F(DependentRowsTest, BeforeTheListIsBuiltThereIsNothingToHide) {
     EXPECT_EQ(platform.calls, Calls());
 }
 
+TEST_F(DependentRowsTest, AfterARebuildTheRowsOfTheNewListComeAndGo) {
+    storeTidewater(false);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+    pane->apps = {row("Beta")};
+    platform.deviceInfo.hasCellularData = false;
+    pane->diagnostics = SpecifierArray{Specifier::groupSpecifierWithID("RSPLogs"), row("E")};
+    pane->reloadSpecifiers();
+    platform.calls.clear();
+
+    flip(true);
+    EXPECT_EQ(platform.calls,
+              Calls({"begin", "insert RSPStatusInfo after Nimbra Drive, animated",
+                     "append RSPUIApps Beta, animated", "append RSPLogs E, animated", "end"}));
+    platform.calls.clear();
+
+    flip(false);
+    EXPECT_EQ(platform.calls,
+              Calls({"begin", "remove RSPLogs E, animated", "remove RSPUIApps Beta, animated",
+                     "remove RSPStatusInfo, animated", "end"}));
+}
+
+TEST_F(DependentRowsTest, ARebuildWithoutAppsForgetsTheEarlierOnes) {
+    storeTidewater(false);
+    fillAllRows();
+    static_cast<void>(pane->specifiers());
+    pane->apps = SpecifierArray();
+    pane->reloadSpecifiers();
+    platform.calls.clear();
+
+    flip(true);
+
+    EXPECT_EQ(platform.calls, Calls({"begin", "insert RSPStatusInfo after Nimbra Drive, animated",
+                                     "append RSPCellular Cellular, animated",
+                                     "append RSPDiagnostics D, animated", "end"}));
+}
+
 } // namespace
 } // namespace nimbra::test

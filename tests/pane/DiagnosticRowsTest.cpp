@@ -79,5 +79,27 @@ TEST_F(DiagnosticRows, ABusyPageLooksUpNoText) {
     EXPECT_EQ(platform.bundles.lookups, lookups);
 }
 
+TEST_F(DiagnosticRows, OfAllPreferencesOnlyTheLogLevelIsReadAndOnlyForAList) {
+    static_cast<void>(rows());
+    pane->viewDidAppear(true);
+    pane->specifiers().at(1)->setValue(false);
+    platform.accountStore.endSave({});
+    pumpMain();
+
+    EXPECT_THAT(platform.preferences.reads, ElementsAre(std::pair(std::string("com.vantrel.marrow"),
+                                                                  std::string("log.level"))));
+}
+
+TEST_F(DiagnosticRows, EachListHasRowsOfItsOwn) {
+    const auto first = pane->_createSpecifiersForDiagnostics();
+    const auto second = pane->_createSpecifiersForDiagnostics();
+
+    ASSERT_TRUE(first && second);
+    ASSERT_EQ(first->size(), 2U);
+    ASSERT_EQ(second->size(), 2U);
+    EXPECT_NE(first->at(0), second->at(0));
+    EXPECT_NE(first->at(1), second->at(1));
+}
+
 } // namespace
 } // namespace nimbra::test

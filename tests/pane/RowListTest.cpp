@@ -175,5 +175,14 @@ TEST_F(RowListTest, AnAccountThatCannotBeReadShowsAsOffAndNotUpgraded) {
     EXPECT_EQ(pane->specifiers().at(2)->value(), RowValue(false));
 }
 
+TEST_F(RowListTest, AnAppWithoutANameComesFirstButBehindTheGroup) {
+    storeTidewater(true);
+    const auto unnamed = Specifier::preferenceSpecifierNamed(Text(), {.cell = SwitchCell});
+    unnamed->setIdentifier("unnamed");
+    pane->apps = {row("Alpha"), unnamed};
+
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPUIApps unnamed Alpha");
+}
+
 } // namespace
 } // namespace nimbra::test
