@@ -149,5 +149,19 @@ TEST_F(ContainerPriorityHintingTest, ThePaneMayGoWhileARunIsQueued) {
     EXPECT_EQ(calls(), Calls({"unregister"}));
 }
 
+TEST_F(ContainerPriorityHintingTest, ThePaneKeepsItsQueueUntilItGoes) {
+    pane->viewDidAppear(true);
+    pane->viewDidDisappear(true);
+    pumpHinting();
+    const auto queue = platform.workQueues.queueLabelled(kQueueLabel);
+    // The platform's hold and this one.
+    constexpr int others = 2;
+    EXPECT_GT(queue.use_count(), others);
+
+    pane.reset();
+
+    EXPECT_EQ(queue.use_count(), others);
+}
+
 } // namespace
 } // namespace nimbra::test

@@ -5,6 +5,7 @@
 #include <atomic>
 #include <latch>
 #include <memory>
+#include <mutex>
 #include <thread>
 #include <utility>
 #include <vector>
@@ -23,6 +24,7 @@ public:
     [[nodiscard]] WorkQueue& mainQueue() override { return _queues.mainQueue(); }
     [[nodiscard]] std::shared_ptr<WorkQueue>
     serialQueueWithLabel(const std::string& label) override {
+        const std::scoped_lock lock(_mutex);
         _made.push_back(_queues.serialQueueWithLabel(label));
         return _made.back();
     }
@@ -37,6 +39,12 @@ public:
         return _queues.timerSourceOnQueue(queue);
     }
 
+    /// How many queues were made.
+    [[nodiscard]] std::size_t queueCount() {
+        const std::scoped_lock lock(_mutex);
+        return _made.size();
+    }
+
     /// Waits until what is queued by now has run.
     void finishWork() {
         for (const auto& queue : _made) {
@@ -46,6 +54,7 @@ public:
 
 private:
     device::DeviceWorkQueues _queues;
+    std::mutex _mutex;
     std::vector<std::shared_ptr<WorkQueue>> _made;
 };
 
@@ -81,11 +90,12 @@ TEST_F(HintingRaceTest, PostingFromManyThreadsWhileThePaneComesAndGoesIsSafe) {
     started.wait();
 
     for (int visit = 0; visit < kVisits; ++visit) {
-        device::DeviceWorkQueues queues(mainQueue);
+        WatchedQueues queues(mainQueue);
         const auto visited = std::make_shared<PaneWithRows>(servicesOver(queues));
         visited->setSpecifier(entry);
         visited->viewDidAppear(true);
         visited->viewDidDisappear(true);
+        EXPECT_EQ(queues.queueCount(), 1U) << "two requests made one each";
     }
     isOver = true;
     posters.clear();
@@ -110,6 +120,29 @@ TEST_F(HintingRaceTest, ThreeQuickChangesLeadToOneToThreeRuns) {
     const int runs = platform.documentContainers.enumerations - runsOfTheAppearance;
     EXPECT_GE(runs, 1);
     EXPECT_LE(runs, 3);
+}
+
+TEST_F(HintingRaceTest, ChangesDuringARunLeadToOneMore) {
+    WatchedQueues queues(mainQueue);
+    const auto visited = std::make_shared<PaneWithRows>(servicesOver(queues));
+    std::latch runBegan(1);
+    std::latch changesCame(1);
+    platform.documentContainers.onEnumeration = [&] {
+        if (platform.documentContainers.enumerations == 1) {
+            runBegan.count_down();
+            changesCame.wait();
+        }
+    };
+    visited->viewDidAppear(true);
+    runBegan.wait();
+
+    postChange();
+    postChange();
+    postChange();
+    changesCame.count_down();
+    queues.finishWork();
+
+    EXPECT_EQ(platform.documentContainers.enumerations, 2);
 }
 
 } // namespace

@@ -23,6 +23,24 @@ public:
     int builds = 0;
 };
 
+/// Notes whose registrations are to be ended, and sees whether their tokens are still held.
+class TokenCenter final : public NotificationCenter {
+public:
+    [[nodiscard]] std::shared_ptr<ObserverToken>
+    addObserverForName(const NotificationName& /*name*/, Observation /*observation*/) override {
+        const auto token = std::make_shared<ObserverToken>();
+        given.push_back(token);
+        return token;
+    }
+    void removeObserver(const std::shared_ptr<ObserverToken>& token) override {
+        removed.push_back(token.get());
+    }
+    void postNotification(const Notification& /*notification*/) override {}
+
+    std::vector<std::weak_ptr<ObserverToken>> given;
+    std::vector<const ObserverToken*> removed;
+};
+
 TEST_F(LifecycleTest, TheAccountIsReadOnFirstUseAndKept) {
     EXPECT_EQ(platform.accountStore.asked, Calls());
 
@@ -169,6 +187,77 @@ TEST_F(LifecycleTest, SuccessWithoutAParentStillCloses) {
     pane->upgradeViewControllerDidSucceed(nullptr);
 
     EXPECT_EQ(platform.calls, Calls({"dismiss presented, animated", "dismiss itself, animated"}));
+}
+
+TEST_F(LifecycleTest, ThePaneThatGoesLetsItsRowsGo) {
+    storeTidewater(true);
+    fillAllRows();
+    std::vector<std::weak_ptr<Specifier>> built;
+    for (const auto& row : pane->specifiers()) {
+        built.emplace_back(row);
+    }
+    pane->viewDidAppear(true);
+    pane->viewDidDisappear(true);
+    platform.workQueues.queueLabelled("container-priority-hinting")->pump();
+
+    pane.reset();
+
+    ASSERT_EQ(built.size(), 12U);
+    for (const auto& row : built) {
+        EXPECT_TRUE(row.expired());
+    }
+}
+
+TEST_F(LifecycleTest, TheTokensStayInTheirFieldsUntilThePaneGoes) {
+    TokenCenter center;
+    PlatformServices services = platform.services();
+    services.notificationCenter = center;
+    pane = std::make_shared<PaneWithRows>(services);
+    pane->setSpecifier(entry);
+
+    pane->viewDidAppear(true);
+    pane->viewDidDisappear(true);
+    pane->viewDidDisappear(true);
+    platform.workQueues.queueLabelled("container-priority-hinting")->pump();
+
+    ASSERT_EQ(center.given.size(), 3U);
+    std::vector<const ObserverToken*> twice;
+    for (int time = 0; time < 2; ++time) {
+        for (const auto& token : center.given) {
+            ASSERT_FALSE(token.expired());
+            twice.push_back(token.lock().get());
+        }
+    }
+    EXPECT_EQ(center.removed, twice);
+
+    pane.reset();
+    for (const auto& token : center.given) {
+        EXPECT_TRUE(token.expired());
+    }
+}
+
+TEST_F(LifecycleTest, ARefreshEndsOnTheControlThatWasPulled) {
+    pane->viewDidLoad();
+    const auto pulled = pane->table()->refreshControl();
+    pulled->pull();
+    const auto other = std::make_shared<RefreshControl>();
+    pane->table()->setRefreshControl(other);
+    other->pull();
+
+    platform.documentContainers.refreshes.front()();
+    platform.workQueues.mainQueue().pump();
+
+    EXPECT_FALSE(pulled->isRefreshing());
+    EXPECT_TRUE(other->isRefreshing());
+}
+
+TEST_F(LifecycleTest, ReadingTheAccountAnewLetsTheOldObjectGo) {
+    const std::weak_ptr<Account> old = pane->_vantrelAccount();
+    ASSERT_FALSE(old.expired());
+
+    pane->_reloadVantrelAccount();
+
+    EXPECT_TRUE(old.expired());
 }
 
 } // namespace
