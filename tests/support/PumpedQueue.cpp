@@ -7,6 +7,7 @@ namespace nimbra::test {
 PumpedQueue::PumpedQueue(std::string label) : _label(std::move(label)) {}
 
 void PumpedQueue::async(Work work) {
+    onAsync();
     const std::scoped_lock lock(_mutex);
     _work.push_back(std::move(work));
 }

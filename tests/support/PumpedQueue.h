@@ -3,6 +3,7 @@
 #include "platform/system/WorkQueue.h"
 
 #include <deque>
+#include <functional>
 #include <mutex>
 #include <string>
 
@@ -23,6 +24,9 @@ public:
     /// Runs all work, also what is queued meanwhile.
     void pump();
     [[nodiscard]] std::size_t pendingCount() const;
+
+    /// Called on the thread that queues work, before the work is queued.
+    std::function<void()> onAsync = [] {};
 
 private:
     std::string _label;

@@ -74,6 +74,7 @@ TEST_F(DeviceListRequestTest, WhileNoAnswerComesTheButtonCannotBeTouched) {
     EXPECT_EQ(button()->alpha(), 0);
     EXPECT_EQ(warning()->alpha(), 0);
     EXPECT_EQ(marked(*warning()->attributedText()), "*[header]*[none known][end]\n");
+    EXPECT_TRUE(platform.workQueues.timers().empty()) << "nobody waits for a time to pass";
 }
 
 TEST_F(DeviceListRequestTest, TheAnswerChangesNoViewBeforeTheMainQueueRuns) {
@@ -85,6 +86,22 @@ TEST_F(DeviceListRequestTest, TheAnswerChangesNoViewBeforeTheMainQueueRuns) {
     EXPECT_EQ(screen->_devicesThatNeedUpgrade, twoDevices.needUpgradeDeviceNames);
     EXPECT_TRUE(spinner()->isAnimating());
     EXPECT_EQ(mainQueue().pendingCount(), 1U);
+}
+
+TEST_F(DeviceListRequestTest, BothListsAreThereBeforeTheMainQueueIsTold) {
+    screen->loadViewIfNeeded();
+    std::vector<std::string> listsAtQueueing;
+    mainQueue().onAsync = [&] {
+        const auto first = [](const std::optional<std::vector<Text>>& names) {
+            return names ? names->at(0).string() : "absent";
+        };
+        listsAtQueueing.push_back(first(screen->_devicesThatCannotUpgrade) + ' ' +
+                                  first(screen->_devicesThatNeedUpgrade));
+    };
+
+    platform.deviceListRequests.answer(twoDevices);
+
+    EXPECT_THAT(listsAtQueueing, testing::ElementsAre("Old New"));
 }
 
 TEST_F(DeviceListRequestTest, TheWarningComesFirstAndIsRevealedInWorkOfItsOwn) {

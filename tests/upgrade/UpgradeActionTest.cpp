@@ -303,6 +303,37 @@ TEST_F(UpgradeAction, AFailureAlertKeepsTheScreenUntilItIsAnswered) {
     EXPECT_TRUE(weakScreen.expired());
 }
 
+TEST_F(UpgradeAction, ContinuingEnablesAlsoWhatIsEnabledAlready) {
+    account->flags.enabled = {kAccountDataclassTidewater, kAccountDataclassTSYShareService};
+
+    confirm();
+
+    EXPECT_THAT(account->changes,
+                ElementsAre("uses stratafile: yes", "enable kAccountDataclassTidewater",
+                            "enable kAccountDataclassTSYDatabaseService",
+                            "enable kAccountDataclassTSYDeviceService",
+                            "enable kAccountDataclassTSYShareService"));
+}
+
+TEST_F(UpgradeAction, LooksTheBundleUpForEachTextOfItsAlert) {
+    auto changed = texts();
+    changed["CLOUD_DRIVE_ALERT_TITLE"] = "Really?";
+    changed["CLOUD_DRIVE_ALERT_MESSAGE"] = "Think twice.";
+    changed["CANCEL"] = "No";
+    changed["CONTINUE"] = "Yes";
+    platform.bundles.paneBundle = std::make_shared<FakeBundle>(changed);
+    const int before = platform.bundles.lookups;
+
+    touchButton();
+
+    EXPECT_EQ(platform.bundles.lookups - before, 4);
+    const auto alert = platform.presenter.alert;
+    EXPECT_EQ(alert->title(), Text("Really?"));
+    EXPECT_EQ(alert->message(), Text("Think twice."));
+    EXPECT_EQ(alert->actions().at(0).title, Text("No"));
+    EXPECT_EQ(alert->actions().at(1).title, Text("Yes"));
+}
+
 TEST_F(UpgradeAction, TheSaveMayEndOnAnyThread) {
     confirm();
     std::thread store([this] { platform.accountStore.endSave({}); });

@@ -283,5 +283,26 @@ TEST_F(UpgradeLayout, KeepsTheOriginOfTheContentAndTheSizeOfTheSpinner) {
     EXPECT_EQ(frame("_spinner"), rect(176.5, 174, 37, 37));
 }
 
+TEST_F(UpgradeLayout, OnAPadATitleThatTheMarginsLeaveNoRoomForIsBroken) {
+    platform.deviceInfo.idiom = UserInterfaceIdiom::pad;
+    setText("CLOUD_DRIVE_UPGRADE_TITLE", "Move all you have to the cloud");
+    screen->loadViewIfNeeded();
+
+    layOut(540, 620);
+
+    // 30 characters of 16 points are 480 wide: the screen has room for them, the margins do not.
+    EXPECT_EQ(frame("_titleLabel"), rect(36, 105, 468, 77));
+}
+
+TEST_F(UpgradeLayout, GivesTheLogoTheSizeOfItsImageWhateverItHad) {
+    screen->loadViewIfNeeded();
+    screen->viewNamed<View>("_cloudDriveLogo")->setFrame(rect(0, 0, 10, 10));
+
+    layOut(390, 844);
+
+    EXPECT_EQ(frame("_cloudDriveLogo"), rect(147, 28, 96, 64));
+    EXPECT_EQ(frame("_titleLabel").origin.y, 105);
+}
+
 } // namespace
 } // namespace nimbra::test

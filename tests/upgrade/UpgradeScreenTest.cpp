@@ -229,5 +229,14 @@ TEST_F(UpgradeScreen, OfTheTitlesOfItsOwnBundleMissingOnesAreReported) {
     EXPECT_EQ(screen->title(), Text("RSP_LOCALIZED_STRING_UNAVAILABLE"));
 }
 
+TEST_F(UpgradeScreen, KeepsTheRowsThatItsListWasGiven) {
+    static_cast<void>(screen->specifiers());
+    const auto row = Specifier::preferenceSpecifierNamed("Row", {.cell = ButtonCell});
+
+    screen->addSpecifiersFromArrayAnimated({row}, false);
+
+    EXPECT_THAT(screen->specifiers(), testing::ElementsAre(row));
+}
+
 } // namespace
 } // namespace nimbra::test
