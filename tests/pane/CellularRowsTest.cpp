@@ -28,6 +28,7 @@ TEST_F(CellularRowsTest, ADeviceWithCellularDataHasTheGroupAndTheSwitch) {
     EXPECT_EQ(cellular()->cellType(), SwitchCell);
     EXPECT_EQ(cellular()->identifier(), Text());
     EXPECT_EQ(cellular()->target(), pane.get());
+    EXPECT_EQ(cellular()->propertyForKey(EnabledKey), RowValue(true));
 }
 
 TEST_F(CellularRowsTest, ADeviceWithoutCellularDataHasNeither) {
@@ -85,6 +86,8 @@ TEST_F(CellularRowsTest, ADifferenceReadsAsOffAndTurningOnWritesBoth) {
 
     cellular()->setValue(true);
 
+    EXPECT_EQ(std::static_pointer_cast<FakeAccount>(pane->_vantrelAccount())->cellularWrites,
+              Calls({"allow kAccountDataclassTidewater", "allow kAccountDataclassKeyValue"}));
     EXPECT_TRUE(usesCellular(kAccountDataclassTidewater));
     EXPECT_TRUE(usesCellular(kAccountDataclassKeyValue));
     ASSERT_EQ(platform.accountStore.saves.size(), 1U);
@@ -168,6 +171,36 @@ TEST_F(CellularRowsTest, TheSaveKeepsThePaneAndTheRowAliveUntilItHasEnded) {
 
     EXPECT_TRUE(watchedPane.expired());
     EXPECT_TRUE(watchedRow.expired());
+}
+
+TEST_F(CellularRowsTest, WhetherTheDeviceHasCellularDataIsAskedWhenTheListIsBuilt) {
+    ASSERT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPCellular Cellular");
+    platform.deviceInfo.hasCellularData = false;
+
+    for (const bool on : {false, true}) {
+        pane->turn(on);
+        pane->_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+    }
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPCellular Cellular");
+
+    pane->reloadSpecifiers();
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo");
+}
+
+TEST_F(CellularRowsTest, TheSaveKeepsTheAccountThatItReloads) {
+    const std::weak_ptr<FakeAccount> saved =
+        std::static_pointer_cast<FakeAccount>(pane->_vantrelAccount());
+    cellular()->setValue(true);
+    auto& save = platform.accountStore.saves.front();
+
+    save.account.reset();
+    pane->_reloadVantrelAccount();
+    ASSERT_FALSE(saved.expired());
+    save.end(std::unexpected(kRefused));
+
+    EXPECT_EQ(saved.lock()->reloads, 1);
+    platform.accountStore.saves.clear();
+    EXPECT_TRUE(saved.expired());
 }
 
 } // namespace

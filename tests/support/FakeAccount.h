@@ -42,6 +42,7 @@ public:
     }
     void vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) override {
         set(flags.cellular, dataclass, useCellular);
+        cellularWrites.push_back((useCellular ? "allow " : "forbid ") + dataclass.string());
     }
     void reload() override {
         ++reloads;
@@ -65,6 +66,8 @@ public:
     std::vector<std::string> changes;
     /// The data classes of which it was asked whether they may use cellular data, in order.
     mutable std::vector<Dataclass> cellularReads;
+    /// What was changed of that, in order.
+    std::vector<std::string> cellularWrites;
 
 private:
     static void set(std::set<Dataclass>& classes, const Dataclass& dataclass, bool isMember) {
