@@ -222,5 +222,65 @@ TEST_F(MasterSwitchTest, WithoutAnAccountAFlipDoesNothing) {
     EXPECT_EQ(calls(), Calls());
 }
 
+TEST_F(MasterSwitchTest, AFailedSaveAfterARebuildDrawsTheSwitchThatIsShown) {
+    openWith({});
+    pane->reloadSpecifiers();
+    flip(true);
+    platform.calls.clear();
+
+    platform.accountStore.endSave(std::unexpected(kRefused));
+    pumpMain();
+
+    EXPECT_EQ(calls(),
+              Calls({"busy: Turning on", "reload row Nimbra Drive, animated", "not busy"}));
+}
+
+TEST_F(MasterSwitchTest, AFailedSaveReadsTheAccountBeforeItQueuesAnything) {
+    openWith({});
+    flip(true);
+    PumpedQueue& mainQueue = platform.workQueues.mainQueue();
+    std::vector<std::size_t> queuedAtReading;
+    platform.accountStore.onAsked = [&] { queuedAtReading.push_back(mainQueue.pendingCount()); };
+
+    platform.accountStore.endSave(std::unexpected(kRefused));
+
+    EXPECT_EQ(queuedAtReading, std::vector<std::size_t>{0});
+    EXPECT_EQ(mainQueue.pendingCount(), 2U);
+}
+
+TEST_F(MasterSwitchTest, TheEndOfAFailedSaveIsShownOnTheMainQueueOnly) {
+    openWith({kAccountDataclassTidewater});
+    flip(false);
+    platform.calls.clear();
+
+    platform.accountStore.endSave(std::unexpected(kRefused));
+
+    EXPECT_EQ(calls(), Calls({"busy: Turning off"}));
+}
+
+TEST_F(MasterSwitchTest, TurningOffWhatIsOffLeavesThePhotoStreamAsItIs) {
+    openWith({kAccountDataclassLarder});
+    const auto account = std::static_pointer_cast<FakeAccount>(pane->_vantrelAccount());
+
+    flip(false);
+
+    EXPECT_EQ(account->changes, Calls());
+    EXPECT_EQ(savesUnderWay(), 0U);
+    EXPECT_EQ(calls(), Calls());
+}
+
+TEST_F(MasterSwitchTest, InFirstSetupTurningOnIsNotSavedEither) {
+    const auto account = std::make_shared<FakeAccount>("new");
+    entry->setUserInfo({{FirstSetupKey, true}, {AccountKey, std::shared_ptr<Account>(account)}});
+    static_cast<void>(pane->specifiers());
+
+    flip(true);
+    pumpMain();
+
+    EXPECT_EQ(account->changes, Calls({"enable kAccountDataclassTidewater"}));
+    EXPECT_EQ(savesUnderWay(), 0U);
+    EXPECT_EQ(calls(), Calls({"reload parent row"}));
+}
+
 } // namespace
 } // namespace nimbra::test

@@ -20,6 +20,7 @@ public:
     [[nodiscard]] std::shared_ptr<Account>
     accountWithIdentifier(const AccountIdentifier& identifier) override {
         asked.push_back(identifier.string());
+        onAsked();
         if (!isReadable || identifier.string() != "primary") {
             return nullptr;
         }
@@ -45,6 +46,7 @@ public:
 
     [[nodiscard]] std::shared_ptr<AccountOperationsHelper>
     operationsHelperWithDelegate(std::weak_ptr<AccountOperationsHelperDelegate> delegate) override {
+        delegates.push_back(delegate);
         return std::make_shared<Helper>(*this, std::move(delegate));
     }
 
@@ -69,6 +71,10 @@ public:
     bool isReadable = true;
     /// The identifiers asked for, in order.
     std::vector<std::string> asked;
+    /// Called when an account is asked for.
+    std::function<void()> onAsked = [] {};
+    /// Those for whom helpers were made, in order.
+    std::vector<std::weak_ptr<AccountOperationsHelperDelegate>> delegates;
     /// The saves under way, in order.
     std::vector<Save> saves;
 
