@@ -90,6 +90,15 @@ TEST_F(Footer, WhoLooksIntoTheViewLearnsItsState) {
     end();
 }
 
+TEST_F(Footer, AViewHasTheFrameThatItIsMadeWith) {
+    const Rect frame{{1, 2}, {300, 40}};
+
+    const auto made = RSPNimbraDriveProgressFooterView::initWithFrame(frame, platform.services());
+
+    EXPECT_EQ(made->frame(), frame);
+    platform.workQueues.timers().at(1)->cancel();
+}
+
 TEST_F(Footer, TheGroupDoesNotMatter) {
     const auto group = Specifier::groupSpecifierWithID("Whatever");
 
@@ -117,6 +126,7 @@ TEST_F(Footer, ARunningTimerIsCancelledWithTheView) {
 
     EXPECT_TRUE(gone.expired());
     EXPECT_EQ(kept->calls, Calls{"cancel"});
+    EXPECT_EQ(platform.distributedNotificationCenter.removals, 0);
 }
 
 TEST_F(Footer, ASuspendedTimerIsNotCancelledWithTheView) {

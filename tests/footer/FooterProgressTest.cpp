@@ -57,6 +57,7 @@ TEST_F(FooterProgress, TheThreeValuesAreObservedInTheirOrder) {
     EXPECT_EQ(progress->calls,
               (Calls{"add localizedDescription 4", "add localizedAdditionalDescription 4",
                      "add fractionCompleted 4"}));
+    EXPECT_EQ(progress->contexts, std::vector<void*>(3, nullptr));
     progress->calls.clear();
     end();
 
@@ -269,6 +270,23 @@ TEST_F(FooterProgress, AChangeOfAnotherObjectIsTheBaseClasss) {
     EXPECT_FALSE(view->needsLayout());
     ASSERT_EQ(syslog.lines.size(), 1U);
     EXPECT_NE(syslog.lines[0].second.find("size"), std::string::npos);
+}
+
+TEST_F(FooterProgress, AMissingSentenceUnderAnIndeterminateProgressSuspendsTheTimer) {
+    postLastSync({{MRSyncStatusLastSyncDateKey, now}});
+    ASSERT_TRUE(view->isLastSyncAutoUpdating());
+    const auto progress = progressCalled("Uploading");
+    const auto end = platform.progressReports.publish(progress);
+    timer().calls.clear();
+    platform.lastSync.sentence = Text();
+
+    progress->indeterminate = true;
+    progress->tell(KeyPath("fractionCompleted"));
+
+    EXPECT_EQ(timer().calls, Calls{"suspend"});
+    EXPECT_FALSE(text());
+    EXPECT_TRUE(view->isSyncing());
+    end();
 }
 
 } // namespace

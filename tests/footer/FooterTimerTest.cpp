@@ -160,5 +160,18 @@ TEST_F(FooterTimer, ASentenceThatCannotBeFetchedStillLetsADateArmTheTimer) {
     EXPECT_EQ(text(), Text("    "));
 }
 
+TEST_F(FooterTimer, ASentenceThatCannotBeFetchedUnderAnEmptyTextArmsNothing) {
+    platform.lastSync.sentence = Text();
+    ASSERT_EQ(callsForAge(61s), Calls());
+    platform.lastSync.sentence =
+        std::unexpected(Error{.domain = "daemon", .code = 4, .description = "no answer"});
+
+    postLastSync({{MRSyncStatusLastSyncDateKey, now}});
+
+    EXPECT_EQ(timer().calls, Calls());
+    EXPECT_FALSE(text());
+    EXPECT_FALSE(view->isLastSyncAutoUpdating());
+}
+
 } // namespace
 } // namespace nimbra::test

@@ -95,6 +95,7 @@ TEST_F(FooterWindow, TwoEntriesLeaveTwoRegistrationsThatBothAct) {
     EXPECT_EQ(platform.distributedNotificationCenter.registrations[0].token, first);
     EXPECT_EQ(platform.distributedNotificationCenter.registrations[1].token,
               view->lastSyncDateSubscriber());
+    EXPECT_EQ(platform.distributedNotificationCenter.removals, 0);
     static_cast<void>(takeCalls());
 
     postLastSync({{MRSyncStatusLastSyncDateKey, now - 61s}});

@@ -25,6 +25,7 @@ public:
     }
 
     void removeObserver(const std::shared_ptr<ObserverToken>& token) override {
+        ++removals;
         std::erase_if(registrations, [&](const Registration& registration) {
             return registration.token == token;
         });
@@ -41,6 +42,8 @@ public:
     }
 
     std::vector<Registration> registrations;
+    /// How often a registration was to be ended.
+    int removals = 0;
 };
 
 } // namespace nimbra::test

@@ -17,6 +17,8 @@ public:
     Text additional;
     /// What was asked, in order: "add KEYPATH OPTIONS", "remove KEYPATH".
     std::vector<std::string> calls;
+    /// The contexts that observers came with, in order.
+    std::vector<void*> contexts;
 
     [[nodiscard]] const UserInfo& userInfo() const override { return info; }
     [[nodiscard]] bool isIndeterminate() const override { return indeterminate; }
@@ -28,6 +30,7 @@ public:
                      const Registration& registration) override {
         calls.push_back("add " + registration.forKeyPath.string() + ' ' +
                         std::to_string(static_cast<int>(registration.options)));
+        contexts.push_back(registration.context);
         _observer = observer;
         if (registration.options == KeyValueObservingOptions::initial) {
             tell(registration.forKeyPath);
