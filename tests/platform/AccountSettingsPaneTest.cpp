@@ -45,6 +45,15 @@ private:
     Calls& _calls;
 };
 
+class SavingPage final : public EmptyAccountPage {
+public:
+    using EmptyAccountPage::EmptyAccountPage;
+
+    void save(const std::shared_ptr<Account>& account) {
+        accountOperationsHelper().saveAccountRequireVerification(account, false);
+    }
+};
+
 struct AccountSettingsPaneTest : testing::Test {
     test::TestPlatform platform;
 
@@ -113,6 +122,22 @@ TEST_F(AccountSettingsPaneTest, TheButtonsHoldThePageWeakly) {
 
     EXPECT_TRUE(seen.expired());
     EXPECT_EQ(platform.calls, Calls());
+}
+
+TEST_F(AccountSettingsPaneTest, EverySaveGoesThroughTheOneHelperThatThePageOwns) {
+    auto page = std::make_shared<SavingPage>(platform.services());
+    const auto account = std::make_shared<test::FakeAccount>("primary");
+    auto& store = platform.accountStore;
+    EXPECT_EQ(store.delegates.size(), 0U);
+
+    page->save(account);
+    page->save(account);
+
+    EXPECT_EQ(store.saves.size(), 2U);
+    ASSERT_EQ(store.delegates.size(), 1U);
+    EXPECT_EQ(store.delegates.front().lock(), page);
+    page.reset();
+    EXPECT_TRUE(store.delegates.front().expired()) << "the helper does not keep its page";
 }
 
 } // namespace

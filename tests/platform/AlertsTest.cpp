@@ -20,6 +20,12 @@ TEST(AlertControllerTest, AnAlertSaysWhatItWasMadeWith) {
     EXPECT_TRUE(alert->actions().empty());
 }
 
+TEST(AlertControllerTest, StylesHaveThePlatformsNumbers) {
+    EXPECT_EQ(static_cast<int>(AlertControllerStyle::alert), 1);
+    EXPECT_EQ(static_cast<int>(AlertActionStyle::standard), 0);
+    EXPECT_EQ(static_cast<int>(AlertActionStyle::cancel), 1);
+}
+
 TEST(AlertControllerTest, AnswersStandInTheOrderInWhichTheyWereAdded) {
     const auto alert = AlertController::alertControllerWithTitleMessagePreferredStyle(
         "Title", "Message", AlertControllerStyle::alert);

@@ -89,5 +89,11 @@ TEST(UserInfo, AValueOfAnotherTypeCountsAsAbsent) {
     EXPECT_EQ(userInfoValue<Text>(userInfo, FirstSetupKey), Text("yes"));
 }
 
+TEST(UserInfo, TheKeysOfAnEntryRowAreTheHosts) {
+    EXPECT_EQ(FirstSetupKey, UserInfoKey("firstSetup"));
+    EXPECT_EQ(AccountKey, UserInfoKey("AccountKey"));
+    EXPECT_EQ(AccountIdentifierKey, UserInfoKey("AccountIdentifierKey"));
+}
+
 } // namespace
 } // namespace nimbra

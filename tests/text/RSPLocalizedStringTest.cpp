@@ -1,10 +1,13 @@
 #include "support/RSPLocalizedString.h"
 
+#include "tests/device/Threads.h"
 #include "tests/support/FakeBundle.h"
 #include "tests/support/SyslogCapture.h"
 
+#include <atomic>
 #include <gtest/gtest.h>
 #include <memory>
+#include <mutex>
 #include <syslog.h>
 
 namespace nimbra {
@@ -80,6 +83,31 @@ TEST_F(RSPLocalizedStringTest, AReplacedSinkComesBackToWhoeverReplacesIt) {
 
     EXPECT_EQ(lines, 1);
     EXPECT_EQ(syslog.lines.size(), 1U);
+}
+
+TEST_F(RSPLocalizedStringTest, ManyThreadsMayLookUpAKeyThatIsMissing) {
+    constexpr int rounds = 100;
+    std::mutex mutex;
+    int lines = 0;
+    SyslogSink earlier = replaceSyslogSink([&](int, const std::string&) {
+        const std::scoped_lock lock(mutex);
+        ++lines;
+    });
+    const Text standIn = RSPLocalizedString("FAREWELL", "Localizable", bundle);
+    std::atomic<int> others = 0;
+    const auto lookUp = [&] {
+        for (int round = 0; round < rounds; ++round) {
+            if (!RSPLocalizedString("FAREWELL", "Localizable", bundle).isSameObjectAs(standIn)) {
+                ++others;
+            }
+        }
+    };
+
+    test::runAtOnce({lookUp, lookUp, lookUp, lookUp});
+
+    replaceSyslogSink(std::move(earlier));
+    EXPECT_EQ(others, 0);
+    EXPECT_EQ(lines, 1 + (4 * rounds));
 }
 
 } // namespace
