@@ -28,6 +28,19 @@ TEST_F(CollectingDiagnostics, TheArchiveIsCollectedInTheBackgroundAndShownOnTheM
     EXPECT_THAT(takeCalls(), ElementsAre("not busy", "reach " + std::string(kArchive), kShared));
 }
 
+TEST_F(CollectingDiagnostics, ACollectionIsOnePieceOfWork) {
+    PumpedQueue& background = platform.workQueues.globalQueueWithQuality(UserInitiatedQuality);
+    PumpedQueue& mainQueue = platform.workQueues.mainQueue();
+    tap();
+    EXPECT_EQ(background.pendingCount(), 1U);
+
+    background.pumpOne();
+
+    EXPECT_EQ(platform.calls.back(), "wait for 42");
+    EXPECT_EQ(background.pendingCount(), 0U);
+    EXPECT_EQ(mainQueue.pendingCount(), 1U);
+}
+
 TEST_F(CollectingDiagnostics, TheArchiveIsOfferedInThreeWays) {
     tapAndWait();
 
