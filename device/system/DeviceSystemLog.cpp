@@ -3,7 +3,6 @@
 #include "device/DeviceError.h"
 #include "device/files/Descriptor.h"
 
-#include <array>
 #include <cstdlib>
 #include <fcntl.h>
 #include <filesystem>
@@ -17,6 +16,7 @@
 #include <syslog.h>
 #include <systemd/sd-journal.h>
 #include <utility>
+#include <vector>
 
 namespace nimbra::device {
 
@@ -128,14 +128,20 @@ void DeviceSystemLog::write(LogLevel level, const std::string& message) {
     _file->write(_paths, level, line);
 }
 
+std::vector<std::string> DeviceSystemLog::journalFields(LogLevel level,
+                                                        const std::string& message) const {
+    return {"MESSAGE=" + oneLine(message), "PRIORITY=" + std::to_string(priorityOf(level)),
+            std::string("SYSLOG_IDENTIFIER=") + programName,
+            std::string("NIMBRA_LEVEL=") + nameOf(level),
+            "NIMBRA_DEVICE=" + _paths.root().string()};
+}
+
 void DeviceSystemLog::writeToJournal(LogLevel level, const std::string& message) const {
-    std::array fields{
-        "MESSAGE=" + oneLine(message), "PRIORITY=" + std::to_string(priorityOf(level)),
-        std::string("SYSLOG_IDENTIFIER=") + programName,
-        std::string("NIMBRA_LEVEL=") + nameOf(level), "NIMBRA_DEVICE=" + _paths.root().string()};
-    std::array<iovec, fields.size()> parts{};
-    for (std::size_t index = 0; index < fields.size(); ++index) {
-        parts.at(index) = {.iov_base = fields.at(index).data(), .iov_len = fields.at(index).size()};
+    std::vector<std::string> fields = journalFields(level, message);
+    std::vector<iovec> parts;
+    parts.reserve(fields.size());
+    for (std::string& field : fields) {
+        parts.push_back({.iov_base = field.data(), .iov_len = field.size()});
     }
     if (const int result = ::sd_journal_sendv(parts.data(), static_cast<int>(parts.size()));
         result < 0) {

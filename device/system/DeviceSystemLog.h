@@ -4,6 +4,8 @@
 #include "platform/system/SystemLog.h"
 
 #include <memory>
+#include <string>
+#include <vector>
 
 namespace nimbra::device {
 
@@ -27,6 +29,10 @@ public:
     [[nodiscard]] bool isEnabled(LogLevel level) const override;
     /// What is not enabled is dropped. A line that cannot be written is told to standard error.
     void write(LogLevel level, const std::string& message) override;
+
+    /// What the journal is told of a line: its fields, each "NAME=value".
+    [[nodiscard]] std::vector<std::string> journalFields(LogLevel level,
+                                                         const std::string& message) const;
 
 private:
     class File;

@@ -9,6 +9,7 @@
 #include <gtest/gtest.h>
 #include <regex>
 #include <string>
+#include <vector>
 
 namespace nimbra::device {
 namespace {
@@ -63,6 +64,19 @@ TEST_F(DeviceSystemLogTest, DebugIsDroppedUnlessItIsAskedFor) {
     EXPECT_FALSE(log().isEnabled(LogLevel::debug));
     ::setenv("NIMBRA_LOG", "debug", 1);
     EXPECT_TRUE(log().isEnabled(LogLevel::debug));
+}
+
+TEST_F(DeviceSystemLogTest, TheJournalGetsEachLevelByItsPriorityAndItsName) {
+    const DeviceSystemLog systemLog(DevicePaths(root()), DeviceSystemLog::Destination::journal);
+    const auto fields = [&](const std::string& priority, const std::string& level) {
+        return std::vector<std::string>{
+            "MESSAGE=two lines", "PRIORITY=" + priority, "SYSLOG_IDENTIFIER=nimbra-settings",
+            "NIMBRA_LEVEL=" + level, "NIMBRA_DEVICE=" + root().string()};
+    };
+
+    EXPECT_EQ(systemLog.journalFields(LogLevel::debug, "two\nlines"), fields("7", "debug"));
+    EXPECT_EQ(systemLog.journalFields(LogLevel::standard, "two\nlines"), fields("5", "default"));
+    EXPECT_EQ(systemLog.journalFields(LogLevel::error, "two\nlines"), fields("3", "error"));
 }
 
 TEST_F(DeviceSystemLogTest, NothingIsMadeBeforeTheFirstLine) {
