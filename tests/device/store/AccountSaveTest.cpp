@@ -67,6 +67,21 @@ TEST_F(AccountSaveTest, ReloadDropsWhatWasNotSavedAndReadsWhatOthersSaved) {
     EXPECT_FALSE(account->isEnabledForDataclass(kAccountDataclassLarder));
 }
 
+TEST_F(AccountSaveTest, ReloadBringsBackForBothDataClassesWhetherTheyMayUseCellular) {
+    const auto store = openStore();
+    const auto account = primaryOf(*store);
+    account->vt_setUseCellularForDataclass(true, kAccountDataclassTidewater);
+    account->vt_setUseCellularForDataclass(true, kAccountDataclassKeyValue);
+    ASSERT_TRUE(store->save(account));
+    account->vt_setUseCellularForDataclass(false, kAccountDataclassTidewater);
+    account->vt_setUseCellularForDataclass(false, kAccountDataclassKeyValue);
+
+    account->reload();
+
+    EXPECT_TRUE(account->vt_useCellularForDataclass(kAccountDataclassTidewater));
+    EXPECT_TRUE(account->vt_useCellularForDataclass(kAccountDataclassKeyValue));
+}
+
 TEST_F(AccountSaveTest, ReloadDropsChangesAlsoWhenNothingCanBeRead) {
     const auto store = openStore();
     const auto account = primaryOf(*store);

@@ -86,6 +86,23 @@ TEST_F(DeviceProcessesTest, FilesAreOpenedOnTheDeviceButForTheMachinesNowhere) {
     EXPECT_FALSE(std::filesystem::exists(root() / "dev"));
 }
 
+TEST_F(DeviceProcessesTest, AProgramReadsWhatThisProcessWouldReadNext) {
+    write("read -r line; echo \"$line\"");
+    writeTestFile(root() / "in", "the first line\nthe second\n");
+    const Descriptor earlier(::dup(STDIN_FILENO));
+    {
+        const Descriptor input(::open((root() / "in").c_str(), O_RDONLY));
+        ASSERT_TRUE(earlier.isOpen() && input.isOpen());
+        ASSERT_EQ(::dup2(input.number(), STDIN_FILENO), STDIN_FILENO);
+    }
+
+    const int status = run();
+
+    EXPECT_EQ(::dup2(earlier.number(), STDIN_FILENO), STDIN_FILENO);
+    EXPECT_EQ(status, 0);
+    EXPECT_EQ(output(), "the first line\n");
+}
+
 TEST_F(DeviceProcessesTest, AProgramHasNoneOfThisProcessesOtherDescriptors) {
     // Without CLOEXEC, as a library may open one.
     const Descriptor inherited(::open("/dev/null", O_RDWR));

@@ -44,6 +44,10 @@ TEST_F(DeviceWorkQueuesTest, TheMainQueueIsTheHosts) {
     EXPECT_EQ(&queues().mainQueue(), &mainQueue());
 }
 
+TEST_F(DeviceWorkQueuesTest, AQualityClassHasThePlatformsNumber) {
+    EXPECT_EQ(static_cast<int>(UserInitiatedQuality), 25);
+}
+
 TEST_F(DeviceWorkQueuesTest, WorkRunsInOrderOnAThreadThatBearsTheQueuesLabel) {
     const auto queue = queues().serialQueueWithLabel("a-queue");
     std::vector<int> order;
