@@ -11,6 +11,7 @@
 #include "host/core/trace/Trace.h"
 #include "platform/system/NotificationCenter.h"
 #include "tests/device/TestFiles.h"
+#include "tests/support/RecordingListObserver.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <algorithm>
@@ -230,6 +231,24 @@ TEST_F(PaneSessionTest, OpensThePaneOnADeviceWithoutAccounts) {
     ASSERT_TRUE(session->openPane({.firstSetup = true}));
 
     EXPECT_EQ((*session->row("Nimbra Drive"))->value(), RowValue(false));
+}
+
+TEST_F(PaneSessionTest, AFlipOfTheSwitchDrawsTheRowOfTheAccountsPageOnce) {
+    makeDevice("{}");
+    const auto session = start();
+    ASSERT_TRUE(session->openPane({}));
+    const auto& page = session->accountPage();
+    static_cast<void>(page->specifiers());
+    std::vector<std::string> changes;
+    test::RecordingListObserver observer(changes);
+    page->setObserver(&observer);
+
+    ASSERT_TRUE(session->setRow("Nimbra Drive", true));
+    session->settle();
+
+    EXPECT_EQ(changes,
+              std::vector<std::string>{"reload row " + page->entryRow()->label().string()});
+    page->setObserver(nullptr);
 }
 
 } // namespace
