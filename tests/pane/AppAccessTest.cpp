@@ -202,5 +202,22 @@ TEST_F(AppAccessTest, AnAbsentBundleIsLoggedAndReachesTheStoreAllTheSame) {
     EXPECT_EQ(row->value(), RowValue(false));
 }
 
+TEST_F(AppAccessTest, TheServicesThatItHasAfterTheWriteDecideWhetherItIsEnded) {
+    addNotes({kPRVServiceBrackwater}, true);
+    const auto row = notes();
+    platform.privacyConsentStore.onSet = [this] {
+        pane->_accessCache->addAccessInfoForServiceName(
+            PrivacyAccessRecords{
+                {.kPRVInfoBundle = std::make_shared<FakeBundle>(kNotes), .kPRVInfoGranted = true}},
+            kPRVServiceTidewater);
+    };
+    static_cast<void>(takeCalls());
+
+    row->setValue(false);
+
+    EXPECT_EQ(takeCalls(), (Calls{"set kPRVServiceBrackwater com.example.notes off",
+                                  "terminate com.example.notes for 3, not reported"}));
+}
+
 } // namespace
 } // namespace nimbra::test

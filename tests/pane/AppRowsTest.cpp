@@ -17,7 +17,7 @@ TEST_F(AppRowsTest, WithoutRecordsThereAreNoRowsButACache) {
 
 TEST_F(AppRowsTest, AStoreThatCannotBeReadGivesNoRowsButACache) {
     addNotes({kPRVServiceTidewater}, true);
-    platform.privacyConsentStore.isReadable = false;
+    platform.privacyConsentStore.unreadable = {kPRVServiceTidewater, kPRVServiceBrackwater};
 
     EXPECT_EQ(builtRows(), "");
     EXPECT_EQ(pane->_accessCache->allBundleIDs(), std::vector<BundleIdentifier>());
@@ -139,6 +139,7 @@ TEST_F(AppRowsTest, ARestrictedApplicationIsLockedAndReadsAsOff) {
     EXPECT_FALSE(row->isEnabled());
     EXPECT_EQ(row->value(), RowValue(false));
     EXPECT_TRUE(pane->_accessCache->isAccessGrantedForBundleID(kNotes));
+    EXPECT_EQ(log(), LogLines());
 }
 
 TEST_F(AppRowsTest, ARestrictionIsReadForTheValueAtOnceAndForTheLockWithTheNextList) {
@@ -176,6 +177,84 @@ TEST_F(AppRowsTest, ConsentThatOthersChangeShowsWithTheNextList) {
 
     pane->reloadSpecifiers();
     EXPECT_EQ(notes()->value(), RowValue(false));
+}
+
+TEST_F(AppRowsTest, RecordsOfOneServiceCountThoughTheOthersCannotBeRead) {
+    addNotes({kPRVServiceTidewater, kPRVServiceBrackwater}, true);
+    const auto turnOff = [this](const PrivacyService& unreadable) {
+        platform.privacyConsentStore.unreadable = {unreadable};
+        pane->reloadSpecifiers();
+        EXPECT_EQ(notes()->value(), RowValue(true));
+        static_cast<void>(takeCalls());
+        notes()->setValue(false);
+        return takeCalls();
+    };
+
+    EXPECT_EQ(turnOff(kPRVServiceBrackwater),
+              (Calls{"set kPRVServiceTidewater com.example.notes off",
+                     "terminate com.example.notes for 3, not reported"}));
+    EXPECT_EQ(turnOff(kPRVServiceTidewater),
+              Calls{"set kPRVServiceBrackwater com.example.notes off"});
+}
+
+TEST_F(AppRowsTest, TheRowsAreMadeUnsortedInTheOrderOfTheRecords) {
+    platform.applications.install("a", "Zeta");
+    platform.applications.install("c", "Alpha");
+    for (const char* const identifier : {"a", "b", "c"}) {
+        addRecord(kPRVServiceTidewater, identifier, true);
+    }
+
+    const std::string made = builtRows();
+
+    std::string expected;
+    const auto bundleIDs = pane->_accessCache->allBundleIDs();
+    ASSERT_TRUE(bundleIDs.has_value());
+    for (const BundleIdentifier& bundleID : *bundleIDs) {
+        if (bundleID.string() != "b") {
+            expected += (expected.empty() ? "" : " ") + bundleID.string();
+        }
+    }
+    EXPECT_EQ(made, expected);
+    EXPECT_EQ(made.size(), 3U);
+}
+
+TEST_F(AppRowsTest, OfTwoBundlesOnlyTheFirstIsKeptAndOnlyUntilTheNextList) {
+    addNotes({kPRVServiceTidewater, kPRVServiceBrackwater}, true);
+    auto& records = platform.privacyConsentStore.records;
+    const std::weak_ptr<Bundle> first = records[kPRVServiceTidewater].front().kPRVInfoBundle;
+    const std::weak_ptr<Bundle> second = records[kPRVServiceBrackwater].front().kPRVInfoBundle;
+    static_cast<void>(rows());
+
+    records.clear();
+    EXPECT_FALSE(first.expired());
+    EXPECT_TRUE(second.expired());
+
+    pane->reloadSpecifiers();
+    static_cast<void>(rows());
+    EXPECT_TRUE(first.expired());
+}
+
+TEST_F(AppRowsTest, ThePageThatGoesLetsTheBundlesGo) {
+    addNotes({kPRVServiceTidewater}, true);
+    auto& records = platform.privacyConsentStore.records;
+    const std::weak_ptr<Bundle> bundle = records[kPRVServiceTidewater].front().kPRVInfoBundle;
+    static_cast<void>(rows());
+    records.clear();
+    ASSERT_FALSE(bundle.expired());
+
+    pane.reset();
+
+    EXPECT_TRUE(bundle.expired());
+}
+
+TEST_F(AppRowsTest, AHiddenApplicationThatIsRestrictedKeepsItsConsentToo) {
+    addNotes({kPRVServiceTidewater}, false);
+    platform.applications.installed.at(kNotes)->granted = {{kHiddenEntitlement, {true}}};
+    platform.restrictions.cloudSyncDenied.insert(kNotes);
+
+    EXPECT_EQ(builtRows(), "");
+    EXPECT_EQ(takeCalls(), (Calls{"copy kPRVServiceTidewater", "copy kPRVServiceBrackwater"}));
+    EXPECT_EQ(log(), LogLines());
 }
 
 } // namespace

@@ -62,8 +62,9 @@ TEST_F(ServiceAccessCacheTest, AnApplicationThatItDoesNotKnowHasNothing) {
     EXPECT_EQ(cache.bundleForBundleID(kSketches), nullptr);
     EXPECT_EQ(cache.servicesForBundleID(kSketches), nullptr);
     EXPECT_EQ(cache.serviceNamesForBundleID(kSketches), std::nullopt);
-    cache.setAccessGrantedForBundleID(true, kSketches);
+    cache.setAccessGrantedForBundleID(false, kSketches);
     EXPECT_EQ(cache.allBundleIDs(), BundleIDs{kNotes});
+    EXPECT_TRUE(cache.isAccessGrantedForBundleID(kNotes));
 }
 
 TEST_F(ServiceAccessCacheTest, ARecordThatDoesNotSayWhetherAccessIsGrantedCountsAsRefused) {
@@ -121,7 +122,8 @@ TEST_F(ServiceAccessCacheTest, AccessIsGrantedWhereOneServiceIsWhicheverItIs) {
 }
 
 TEST_F(ServiceAccessCacheTest, SettingAccessSetsEveryServiceOfThatApplicationOnly) {
-    addTidewater({record(kNotes, true), record(kSketches, true)});
+    const PrivacyAccessRecord first = record(kNotes, true);
+    addTidewater({first, record(kSketches, true)});
     addBrackwater({record(kNotes, false)});
 
     cache.setAccessGrantedForBundleID(false, kNotes);
@@ -134,7 +136,7 @@ TEST_F(ServiceAccessCacheTest, SettingAccessSetsEveryServiceOfThatApplicationOnl
     }
     EXPECT_EQ(cache.serviceNamesForBundleID(kNotes),
               (Services{kPRVServiceTidewater, kPRVServiceBrackwater}));
-    EXPECT_NE(cache.bundleForBundleID(kNotes), nullptr);
+    EXPECT_EQ(cache.bundleForBundleID(kNotes), first.kPRVInfoBundle.get());
 }
 
 TEST_F(ServiceAccessCacheTest, AServiceThatIsAddedTwiceIsThereTwice) {
@@ -154,6 +156,38 @@ TEST_F(ServiceAccessCacheTest, TheServicesAreTheCachesOwn) {
     EXPECT_TRUE(cache.isAccessGrantedForBundleID(kNotes));
     cache.setAccessGrantedForBundleID(false, kNotes);
     EXPECT_FALSE(services->front().granted);
+}
+
+TEST_F(ServiceAccessCacheTest, RecordsThatAreAbsentChangeNothingOfAnotherService) {
+    addTidewater({record(kNotes, true)});
+    for (const auto& none : {std::optional<PrivacyAccessRecords>(),
+                             std::optional<PrivacyAccessRecords>(PrivacyAccessRecords())}) {
+        cache.addAccessInfoForServiceName(none, kPRVServiceBrackwater);
+
+        EXPECT_EQ(cache.allBundleIDs(), BundleIDs{kNotes});
+        EXPECT_EQ(cache.serviceNamesForBundleID(kNotes), Services{kPRVServiceTidewater});
+        EXPECT_TRUE(cache.isAccessGrantedForBundleID(kNotes));
+    }
+}
+
+TEST_F(ServiceAccessCacheTest, RecordsOfOneArrayKeepItsOrderAndTheBundleOfTheFirst) {
+    const PrivacyAccessRecord first = record(kNotes, true);
+    addTidewater({first, record(kNotes, false)});
+
+    EXPECT_EQ(cache.bundleForBundleID(kNotes), first.kPRVInfoBundle.get());
+    const auto& services = *cache.servicesForBundleID(kNotes);
+    ASSERT_EQ(services.size(), 2U);
+    EXPECT_TRUE(services[0].granted);
+    EXPECT_FALSE(services[1].granted);
+}
+
+TEST_F(ServiceAccessCacheTest, AnApplicationWithoutServicesHasNoAccessAndAnEmptyListOfNames) {
+    addTidewater({record(kNotes, true)});
+
+    cache.servicesForBundleID(kNotes)->clear();
+
+    EXPECT_FALSE(cache.isAccessGrantedForBundleID(kNotes));
+    EXPECT_EQ(cache.serviceNamesForBundleID(kNotes), Services());
 }
 
 } // namespace

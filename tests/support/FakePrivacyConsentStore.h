@@ -5,6 +5,7 @@
 #include <functional>
 #include <map>
 #include <optional>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -19,7 +20,7 @@ public:
     PRVAccessCopyInformation(const PrivacyService& service) override {
         _calls.push_back("copy " + service.string());
         onCopy();
-        return isReadable ? std::optional(records[service]) : std::nullopt;
+        return unreadable.contains(service) ? std::nullopt : std::optional(records[service]);
     }
 
     [[nodiscard]] bool PRVAccessSetForBundle(const PrivacyService& service, const Bundle* bundle,
@@ -33,7 +34,8 @@ public:
     }
 
     std::map<PrivacyService, PrivacyAccessRecords> records;
-    bool isReadable = true;
+    /// The services whose records cannot be read.
+    std::set<PrivacyService> unreadable;
     bool refuses = false;
     /// What the last record that was set was set for.
     const Bundle* lastBundle = nullptr;

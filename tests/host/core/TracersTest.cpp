@@ -154,7 +154,7 @@ TEST_F(Tracers, TellWhatIsAskedOfTheConsentStore) {
 }
 
 TEST_F(Tracers, LeaveAStoreThatCannotBeReadUnreadable) {
-    _platform.privacyConsentStore.isReadable = false;
+    _platform.privacyConsentStore.unreadable.insert(kPRVServiceTidewater);
 
     EXPECT_FALSE(_services.privacyConsentStore->PRVAccessCopyInformation(kPRVServiceTidewater));
 }
