@@ -45,30 +45,15 @@ std::expected<BundleFiles, Error> filesOf(const std::filesystem::path& source) {
 }
 
 std::expected<void, Error> putBundle(const DevicePaths& paths, const BundleFiles& files) {
-    constexpr mode_t readableByAll = 0755;
     const std::filesystem::path bundle = kDatabaseSettingsBundle;
     for (const auto& [name, content] : files) {
-        const auto folder =
-            makeFolder(paths, (bundle / name.parent_path()).string(), readableByAll);
+        const auto folder = makeFolder(paths, (bundle / name.parent_path()).string());
         if (!folder) {
             return std::unexpected(folder.error());
         }
         if (auto written = writeFileAtomically(*folder / name.filename(), content); !written) {
             return written;
         }
-    }
-    return {};
-}
-
-std::expected<void, Error> removeBundle(const DevicePaths& paths) {
-    const auto bundle = paths.resolve(kDatabaseSettingsBundle);
-    if (!bundle) {
-        return std::unexpected(bundle.error());
-    }
-    std::error_code failure;
-    std::filesystem::remove_all(*bundle, failure);
-    if (failure) {
-        return std::unexpected(fileError(*bundle, "cannot be removed", failure.value()));
     }
     return {};
 }
@@ -80,7 +65,7 @@ replaceDatabaseSettings(const DevicePaths& paths,
                         const std::optional<DeviceDescription::DatabaseSettings>& settings,
                         const std::filesystem::path& source) {
     if (!settings) {
-        return removeBundle(paths);
+        return removeFolder(paths, kDatabaseSettingsBundle);
     }
     auto files = filesOf(source);
     if (!files) {

@@ -78,11 +78,11 @@ std::expected<void, Error> replaceTool(const DevicePaths& paths, const Tool& too
     if (failure && tool.kind == Tool::Kind::real) {
         return std::unexpected(fileError(real, "cannot be found", failure.value()));
     }
-    constexpr mode_t runnableByEverybody = 0755;
-    const auto folder = makeFolder(paths, kToolDirectory, runnableByEverybody);
+    const auto folder = makeFolder(paths, kToolDirectory);
     if (!folder) {
         return std::unexpected(folder.error());
     }
+    constexpr mode_t runnableByEverybody = 0755;
     return writeFileAtomically(*folder / std::filesystem::path(kTool).filename(),
                                scriptOf(tool, program), runnableByEverybody);
 }

@@ -4,7 +4,6 @@
 
 #include <cerrno>
 #include <sys/stat.h>
-#include <system_error>
 #include <utility>
 
 namespace nimbra::device {
@@ -52,13 +51,7 @@ bool DeviceFileManager::isResourceReachable(const FileURL& url) {
 
 std::optional<std::string> DeviceFileManager::fileSystemRepresentation(const FileURL& url) {
     const auto place = placeOf(_paths, url.path());
-    if (!place) {
-        return std::nullopt;
-    }
-    // A program that took a path for an option, as its first character says, would be mistaken.
-    std::error_code failure;
-    const auto absolute = std::filesystem::absolute(*place, failure);
-    return failure ? std::nullopt : std::optional(absolute.string());
+    return place ? std::optional(*place) : std::nullopt;
 }
 
 void DeviceFileManager::planRemoveOutcomes(std::vector<std::optional<Error>> outcomes) {

@@ -6,7 +6,6 @@
 
 #include <cerrno>
 #include <fcntl.h>
-#include <system_error>
 #include <unistd.h>
 #include <utility>
 
@@ -19,8 +18,7 @@ std::string PriorityHints::directory() {
 }
 
 std::expected<void, Error> PriorityHints::add(const std::string& container) const {
-    constexpr mode_t forEverybodyToRead = 0755;
-    const auto folder = makeFolder(_paths, directory(), forEverybodyToRead);
+    const auto folder = makeFolder(_paths, directory());
     if (!folder) {
         return std::unexpected(folder.error());
     }
@@ -35,16 +33,7 @@ std::expected<void, Error> PriorityHints::add(const std::string& container) cons
 }
 
 std::expected<void, Error> PriorityHints::removeAll() const {
-    const auto folder = _paths.resolve(directory());
-    if (!folder) {
-        return std::unexpected(folder.error());
-    }
-    std::error_code failure;
-    std::filesystem::remove_all(*folder, failure);
-    if (failure) {
-        return std::unexpected(fileError(*folder, "cannot be removed", failure.value()));
-    }
-    return {};
+    return removeFolder(_paths, directory());
 }
 
 } // namespace nimbra::device

@@ -1,12 +1,11 @@
 #pragma once
 
 #include "device/files/DevicePaths.h"
+#include "device/files/Folders.h"
 #include "platform/values/Error.h"
 
 #include <expected>
-#include <optional>
 #include <string>
-#include <sys/types.h>
 
 namespace nimbra::device {
 
@@ -18,21 +17,13 @@ namespace nimbra::device {
 [[nodiscard]] std::expected<void, Error> removeItem(const DevicePaths& paths,
                                                     const std::string& devicePath);
 
-struct FolderMaking {
-    /// Whether folders that are missing above it are made, and one that stands there will do.
-    bool makesParents = false;
-    /// Those of a new folder, exactly; where none are given it is for everybody to read, as far as
-    /// the process does not mask it.
-    std::optional<mode_t> permissions;
-};
-
 /// Makes the folder called `devicePath`. The error is the errno.
 [[nodiscard]] std::expected<void, Error>
 createFolder(const DevicePaths& paths, const std::string& devicePath, const FolderMaking& making);
 
-/// Where the file called `devicePath` is, its links followed; nothing for a path that no file
-/// system knows, or whose links lead round in a circle.
-[[nodiscard]] std::optional<std::filesystem::path> placeOf(const DevicePaths& paths,
-                                                           const std::string& devicePath);
+/// Where the file called `devicePath` is on this machine, its links followed: an absolute path, as
+/// a program that is given another could take it for an option. The error is the errno.
+[[nodiscard]] std::expected<std::string, int> placeOf(const DevicePaths& paths,
+                                                      const std::string& devicePath);
 
 } // namespace nimbra::device

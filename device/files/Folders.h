@@ -5,15 +5,37 @@
 
 #include <expected>
 #include <filesystem>
+#include <optional>
 #include <string_view>
 #include <sys/types.h>
 
 namespace nimbra::device {
 
+// Folders of the device; any thread.
+
+/// How a folder is made.
+struct FolderMaking {
+    /// Whether folders that are missing above it are made, and one that stands there will do.
+    bool makesParents = false;
+    /// Those of a new folder, exactly; where none are given it is for everybody to read, as far as
+    /// the process does not mask it.
+    std::optional<mode_t> permissions;
+};
+
+/// Makes the folder at `place`, which `paths` has resolved. The device's root is never made: one
+/// that has been removed does not come back. Gives 0, or the errno.
+[[nodiscard]] int makeFolderAt(const DevicePaths& paths, const std::filesystem::path& place,
+                               const FolderMaking& making);
+
 /// Makes the folder that is called `devicePath` on the device, and those above it, where they are
-/// missing; a new one has `mode`, those above it are for everybody to read. Gives back where it is.
-/// The device's root is never made: one that has been removed does not come back. Any thread.
+/// missing, and gives back where it is; `permissions` as for `FolderMaking`.
 [[nodiscard]] std::expected<std::filesystem::path, Error>
-makeFolder(const DevicePaths& paths, std::string_view devicePath, mode_t mode);
+makeFolder(const DevicePaths& paths, std::string_view devicePath,
+           std::optional<mode_t> permissions = std::nullopt);
+
+/// Removes the folder that is called `devicePath` on the device, with everything in it. One that is
+/// not there is no error.
+[[nodiscard]] std::expected<void, Error> removeFolder(const DevicePaths& paths,
+                                                      std::string_view devicePath);
 
 } // namespace nimbra::device

@@ -1,5 +1,6 @@
 #include "device/system/DeviceProcesses.h"
 
+#include "device/files/FileOperations.h"
 #include "device/system/SpawnSettings.h"
 
 #include <algorithm>
@@ -101,7 +102,7 @@ std::expected<pid_t, int> DeviceProcesses::start(const SpawnRequest& request) co
         std::ranges::any_of(environment, hasNull)) {
         return std::unexpected(EINVAL);
     }
-    const auto program = placeOf(request.path);
+    const auto program = placeOf(_paths, request.path);
     if (!program) {
         return std::unexpected(program.error());
     }
@@ -113,7 +114,7 @@ std::expected<pid_t, int> DeviceProcesses::start(const SpawnRequest& request) co
         }
     }
     for (const SpawnFileActions::Open& open : request.fileActions.opens()) {
-        const auto path = open.path == "/dev/null" ? open.path : placeOf(open.path);
+        const auto path = open.path == "/dev/null" ? open.path : placeOf(_paths, open.path);
         if (!path) {
             return std::unexpected(path.error());
         }
@@ -128,23 +129,6 @@ std::expected<pid_t, int> DeviceProcesses::start(const SpawnRequest& request) co
     const int failure = ::posix_spawn(&process, program->c_str(), actions.get(), attributes.get(),
                                       arguments.get(), variables.get());
     return failure == 0 ? std::expected<pid_t, int>(process) : std::unexpected(failure);
-}
-
-std::expected<std::string, int> DeviceProcesses::placeOf(const std::string& devicePath) const {
-    if (devicePath.empty() || hasNull(devicePath)) {
-        return std::unexpected(devicePath.empty() ? ENOENT : EINVAL);
-    }
-    const auto place = _paths.resolve(devicePath);
-    if (!place) {
-        return std::unexpected(place.error().code);
-    }
-    // A script's interpreter is given the path, and could take a relative one for an option.
-    std::error_code failure;
-    const auto absolute = std::filesystem::absolute(*place, failure);
-    if (failure) {
-        return std::unexpected(failure.value());
-    }
-    return absolute.string();
 }
 
 std::expected<int, int> DeviceProcesses::waitpid(pid_t process) {

@@ -44,7 +44,6 @@ private:
     [[nodiscard]] std::expected<pid_t, int> start(const SpawnRequest& request) const;
     [[nodiscard]] std::expected<std::shared_ptr<const Child>, int> beginWaiting(pid_t process);
     [[nodiscard]] int awaitEnd(const Child& child) const;
-    [[nodiscard]] std::expected<std::string, int> placeOf(const std::string& devicePath) const;
 
     const DevicePaths _paths;
     PlannedOutcomes<int> _spawnOutcomes;

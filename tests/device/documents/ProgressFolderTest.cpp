@@ -5,6 +5,7 @@
 #include "device/documents/ProgressPublisher.h"
 #include "platform/system/SystemLog.h"
 #include "platform/system/WorkQueue.h"
+#include "tests/device/ReadOnly.h"
 #include "tests/device/TestFiles.h"
 #include "tests/device/documents/ProgressObserver.h"
 #include "tests/support/TemporaryDirectory.h"
@@ -224,7 +225,22 @@ TEST_F(ProgressFolderTest, AFileInTheFoldersPlaceIsToldOf) {
 
     folder().start();
 
-    expectLogged({place().string() + ": cannot be watched: Not a directory"});
+    expectLogged({place().string() + ": cannot be made: Not a directory"});
+}
+
+TEST_F(ProgressFolderTest, AFolderThatCannotBeWatchedIsToldOf) {
+    std::filesystem::create_directories(place());
+    const auto root = place().parent_path().parent_path().parent_path();
+    std::filesystem::permissions(root, std::filesystem::perms(0755));
+    std::filesystem::create_directory(root / "other");
+    std::filesystem::permissions(place(), std::filesystem::perms::none);
+    {
+        const test::ReadOnly asSomebodyElse(root / "other");
+        folder().start();
+    }
+    std::filesystem::permissions(place(), std::filesystem::perms::owner_all);
+
+    expectLogged({place().string() + ": cannot be watched: Permission denied"});
 }
 
 TEST_F(ProgressFolderTest, WhenTheFolderGoesItsProgressEnds) {

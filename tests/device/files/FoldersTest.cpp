@@ -1,7 +1,9 @@
 #include "device/files/Folders.h"
 
+#include "tests/device/ReadOnly.h"
 #include "tests/support/TemporaryDirectory.h"
 
+#include <expected>
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
@@ -67,6 +69,17 @@ TEST_F(FoldersTest, AFileInTheWayIsAnError) {
               (root() / "run/nimbra").string() + ": cannot be made: Not a directory");
 }
 
+TEST_F(FoldersTest, AFileInItsPlaceIsAnError) {
+    std::filesystem::create_directory(root() / "run");
+    std::ofstream(root() / "run/nimbra") << "in its place";
+
+    const auto made = make("/run/nimbra");
+
+    ASSERT_FALSE(made);
+    EXPECT_EQ(made.error().description,
+              (root() / "run/nimbra").string() + ": cannot be made: Not a directory");
+}
+
 TEST_F(FoldersTest, ALinkLeadsToNoFolderOutsideTheDevice) {
     std::filesystem::create_directory_symlink("/elsewhere", root() / "run");
 
@@ -75,6 +88,43 @@ TEST_F(FoldersTest, ALinkLeadsToNoFolderOutsideTheDevice) {
     ASSERT_TRUE(made) << made.error();
     EXPECT_EQ(*made, root() / "elsewhere/nimbra");
     EXPECT_TRUE(std::filesystem::is_directory(root() / "elsewhere/nimbra"));
+}
+
+TEST_F(FoldersTest, AFolderOfNoPermissionsOfItsOwnIsForEverybodyToRead) {
+    const auto made = makeFolder(DevicePaths(root()), "/run/nimbra");
+
+    ASSERT_TRUE(made) << made.error();
+    EXPECT_NE(modeOf(*made) & std::filesystem::perms::others_read, std::filesystem::perms::none);
+}
+
+TEST_F(FoldersTest, AFolderIsRemovedWithAllThatIsInIt) {
+    std::filesystem::create_directories(root() / "run/nimbra/progress");
+    std::ofstream(root() / "run/nimbra/progress/sync.json") << "{}";
+
+    const auto removed = removeFolder(DevicePaths(root()), "/run/nimbra");
+
+    EXPECT_TRUE(removed) << removed.error();
+    EXPECT_FALSE(std::filesystem::exists(root() / "run/nimbra"));
+    EXPECT_TRUE(std::filesystem::exists(root() / "run"));
+}
+
+TEST_F(FoldersTest, AFolderThatIsNotThereNeedNotBeRemoved) {
+    EXPECT_TRUE(removeFolder(DevicePaths(root()), "/run/nimbra"));
+}
+
+TEST_F(FoldersTest, AFolderThatCannotBeRemovedIsAnError) {
+    std::filesystem::create_directories(root() / "run/nimbra");
+    std::filesystem::permissions(root().parent_path(), std::filesystem::perms(0755));
+    std::expected<void, Error> removed;
+    {
+        const test::ReadOnly readOnly(root() / "run");
+        removed = removeFolder(DevicePaths(root()), "/run/nimbra");
+    }
+
+    ASSERT_FALSE(removed);
+    EXPECT_TRUE(std::filesystem::exists(root() / "run/nimbra"));
+    EXPECT_EQ(removed.error().description,
+              (root() / "run/nimbra").string() + ": cannot be removed: Permission denied");
 }
 
 } // namespace

@@ -298,7 +298,7 @@ TEST_F(DeviceDistributedNotificationCenterTest, WithoutAFolderAProcessHearsItsOw
     const auto center = makeCenter();
     const auto first = center->addObserverForName(name(), recording("first"));
     const auto second = center->addObserverForName(name(), recording("second"));
-    EXPECT_EQ(logged(), Calls{folder().string() + ": cannot be opened: Not a directory"});
+    EXPECT_EQ(logged(), Calls{folder().string() + ": cannot be made: Not a directory"});
 
     center->postNotification({.name = name()});
     queue().pump();
