@@ -20,12 +20,8 @@
 #include "platform/system/FileManager.h"
 #include "platform/system/Localization.h"
 #include "platform/system/SystemLog.h"
-#include "platform/views/ViewAnimations.h"
+#include "tests/device/DevicePlatformFixture.h"
 #include "tests/device/TestFiles.h"
-#include "tests/support/FakeViewMetrics.h"
-#include "tests/support/PumpedQueue.h"
-#include "tests/support/RecordingPresenter.h"
-#include "tests/support/TemporaryDirectory.h"
 
 #include <future>
 #include <gtest/gtest.h>
@@ -35,7 +31,7 @@
 namespace nimbra::device {
 namespace {
 
-class DevicePlatformTest : public testing::Test {
+class DevicePlatformTest : public test::DevicePlatformFixture {
 protected:
     DevicePlatformTest() {
         DeviceDescription description;
@@ -47,46 +43,22 @@ protected:
         EXPECT_TRUE(created) << created.error();
     }
 
-    [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }
     [[nodiscard]] std::filesystem::path state(const std::string& name) const {
         return root() / "var/lib/nimbra" / name;
-    }
-
-    [[nodiscard]] std::unique_ptr<DevicePlatform> open() {
-        auto platform = DevicePlatform::open(root(), _mainQueue);
-        EXPECT_TRUE(platform) << platform.error();
-        return std::move(*platform);
     }
 
     /// Expects that opening fails with `message` about `name` and leaves every byte as it was.
     void expectRefusal(const std::string& name, const std::string& message) {
         const auto before = test::treeOf(root());
-        const auto platform = DevicePlatform::open(root(), _mainQueue);
+        const auto platform = DevicePlatform::open(root(), mainQueue());
         ASSERT_FALSE(platform);
         EXPECT_EQ(platform.error().description, state(name).string() + ": " + message);
         EXPECT_EQ(test::treeOf(root()), before);
     }
-
-    [[nodiscard]] test::PumpedQueue& mainQueue() { return _mainQueue; }
-    [[nodiscard]] test::RecordingPresenter& presenter() { return _presenter; }
-    [[nodiscard]] test::FakeViewMetrics& viewMetrics() { return _viewMetrics; }
-    [[nodiscard]] DevicePlatform::HostServices host() {
-        return {.presenter = _presenter,
-                .viewMetrics = _viewMetrics,
-                .viewAnimations = _viewAnimations};
-    }
-
-private:
-    test::TemporaryDirectory _directory;
-    test::PumpedQueue _mainQueue{"main"};
-    std::vector<std::string> _calls;
-    test::RecordingPresenter _presenter{_calls};
-    test::FakeViewMetrics _viewMetrics;
-    ViewAnimations _viewAnimations;
 };
 
 TEST_F(DevicePlatformTest, TheServicesAnswerFromTheDirectory) {
-    const auto platform = open();
+    const auto platform = openPlatform();
 
     const PlatformServices services = platform->servicesFor(host());
 
@@ -156,7 +128,7 @@ TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
 
 TEST_F(DevicePlatformTest, WhatTimersAndDistributedNotificationsHoldGoesWithThePlatform) {
     const auto held = std::make_shared<int>(0);
-    auto platform = open();
+    auto platform = openPlatform();
     const PlatformServices services = platform->servicesFor(host());
     auto timer = services.workQueues->timerSourceOnQueue(mainQueue());
     timer->setEventHandler([held, timer] { ++*held; });
@@ -181,7 +153,7 @@ TEST_F(DevicePlatformTest, WhatTimersAndDistributedNotificationsHoldGoesWithTheP
 TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
     std::vector<std::string> seen;
     const auto held = std::make_shared<int>();
-    auto platform = open();
+    auto platform = openPlatform();
     const PlatformServices services = platform->servicesFor(host());
     const auto subscribe = [&] {
         return services.progressReports->_addSubscriberForFileURLWithPublishingHandler(
@@ -208,7 +180,7 @@ TEST_F(DevicePlatformTest, ProgressReachesSubscribersUntilThePlatformEnds) {
 
 TEST_F(DevicePlatformTest, TheDevicesOfAnAccountAreThoseOfItsFile) {
     test::writeTestFile(state("device-list.json"), R"({"needUpgrade": ["Pad"]})");
-    const auto platform = open();
+    const auto platform = openPlatform();
     const PlatformServices services = platform->servicesFor(host());
     std::promise<DeviceListResponse> answered;
 
@@ -226,7 +198,7 @@ TEST_F(DevicePlatformTest, TheDevicesOfAnAccountAreThoseOfItsFile) {
 
 TEST_F(DevicePlatformTest, ADeviceWithABrokenListOfDevicesOpensAndAnswersWithNone) {
     test::writeTestFile(state("device-list.json"), "{");
-    const auto platform = open();
+    const auto platform = openPlatform();
     const PlatformServices services = platform->servicesFor(host());
     std::promise<bool> answered;
 
@@ -243,7 +215,7 @@ TEST_F(DevicePlatformTest, ADeviceWithABrokenListOfDevicesOpensAndAnswersWithNon
 TEST_F(DevicePlatformTest, HandlersThatWaitForDevicesGoWhileTheServicesAreStillThere) {
     for (const char* const text : {R"({"outcome": "never answers"})", R"({"delay": 1000})"}) {
         test::writeTestFile(state("device-list.json"), text);
-        auto platform = open();
+        auto platform = openPlatform();
         const PlatformServices services = platform->servicesFor(host());
         std::size_t found = 0;
         // Asks a service when it goes, as a screen may.
@@ -263,7 +235,7 @@ TEST_F(DevicePlatformTest, HandlersThatWaitForDevicesGoWhileTheServicesAreStillT
 }
 
 TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
-    const auto platform = open();
+    const auto platform = openPlatform();
     std::promise<void> completed;
 
     platform->servicesFor(host()).documentContainers->forceRefreshAllContainersWithCompletion(
@@ -273,7 +245,7 @@ TEST_F(DevicePlatformTest, ARefreshCompletesOnTheDevicesQueue) {
 }
 
 TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
-    auto platform = open();
+    auto platform = openPlatform();
     const PlatformServices services = platform->servicesFor(host());
     const auto queue = services.workQueues->serialQueueWithLabel("late");
     std::promise<void> start;
@@ -292,14 +264,14 @@ TEST_F(DevicePlatformTest, TheEndWaitsForTheWorkThatUsesTheServices) {
 TEST_F(DevicePlatformTest, OpeningAndReadingLeavesTheDirectoryAsItWas) {
     const auto before = test::treeOf(root());
 
-    EXPECT_TRUE(open()->accountStore().accountIdentifiers());
+    EXPECT_TRUE(openPlatform()->accountStore().accountIdentifiers());
 
     EXPECT_EQ(test::treeOf(root()), before);
 }
 
 TEST_F(DevicePlatformTest, ADeviceOfAnEarlierVersionHasNoConsentUntilSomeIsGiven) {
     std::filesystem::remove(state("consent.db"));
-    const auto platform = open();
+    const auto platform = openPlatform();
     PrivacyConsentStore& store = platform->servicesFor(host()).privacyConsentStore;
     const ConsentBundle bundle{BundleIdentifier("a")};
 

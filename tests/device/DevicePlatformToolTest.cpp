@@ -1,15 +1,10 @@
 #include "device/DeviceDirectory.h"
-#include "device/DevicePlatform.h"
 #include "device/documents/DeviceFileManager.h"
 #include "device/system/DeviceProcesses.h"
 #include "device/system/DeviceWorkQueues.h"
-#include "platform/views/ViewAnimations.h"
 #include "tests/device/Children.h"
+#include "tests/device/DevicePlatformFixture.h"
 #include "tests/device/TestFiles.h"
-#include "tests/support/FakeViewMetrics.h"
-#include "tests/support/PumpedQueue.h"
-#include "tests/support/RecordingPresenter.h"
-#include "tests/support/TemporaryDirectory.h"
 
 #include <cerrno>
 #include <csignal>
@@ -22,39 +17,22 @@
 namespace nimbra::device {
 namespace {
 
-class DevicePlatformToolTest : public testing::Test {
+class DevicePlatformToolTest : public test::DevicePlatformFixture {
 protected:
-    [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }
-
     [[nodiscard]] std::unique_ptr<DevicePlatform>
     open(const DeviceDescription::Tool& tool = {.kind = DeviceDescription::Tool::Kind::standIn}) {
         DeviceDescription description;
         description.tool = tool;
         const auto made = createDeviceDirectory(root(), description);
         EXPECT_TRUE(made) << made.error();
-        auto platform = DevicePlatform::open(root(), _mainQueue);
-        EXPECT_TRUE(platform) << platform.error();
-        return std::move(*platform);
+        return openPlatform();
     }
-    [[nodiscard]] PlatformServices servicesOf(DevicePlatform& platform) {
-        return platform.servicesFor({.presenter = _presenter,
-                                     .viewMetrics = _viewMetrics,
-                                     .viewAnimations = _viewAnimations});
-    }
-
-private:
-    test::TemporaryDirectory _directory;
-    test::PumpedQueue _mainQueue{"main"};
-    std::vector<std::string> _calls;
-    test::RecordingPresenter _presenter{_calls};
-    test::FakeViewMetrics _viewMetrics;
-    ViewAnimations _viewAnimations;
 };
 
 TEST_F(DevicePlatformToolTest, TheToolOfTheDeviceWritesItsArchiveWhereThePageHasMadeRoom) {
     const auto platform = open(
         {.kind = DeviceDescription::Tool::Kind::standIn, .writesArchive = true, .exitStatus = 6});
-    const PlatformServices services = servicesOf(*platform);
+    const PlatformServices services = platform->servicesFor(host());
     const FileURL archive("/var/mobile/logs/archive.tar.gz");
     ASSERT_TRUE(services.fileManager->createDirectoryAtPathWithIntermediateDirectoriesAttributes(
         "/var/mobile/logs/", true, {.posixPermissions = 0777}));
@@ -75,7 +53,7 @@ TEST_F(DevicePlatformToolTest, TheToolOfTheDeviceWritesItsArchiveWhereThePageHas
 
 TEST_F(DevicePlatformToolTest, TheHostPlansTheFailuresOfThePagesServices) {
     const auto platform = open();
-    const PlatformServices services = servicesOf(*platform);
+    const PlatformServices services = platform->servicesFor(host());
     platform->fileManager().planRemoveOutcomes({Error{.domain = "D", .code = 1}});
     platform->processes().planSpawnOutcomes({EAGAIN});
 
@@ -92,7 +70,7 @@ TEST_F(DevicePlatformToolTest, AToolThatNeverEndsDoesNotKeepThePlatformFromEndin
     ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
     test::writeTestFile(root() / "usr/bin/mrctl",
                         "#!/bin/sh\ntrap '' TERM\necho ready >\"$1\"\nread -r line <\"$1\"\n");
-    const PlatformServices services = servicesOf(*platform);
+    const PlatformServices services = platform->servicesFor(host());
     std::expected<pid_t, int> process;
     std::expected<int, int> status;
     services.workQueues->globalQueueWithQuality(UserInitiatedQuality).async([&] {
