@@ -1,17 +1,9 @@
 #include "host/core/trace/SaveTracing.h"
 
 #include "host/core/trace/Trace.h"
-#include "platform/accounts/Account.h"
+#include "host/core/trace/TracingAccount.h"
 
 namespace nimbra::host {
-
-namespace {
-
-nlohmann::ordered_json identifierOf(const std::shared_ptr<Account>& account) {
-    return account ? nlohmann::ordered_json(account->identifier().string()) : nullptr;
-}
-
-} // namespace
 
 void traceSaveStart(Trace& trace, const char* operation, const std::shared_ptr<Account>& account) {
     trace.write("save",

@@ -2,7 +2,7 @@
 
 #include "host/core/RowDescription.h"
 #include "host/core/trace/Trace.h"
-#include "platform/accounts/Account.h"
+#include "host/core/trace/TracingAccount.h"
 #include "platform/host/SettingsListController.h"
 #include "platform/system/ClassRegistry.h"
 #include "platform/views/ViewAnimations.h"
@@ -95,7 +95,7 @@ void SessionTracer::traceDetail(const Specifier& row) {
     const auto account = userInfoValue<std::shared_ptr<Account>>(row.userInfo(), AccountKey);
     _trace.write("detail",
                  {{"class", jsonOf(pageClass != nullptr ? Text(pageClass->name) : Text())},
-                  {"account", jsonOf(account ? Text(account->identifier().string()) : Text())}});
+                  {"account", identifierOf(account)}});
 }
 
 } // namespace nimbra::host

@@ -6,6 +6,10 @@
 
 namespace nimbra::host {
 
+nlohmann::ordered_json identifierOf(const std::shared_ptr<Account>& account) {
+    return account ? nlohmann::ordered_json(account->identifier().string()) : nullptr;
+}
+
 TracingAccount::TracingAccount(std::shared_ptr<Account> account, Trace& trace)
     : _account(std::move(account)), _trace(trace) {}
 

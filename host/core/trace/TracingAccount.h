@@ -3,10 +3,14 @@
 #include "platform/accounts/Account.h"
 
 #include <memory>
+#include <nlohmann/json.hpp>
 
 namespace nimbra::host {
 
 class Trace;
+
+/// The identifier of `account` as traces have it; null for none.
+[[nodiscard]] nlohmann::ordered_json identifierOf(const std::shared_ptr<Account>& account);
 
 /// Stands for another account and traces what is changed on it.
 class TracingAccount final : public Account {

@@ -37,8 +37,8 @@ private:
 std::shared_ptr<DeviceListRequest>
 TracingDeviceListRequests::initWithAccount(const std::shared_ptr<Account>& account) {
     return std::make_shared<TracingRequest>(
-        _requests.initWithAccount(TracingAccount::original(account)),
-        account ? nlohmann::ordered_json(account->identifier().string()) : nullptr, _trace);
+        _requests.initWithAccount(TracingAccount::original(account)), identifierOf(account),
+        _trace);
 }
 
 } // namespace nimbra::host
