@@ -24,19 +24,32 @@ namespace {
 
 class ScenarioPlayerTest : public testing::Test {
 protected:
+    /// What a scenario is played with, up to its first step. Its lines go to `lines`.
+    struct Prepared {
+        Scenario scenario;
+        std::shared_ptr<device::StandingTime> time;
+        std::unique_ptr<PaneSession> session;
+    };
+    std::unique_ptr<Prepared> prepare(const std::string& text) {
+        auto scenario = readScenario(text, "scenario");
+        EXPECT_TRUE(scenario) << scenario.error();
+        EXPECT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
+        auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
+        auto session = PaneSession::start(
+            {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
+        EXPECT_TRUE(session) << session.error();
+        return std::make_unique<Prepared>(std::move(*scenario), std::move(time),
+                                          std::move(*session));
+    }
+    ScenarioPlayer playerOf(const Prepared& prepared, RunningApplications& applications) {
+        return {prepared.scenario, *prepared.session, applications, *prepared.time, trace};
+    }
     /// Plays these steps on a device without applications; those that come run where
     /// `applications` says.
     std::expected<void, StepFailure> play(RunningApplications& applications,
                                           const std::string& steps) {
-        const auto scenario = readScenario(R"({"steps": [)" + steps + "]}", "scenario");
-        EXPECT_TRUE(scenario) << scenario.error();
-        EXPECT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
-        Trace trace([](const std::string&) {});
-        const auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
-        const auto session = PaneSession::start(
-            {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
-        EXPECT_TRUE(session) << session.error();
-        return ScenarioPlayer(*scenario, **session, applications, *time, trace).play();
+        const auto prepared = prepare(R"({"steps": [)" + steps + "]}");
+        return playerOf(*prepared, applications).play();
     }
 
     [[nodiscard]] std::filesystem::path root() const { return _directory.path() / "device"; }
@@ -44,6 +57,9 @@ protected:
     [[nodiscard]] bool isRecorded(const std::string& application) const {
         return std::filesystem::exists(root() / "run/nimbra" / (application + ".pid"));
     }
+
+    std::vector<std::string> lines;
+    Trace trace{[this](const std::string& line) { lines.push_back(line); }};
 
 private:
     test::TemporaryDirectory _directory;
@@ -89,22 +105,14 @@ TEST_F(ScenarioPlayerTest, AnApplicationThatCannotBeStartedFailsTheStep) {
 }
 
 TEST_F(ScenarioPlayerTest, AStepOfItsOwnWaitsForNothing) {
-    const auto scenario =
-        readScenario(R"({"device": {"accounts": [{"identifier": "primary", "usesStratafile": true,
-                                                  "enabled": ["kAccountDataclassTidewater"]}]},
-                         "steps": [{"do": "open"}, {"do": "set", "row": "Nimbra Drive",
-                                                    "value": false}]})",
-                     "scenario");
-    ASSERT_TRUE(scenario) << scenario.error();
-    ASSERT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
-    std::vector<std::string> lines;
-    Trace trace([&lines](const std::string& line) { lines.push_back(line); });
-    const auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
-    const auto session = PaneSession::start(
-        {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
-    ASSERT_TRUE(session) << session.error();
+    const auto prepared =
+        prepare(R"({"device": {"accounts": [{"identifier": "primary", "usesStratafile": true,
+                                             "enabled": ["kAccountDataclassTidewater"]}]},
+                    "steps": [{"do": "open"}, {"do": "set", "row": "Nimbra Drive",
+                                               "value": false}]})");
+    PaneSession& session = *prepared->session;
     RunningApplications applications(root());
-    ScenarioPlayer player(*scenario, **session, applications, *time, trace);
+    ScenarioPlayer player = playerOf(*prepared, applications);
 
     player.begin();
     ASSERT_TRUE(player.hasNext());
@@ -114,27 +122,19 @@ TEST_F(ScenarioPlayerTest, AStepOfItsOwnWaitsForNothing) {
 
     EXPECT_FALSE(player.hasNext());
     // The save is yet to be told of.
-    EXPECT_FALSE((*session)->isSettled());
-    (*session)->settle();
-    EXPECT_TRUE((*session)->isSettled());
+    EXPECT_FALSE(session.isSettled());
+    session.settle();
+    EXPECT_TRUE(session.isSettled());
     player.end();
     const auto written = lines.size();
-    (*session)->closePane();
+    session.closePane();
     EXPECT_EQ(lines.size(), written);
 }
 
 TEST_F(ScenarioPlayerTest, NoStepIsLeftAfterOneThatCannotBeDone) {
-    const auto scenario =
-        readScenario(R"({"steps": [{"do": "list"}, {"do": "open"}]})", "scenario");
-    ASSERT_TRUE(scenario) << scenario.error();
-    ASSERT_TRUE(device::createDeviceDirectory(root(), scenario->device.description));
-    Trace trace([](const std::string&) {});
-    const auto time = std::make_shared<device::StandingTime>(scenario->device.description.now);
-    const auto session = PaneSession::start(
-        {.root = root(), .bundle = NIMBRA_PANE_BUNDLE, .trace = &trace, .timeSource = time});
-    ASSERT_TRUE(session) << session.error();
+    const auto prepared = prepare(R"({"steps": [{"do": "list"}, {"do": "open"}]})");
     RunningApplications applications(root());
-    ScenarioPlayer player(*scenario, **session, applications, *time, trace);
+    ScenarioPlayer player = playerOf(*prepared, applications);
     player.begin();
 
     const auto done = player.performNext();
@@ -144,7 +144,7 @@ TEST_F(ScenarioPlayerTest, NoStepIsLeftAfterOneThatCannotBeDone) {
     EXPECT_EQ(done.error().name, "list");
     EXPECT_EQ(done.error().reason, "no pane is open");
     EXPECT_FALSE(player.hasNext());
-    EXPECT_FALSE((*session)->isPaneOpen());
+    EXPECT_FALSE(prepared->session->isPaneOpen());
 }
 
 TEST(ScenarioReading, AShareStepSaysHowTheUserLeavesTheSheet) {

@@ -4,29 +4,18 @@
 #include "host/core/PaneSession.h"
 #include "host/core/trace/Trace.h"
 #include "tests/device/TestFiles.h"
+#include "tests/host/SampleScenarios.h"
 #include "tests/support/TemporaryDirectory.h"
 
-#include <algorithm>
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <poll.h>
 #include <string>
-#include <vector>
 
 namespace nimbra::host {
 namespace {
 
-const std::filesystem::path samples = NIMBRA_SAMPLES;
-
-std::vector<std::string> sampleNames() {
-    std::vector<std::string> names;
-    for (const auto& entry : std::filesystem::directory_iterator(samples)) {
-        if (entry.path().extension() == ".json") {
-            names.push_back(entry.path().stem());
-        }
-    }
-    return names;
-}
+const std::filesystem::path samples = test::sampleScenarios();
 
 /// Runs the main queue as a window does: when it wakes up, until nothing is left to do.
 void settleByWakingUp(PaneSession& session) {
@@ -62,12 +51,8 @@ TEST_P(SteppedSamples, TraceAsWhenTheyAreJustPlayed) {
     EXPECT_EQ(lines, *expected);
 }
 
-INSTANTIATE_TEST_SUITE_P(All, SteppedSamples, testing::ValuesIn(sampleNames()),
-                         [](const testing::TestParamInfo<std::string>& sample) {
-                             std::string name = sample.param;
-                             std::ranges::replace(name, '-', '_');
-                             return name;
-                         });
+INSTANTIATE_TEST_SUITE_P(All, SteppedSamples, testing::ValuesIn(test::namesOfSampleScenarios()),
+                         test::testNameOf);
 
 class ScenarioSessionTest : public testing::Test {
 protected:

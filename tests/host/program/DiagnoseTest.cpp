@@ -1,4 +1,4 @@
-#include "tests/host/program/Program.h"
+#include "tests/host/program/DeviceProgram.h"
 #include "tests/host/program/TypedProgram.h"
 
 #include <filesystem>
@@ -13,30 +13,18 @@ constexpr const char* row = "CLOUD_DRIVE_DIAGNOSE";
 constexpr const char* busy = "Collecting Diagnostics…\n";
 
 /// A device whose log level shows the diagnostics.
-class Diagnose : public testing::Test {
+class Diagnose : public DeviceProgram {
 protected:
     Diagnose() { init(R"({"writesArchive": true})"); }
 
     void init(const std::string& tool) {
-        std::filesystem::remove_all(program.path("device"));
-        const auto file = program.write("device.json", R"({
+        makeDevice(R"({
             "name": "Lab’s Phone",
             "accounts": [{"identifier": "primary", "primary": true, "usesStratafile": true,
                           "enabled": ["kAccountDataclassTidewater"]}],
             "preferences": {"com.vantrel.marrow": {"log.level": 7}},
-            "tool": )" + tool + "}");
-        const auto made =
-            program.run({"init", program.path("device").string(), "--from", file.string()});
-        EXPECT_EQ(made.status, 0) << made.messages;
-        EXPECT_EQ(made.messages, "");
-    }
-    [[nodiscard]] std::vector<std::string> onDevice(std::vector<std::string> arguments) const {
-        arguments.insert(arguments.begin(), {"--root", program.path("device").string()});
-        return arguments;
-    }
-    [[nodiscard]] ProgramResult run(const std::vector<std::string>& arguments,
-                                    const std::string& input = {}) const {
-        return program.run(onDevice(arguments), input);
+            "tool": )" +
+                   tool + "}");
     }
     [[nodiscard]] std::filesystem::path archives() const {
         return program.path("device") /
@@ -64,8 +52,6 @@ protected:
         }
         return program.runOther(command, input);
     }
-
-    Program program;
 };
 
 TEST_F(Diagnose, SaysWhereTheArchiveIs) {

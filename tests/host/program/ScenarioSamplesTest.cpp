@@ -1,25 +1,14 @@
+#include "tests/host/SampleScenarios.h"
 #include "tests/host/program/Program.h"
 
-#include <algorithm>
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <string>
-#include <vector>
 
 namespace nimbra::test {
 namespace {
 
-const std::filesystem::path samples = NIMBRA_SAMPLES;
-
-std::vector<std::string> sampleNames() {
-    std::vector<std::string> names;
-    for (const auto& entry : std::filesystem::directory_iterator(samples)) {
-        if (entry.path().extension() == ".json") {
-            names.push_back(entry.path().stem());
-        }
-    }
-    return names;
-}
+const std::filesystem::path samples = sampleScenarios();
 
 class ScenarioSamples : public testing::TestWithParam<std::string> {};
 
@@ -36,12 +25,8 @@ TEST_P(ScenarioSamples, PlayAsTheirTraceSays) {
     EXPECT_TRUE(program.leftNothingBehind());
 }
 
-INSTANTIATE_TEST_SUITE_P(All, ScenarioSamples, testing::ValuesIn(sampleNames()),
-                         [](const testing::TestParamInfo<std::string>& sample) {
-                             std::string name = sample.param;
-                             std::ranges::replace(name, '-', '_');
-                             return name;
-                         });
+INSTANTIATE_TEST_SUITE_P(All, ScenarioSamples, testing::ValuesIn(namesOfSampleScenarios()),
+                         testNameOf);
 
 TEST(ScenarioSampleFiles, EveryTraceHasItsScenario) {
     for (const auto& entry : std::filesystem::directory_iterator(samples)) {

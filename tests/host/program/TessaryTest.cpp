@@ -1,4 +1,4 @@
-#include "tests/host/program/Program.h"
+#include "tests/host/program/DeviceProgram.h"
 
 #include <filesystem>
 #include <fstream>
@@ -19,26 +19,17 @@ constexpr const char* page =
     "    its email address.\n";
 
 /// A device with the settings of the cloud database, and commands on it.
-class Tessary : public testing::Test {
+class Tessary : public DeviceProgram {
 protected:
     Tessary() { init(R"({"numAppGroups": 2})"); }
 
     void init(const std::string& settings) {
-        std::filesystem::remove_all(program.path("device"));
-        const auto file = program.write("device.json", R"({
+        makeDevice(R"({
             "accounts": [{"identifier": "primary", "primary": true, "usesStratafile": true,
                           "provisioned": ["kAccountDataclassTSYDatabaseService"],
                           "tessaryAccount": "database"}],
-            "databaseSettings": )" + settings + "}");
-        const auto made =
-            program.run({"init", program.path("device").string(), "--from", file.string()});
-        EXPECT_EQ(made.status, 0) << made.messages;
-        EXPECT_EQ(made.messages, "");
-    }
-    [[nodiscard]] ProgramResult run(std::vector<std::string> arguments,
-                                    const std::string& input = {}) const {
-        arguments.insert(arguments.begin(), {"--root", program.path("device").string()});
-        return program.run(arguments, input);
+            "databaseSettings": )" +
+                   settings + "}");
     }
     [[nodiscard]] std::filesystem::path bundle() const {
         return program.path("device") /
@@ -68,8 +59,6 @@ protected:
         EXPECT_NE(log().find("Tessary settings bundle not loaded. Loading..."), std::string::npos);
         EXPECT_NE(log().find(reason), std::string::npos) << log();
     }
-
-    Program program;
 };
 
 TEST_F(Tessary, TheRowShowsHowManyGroupsUseTheDatabase) {

@@ -1,4 +1,4 @@
-#include "tests/host/program/Program.h"
+#include "tests/host/program/DeviceProgram.h"
 #include "tests/host/program/TypedProgram.h"
 
 #include <SQLiteCpp/SQLiteCpp.h>
@@ -13,26 +13,13 @@ namespace {
 constexpr const char* row = "Upgrade to Nimbra Drive";
 
 /// A device whose account uses the older storage.
-class Upgrade : public testing::Test {
+class Upgrade : public DeviceProgram {
 protected:
     Upgrade() { init(R"("deviceList": {"needUpgrade": ["Work Phone"], "incompatible": ["Den"]})"); }
 
     void init(const std::string& more) {
-        std::filesystem::remove_all(program.path("device"));
-        const auto file = program.write(
-            "device.json",
-            R"({"accounts": [{"identifier": "primary", "usesStratafile": false}], )" + more + "}");
-        const auto made =
-            program.run({"init", program.path("device").string(), "--from", file.string()});
-        EXPECT_EQ(made.status, 0) << made.messages;
-    }
-    [[nodiscard]] std::vector<std::string> onDevice(std::vector<std::string> arguments) const {
-        arguments.insert(arguments.begin(), {"--root", program.path("device").string()});
-        return arguments;
-    }
-    [[nodiscard]] ProgramResult run(const std::vector<std::string>& arguments,
-                                    const std::string& input = {}) const {
-        return program.run(onDevice(arguments), input);
+        makeDevice(R"({"accounts": [{"identifier": "primary", "usesStratafile": false}], )" + more +
+                   "}");
     }
     void expectUpgraded() const {
         EXPECT_EQ(run({"get", "Nimbra Drive"}).output, "on\n");
@@ -42,8 +29,6 @@ protected:
         EXPECT_EQ(run({"get", "Nimbra Drive"}).output, "off\n");
         EXPECT_NE(run({"list"}).output.find(row), std::string::npos);
     }
-
-    Program program;
 };
 
 constexpr const char* screen =
