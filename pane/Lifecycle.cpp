@@ -7,10 +7,13 @@
 
 namespace nimbra {
 
+std::shared_ptr<Bundle> RSPNimbraDriveViewController::_paneBundle() const {
+    return services().bundles->bundleWithIdentifier(
+        BundleIdentifier("com.vantrel.NimbraDriveSettings"));
+}
+
 Text RSPNimbraDriveViewController::_localizedString(const Text& key) const {
-    const BundleIdentifier paneBundle("com.vantrel.NimbraDriveSettings");
-    return RSPLocalizedString(key, "Localizable",
-                              services().bundles->bundleWithIdentifier(paneBundle));
+    return RSPLocalizedString(key, "Localizable", _paneBundle());
 }
 
 std::shared_ptr<Account> RSPNimbraDriveViewController::_vantrelAccount() {

@@ -98,6 +98,9 @@ protected:
     void _registerContainerPriorityHinting();
 
 private:
+    /// The bundle that the page's texts stand in, asked for by its name; null while it is not
+    /// found.
+    [[nodiscard]] std::shared_ptr<Bundle> _paneBundle() const;
     [[nodiscard]] Text _localizedString(const Text& key) const;
     [[nodiscard]] std::shared_ptr<Specifier> _masterSwitch();
     [[nodiscard]] SpecifierArray _sortedAppSpecifiers(SpecifierArray rows) const;

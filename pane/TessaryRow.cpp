@@ -79,9 +79,7 @@ RowValue RSPNimbraDriveViewController::_valueForTessarySpecifier(const Specifier
     }
     // The text takes a number of 32 bits, and a larger one loses its upper bits.
     const auto shownCount = static_cast<std::int32_t>(count);
-    const BundleIdentifier paneBundle("com.vantrel.NimbraDriveSettings");
-    return RSPLocalizedFormat("CLOUD_DRIVE_NUM_APPS", "Localizable",
-                              services().bundles->bundleWithIdentifier(paneBundle),
+    return RSPLocalizedFormat("CLOUD_DRIVE_NUM_APPS", "Localizable", _paneBundle(),
                               services().localization, {std::int64_t{shownCount}});
 }
 
