@@ -12,7 +12,8 @@ class Applications {
 public:
     virtual ~Applications() = default;
 
-    /// The application called `identifier`, as it is now; null when there is none.
+    /// The application called `identifier`, as it is now; null when there is none, and when it
+    /// cannot be read, which is logged.
     [[nodiscard]] virtual std::shared_ptr<const AppProxy>
     applicationProxyForIdentifier(const BundleIdentifier& identifier) = 0;
 };

@@ -24,10 +24,10 @@ public:
     virtual ~ProgressReports() = default;
 
     /// Calls `handler` once for each progress published for `url`, or for a file below it: soon for
-    /// those that are published already, then as they come. What it returns is called once when
-    /// that progress ends, also after the subscription has. Always on the main queue, and never
-    /// within this call. The handlers are held until they cannot be called any more; those that are
-    /// left are let go, uncalled, when the platform shuts down.
+    /// those that are published already, then as they come. What it returns, which may be empty, is
+    /// called once when that progress ends, also after the subscription has. Always on the main
+    /// queue, and never within this call. The handlers are held until they cannot be called any
+    /// more; those that are left are let go, uncalled, when the platform shuts down.
     [[nodiscard]] virtual std::shared_ptr<ProgressSubscriber>
     _addSubscriberForFileURLWithPublishingHandler(const std::string& url,
                                                   PublishingHandler handler) = 0;

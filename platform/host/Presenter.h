@@ -28,7 +28,8 @@ public:
     /// Draws the rows anew that led to the pane, on every page above it.
     virtual void reloadAllParentSpecifiers() = 0;
 
-    /// Shows `controller` over the pane; the host shares it while it is shown.
+    /// Shows `controller` over the pane; the host shares it while it is shown. Nothing when a
+    /// controller or a share sheet is shown already.
     virtual void presentController(const std::shared_ptr<SetupController>& controller,
                                    bool animated) = 0;
     /// Takes away what the pane has presented over itself last, a share sheet or a controller with
@@ -39,14 +40,15 @@ public:
     virtual void dismissController(const ViewController& controller, bool animated) = 0;
 
     /// Asks the user with an alert, over all that is shown. The host shares it until the user has
-    /// answered, takes it away and then calls the action chosen.
+    /// answered, takes it away and then calls the action chosen. Nothing when the pane has gone.
     virtual void presentAlert(const std::shared_ptr<AlertController>& alert, bool animated) = 0;
-    /// The same with an alert about an account.
+    /// The same with an alert about an account, which also stands when the controller that shows it
+    /// has been dismissed.
     virtual void showAccountAlert(const std::shared_ptr<AccountAlertView>& alert) = 0;
 
     /// Offers the user to share something, over all that is shown. The host shares the sheet while
     /// it is shown, calls its handler when the user has shared or given up, and leaves it to the
-    /// pane to dismiss it.
+    /// pane to dismiss it. Nothing when a share sheet is shown already, or the pane has gone.
     virtual void presentShareSheet(const std::shared_ptr<ShareSheet>& sheet, bool animated) = 0;
 };
 

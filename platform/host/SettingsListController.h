@@ -22,14 +22,15 @@ public:
     /// The rows in display order, built on the first call and kept until `reloadSpecifiers`.
     [[nodiscard]] virtual const SpecifierArray& specifiers() = 0;
 
-    /// Drops the kept rows and builds them anew.
+    /// Drops the kept rows and builds them anew. A page that a notification tells to do so does it
+    /// on the queue that posts.
     void reloadSpecifiers() override;
 
     /// Draws `row` again; nothing when it is not in the list.
     void reloadSpecifierAnimated(const std::shared_ptr<Specifier>& row, bool animated);
 
     /// Brackets changes that are to be shown as one animated batch. Brackets may be nested; the
-    /// outermost one counts.
+    /// outermost one counts. Each beginning has its end.
     void beginUpdates();
     void endUpdates();
 
@@ -37,7 +38,7 @@ public:
     void insertSpecifierAfterSpecifierAnimated(const std::shared_ptr<Specifier>& row,
                                                const std::shared_ptr<Specifier>& after,
                                                bool animated);
-    /// Puts `rows` at the end of the list.
+    /// Puts `rows` at the end of the list; nothing while the list has not been built.
     void addSpecifiersFromArrayAnimated(const SpecifierArray& rows, bool animated);
     /// Takes `rows` out of the list; those that are not in it are nothing to remove.
     void removeContiguousSpecifiersAnimated(const SpecifierArray& rows, bool animated);

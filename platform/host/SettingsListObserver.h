@@ -7,7 +7,8 @@
 namespace nimbra {
 
 /// Is told of each change of a controller's list, after the list has changed: what a window turns
-/// into model changes and a command line into lines. Main queue only.
+/// into model changes and a command line into lines. Main queue, but for `didReload`, which comes
+/// on whichever queue builds the list anew.
 class SettingsListObserver {
 public:
     virtual ~SettingsListObserver() = default;

@@ -35,12 +35,13 @@ public:
     virtual ~PrivacyConsentStore() = default;
 
     /// All records of `service` as they are now, in the order in which they came to be. Absent
-    /// while the store cannot be read.
+    /// while the store cannot be read, which is logged.
     [[nodiscard]] virtual std::optional<PrivacyAccessRecords>
     PRVAccessCopyInformation(const PrivacyService& service) = 0;
 
     /// Sets whether the application `bundle` may use `service`. `bundle` is not owned and may be
-    /// null, for which nothing can be kept. False where the store refuses; it is then unchanged.
+    /// null, for which nothing can be kept. False where the store refuses, or cannot be written,
+    /// which is logged; it is then unchanged.
     [[nodiscard]] virtual bool PRVAccessSetForBundle(const PrivacyService& service,
                                                      const Bundle* bundle, bool granted) = 0;
 };

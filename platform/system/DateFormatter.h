@@ -13,6 +13,7 @@ public:
     DateFormatter& operator=(const DateFormatter&) = delete;
     virtual ~DateFormatter() = default;
 
+    /// Absent where the formatter was made for a malformed pattern.
     [[nodiscard]] virtual Text stringFromDate(Date date) const = 0;
 };
 

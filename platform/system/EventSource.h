@@ -8,7 +8,7 @@ namespace nimbra {
 
 /// Calls its handler on its queue when something has come about. It is created suspended and
 /// without a handler. A call that has not started when the last owner lets the source go is
-/// dropped.
+/// dropped. Any thread, where a kind says nothing else.
 class EventSource {
 public:
     EventSource() = default;

@@ -4,7 +4,8 @@
 
 namespace nimbra {
 
-/// What whoever manages the device allows its user. Any queue; answers what holds now.
+/// What whoever manages the device allows its user. Any queue; answers what holds now, and allows
+/// nothing while that cannot be read: it may be forbidden.
 class RestrictionsProfile {
 public:
     virtual ~RestrictionsProfile() = default;

@@ -27,7 +27,7 @@ public:
     /// Whether a message of this level would be kept.
     [[nodiscard]] virtual bool isEnabled(LogLevel level) const = 0;
 
-    /// Writes `message` as one line.
+    /// Writes `message` as one line; nothing where its level is not enabled.
     virtual void write(LogLevel level, const std::string& message) = 0;
 };
 

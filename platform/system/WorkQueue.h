@@ -26,8 +26,8 @@ public:
     /// Queues `work` and returns at once. Any thread.
     virtual void async(Work work) = 0;
 
-    /// Queues `work` and waits until it has run. Any thread but this queue's own: a queue that
-    /// waits for itself stops the program with a message.
+    /// Queues `work` and waits until it has run. Any thread but, of a serial queue, its own: a
+    /// queue that waits for itself stops the program with a message.
     virtual void sync(Work work) = 0;
 };
 

@@ -10,7 +10,8 @@
 
 namespace nimbra {
 
-/// A text that cannot be changed by the user. A change of what it shows asks for a layout.
+/// A text that cannot be changed by the user. Another text, font or number of lines asks for a
+/// layout; another colour or alignment does not.
 class Label final : public View {
 public:
     /// An empty label in the body font, black, at the left, on one line.

@@ -11,7 +11,8 @@ namespace nimbra {
 /// Numbers that stand in linear relations. Each demand is met as far as the earlier ones, which
 /// are never touched again, leave room for it: the order of the demands is their rank.
 ///
-/// A simplex tableau: each row gives a variable by those of the columns, which are 0.
+/// Not thread-safe. A simplex tableau: each row gives a variable by those of the columns, which are
+/// 0.
 class LinearSystem {
 public:
     enum class Range : std::uint8_t { any, notNegative };

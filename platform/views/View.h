@@ -43,7 +43,8 @@ public:
 
     /// Puts `view` in front of the subviews that are there; it leaves the view that it was in. It
     /// moves into this view's window, or out of its own, and is told before where that is another
-    /// one. To add a view to itself or below itself is a programming error that stops the program.
+    /// one. Asks for a layout. No view, the view itself or one that it stands in is a programming
+    /// error that stops the program.
     void addSubview(std::shared_ptr<View> view);
     /// Takes the view, and the constraints that speak of it, out of its superview and the window.
     void removeFromSuperview();
@@ -110,13 +111,15 @@ public:
     void setTranslatesAutoresizingMaskIntoConstraints(bool translates) { _translates = translates; }
 
     /// Adds constraints between this view and its subviews, and asks for a layout. One that speaks
-    /// of another view, or of both directions at once, is a programming error that stops the
-    /// program. Where not all can hold, those of a lower priority give way, and among equals the
-    /// later ones; of required ones that is said in one line to `syslog`.
+    /// of another view or of both directions at once, or has no finite constant or a priority
+    /// outside 0 to 1000, is a programming error that stops the program. Where not all can hold,
+    /// those of a lower priority give way, and among equals the later ones; of required ones that
+    /// is said in one line to `syslog`.
     void addConstraints(std::vector<LayoutConstraint> constraints);
     [[nodiscard]] const std::vector<LayoutConstraint>& constraints() const { return _constraints; }
 
-    /// How hard the view resists being made smaller than its content; 750 to begin with.
+    /// How hard the view resists being made smaller than its content; 750 to begin with. Stays
+    /// between 0 and 1000.
     [[nodiscard]] LayoutPriority contentCompressionResistancePriorityForAxis(LayoutAxis axis) const;
     void setContentCompressionResistancePriorityForAxis(LayoutPriority priority, LayoutAxis axis);
 
