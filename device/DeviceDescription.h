@@ -20,8 +20,10 @@ class JsonReader;
 /// `settingsctl init --from`. Every member has the default of a device that nobody described.
 struct DeviceDescription {
     struct Screen {
+        /// In points.
         double width = 390;
         double height = 844;
+        /// How many pixels a point has in each direction.
         double scale = 2;
     };
     /// An account of a given list; what is left out of it is false, empty or null.
@@ -86,20 +88,28 @@ struct DeviceDescription {
     };
 
     std::string name = "Nimbra Phone";
+    /// "phone" or "pad".
     std::string idiom = "phone";
     std::optional<Screen> screen = Screen();
+    /// A BCP 47 tag.
     std::string locale = "en-US";
+    /// An IANA name.
     std::string timeZone = "UTC";
+    /// When a scenario begins; a device that is used goes by the machine's clock.
     Date now;
     bool cellularData = true;
+    /// The device's own wording of wireless networks; nothing for the usual one.
     std::optional<std::string> wirelessVariant;
+    /// By domain: an object of keys and values each.
     std::map<std::string, nlohmann::json> preferences;
+    /// The applications that may not use the cloud.
     std::set<std::string> cloudSyncDenied;
     bool appCellularDataModificationAllowed = true;
     std::vector<AccountDescription> accounts;
     std::vector<Application> apps;
     /// In the order in which they came to be.
     std::vector<ConsentRecord> consent;
+    /// Who is signed in to cloud documents; nothing for nobody.
     std::optional<std::string> identity;
     std::vector<Container> containers;
     /// The last sync as it was given: an instant or a sentence, null, or an object with an error.

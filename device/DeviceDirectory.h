@@ -19,14 +19,16 @@ struct DeviceParts {
 };
 
 /// Makes the device directory `root` from `description`. `root` must not exist or be empty;
-/// directories above it are made. It is made beside its place and moved there when complete, so a
-/// failure leaves nothing.
+/// directories above it are made. It is built out of sight and put in its place when complete, as
+/// `StagedDirectory` does it.
 [[nodiscard]] std::expected<void, Error> createDeviceDirectory(const std::filesystem::path& root,
                                                                const DeviceDescription& description,
                                                                const DeviceParts& parts = {});
 
 /// Replaces in the device directory `root` what the keys of `change` describe, whole values, as
-/// another process would; everything else stays.
+/// another process would; everything else stays. What no file of the directory holds, such as the
+/// planned faults, is left to whoever has a session. After an error in writing some of it may have
+/// been replaced.
 [[nodiscard]] std::expected<void, Error> changeDeviceDirectory(const std::filesystem::path& root,
                                                                const GivenDescription& change,
                                                                const DeviceParts& parts = {});

@@ -18,8 +18,8 @@ namespace nimbra::device {
 /// `error`, where its description begins with `path`, with `name` in the path's place.
 [[nodiscard]] Error withPath(Error error, const std::filesystem::path& path, std::string_view name);
 
-/// `text` as it can stand in one line of a log or a terminal: control characters become spaces,
-/// bytes that are not UTF-8 the replacement character.
+/// `text` as it can stand in one line of a log or a terminal: control characters of ASCII become
+/// spaces, bytes that are not UTF-8 the replacement character.
 [[nodiscard]] std::string oneLine(std::string_view text);
 
 } // namespace nimbra::device

@@ -26,7 +26,8 @@ struct DesktopEntry {
 
     /// Whether it describes an application at all, rather than a link or a directory.
     bool isApplication = false;
-    /// The name in the best language that it has one in; nothing where every one is blank.
+    /// The name in the best language that it has one in; nothing where there is none that is
+    /// not blank.
     std::optional<std::string> name;
     /// The name or the path of its icon.
     std::optional<std::string> icon;

@@ -26,7 +26,8 @@ public:
     /// Sends `signal`, or gives the errno why it cannot be sent: EPERM where that is not allowed,
     /// ESRCH where the process has gone.
     [[nodiscard]] std::expected<void, int> send(int signal) const;
-    /// Waits for its end and, where it is a child of this process, takes its status.
+    /// Waits for the end of a child of this process and takes its status; nothing, at once, for a
+    /// process that is none.
     void reap() const;
 
 private:

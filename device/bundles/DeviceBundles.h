@@ -45,7 +45,8 @@ public:
     /// images, its shared object with dlopen, which stays loaded for the life of the process, and
     /// registers its classes, the one that the manifest calls its first among them. An error names
     /// the file and what was expected of it; none of the classes is registered then.
-    /// A folder that is loaded already gives the bundle that was made of it.
+    /// A folder that is loaded already gives the bundle that was made of it, if that has its first
+    /// class.
     [[nodiscard]] std::expected<std::shared_ptr<DeviceBundle>, Error>
     load(const std::filesystem::path& path);
     /// The same for a bundle that needs no first class: its classes are found by their names.

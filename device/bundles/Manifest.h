@@ -20,7 +20,8 @@ struct Manifest {
     /// The language to which texts fall back in the end.
     std::string developmentLanguage;
 
-    /// Reads the manifest of the bundle in the folder `bundle`.
+    /// Reads the manifest of the bundle in the folder `bundle`. An error names the file, the place
+    /// in it and what was expected there.
     [[nodiscard]] static std::expected<Manifest, Error> read(const std::filesystem::path& bundle);
 };
 

@@ -20,7 +20,8 @@ using StringTables = std::unordered_map<std::string, StringTable>;
 /// The string tables of a bundle in all of its languages, by BCP 47 tags.
 class LanguageTables {
 public:
-    /// Reads every file LANGUAGE/TABLE.json in `folder`: flat objects of keys and texts.
+    /// Reads every file LANGUAGE/TABLE.json in `folder`: flat objects of keys and texts. An error
+    /// names the first file that is no table.
     [[nodiscard]] static std::expected<LanguageTables, Error>
     read(const std::filesystem::path& folder);
 

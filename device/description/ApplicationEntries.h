@@ -20,7 +20,7 @@ writeApplicationEntries(const std::filesystem::path& directory,
                         const std::vector<DeviceDescription::Application>& applications);
 
 /// Makes those of `applications` the only desktop entries in `directory`, which is made where it
-/// is missing. Each is replaced as a whole; other files stay.
+/// is missing. Each is replaced as a whole; other files stay. After an error some may have been.
 [[nodiscard]] std::expected<void, Error>
 replaceApplicationEntries(const std::filesystem::path& directory,
                           const std::vector<DeviceDescription::Application>& applications);

@@ -15,7 +15,8 @@
 namespace nimbra::device {
 
 // Reading single values of a device's description. What is not as it should be is noted at the
-// reader; where nothing stands, a `fallback` is given, and without one that is noted as well.
+// reader; where nothing stands, a `fallback` is given, and without one that is noted as well. An
+// array that is not there is an empty one.
 
 /// A string that is not empty.
 [[nodiscard]] std::string readName(const JsonReader& reader);

@@ -14,8 +14,9 @@ class DeviceProgress final : public ProgressReport {
 public:
     explicit DeviceProgress(ProgressValues values);
 
-    /// Sets the values one after the other and tells the observers of each, also of one that was
-    /// the same before. A fraction outside 0 to 1 becomes the nearer of the two.
+    /// Sets the values one after the other and tells the observers of each that can be observed,
+    /// also of one that was the same before. A fraction outside 0 to 1 becomes the nearer of the
+    /// two, what is no number 0.
     void apply(const ProgressChanges& changes);
 
     [[nodiscard]] const UserInfo& userInfo() const override { return _userInfo; }

@@ -42,7 +42,7 @@ public:
 
     /// `devicePath` below the root, its links followed as the device itself would: ".." stops at
     /// the root, and a link's target starts there. What does not exist (yet) is taken as written.
-    /// Links that lead round in a circle are an error.
+    /// More than 40 links on the way, as those that lead round in a circle, are the error ELOOP.
     [[nodiscard]] std::expected<std::filesystem::path, Error>
     resolve(std::string_view devicePath) const;
 

@@ -19,9 +19,9 @@ namespace nimbra::device {
 
 /// Makes `content` the whole content of the file at `path`, whose directory exists: it is written
 /// under a temporary name, flushed and renamed, so that a reader, and a machine that stops, see
-/// the earlier content or the new one. On an error the earlier content stays and nothing is left
-/// beside it. The file has `permissions`, or where none are given those that it had, a new one
-/// those that let everybody read it.
+/// the earlier content or the new one. On an error the earlier content stays, unless it is only
+/// the renaming that cannot be flushed, and nothing is left beside it. The file has `permissions`,
+/// or where none are given those that it had, a new one those that let everybody read it.
 [[nodiscard]] std::expected<void, Error>
 writeFileAtomically(const std::filesystem::path& path, std::string_view content,
                     std::optional<mode_t> permissions = std::nullopt);

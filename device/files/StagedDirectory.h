@@ -24,7 +24,8 @@ public:
     /// Where to build.
     [[nodiscard]] const std::filesystem::path& path() const { return _path; }
 
-    /// Flushes what was built and puts it in its place.
+    /// Flushes what was built and puts it in its place: by one renaming, or by one for each entry
+    /// where the target exists, of which some may stand there after an error.
     [[nodiscard]] std::expected<void, Error> putInPlace();
 
 private:

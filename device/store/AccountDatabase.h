@@ -34,7 +34,6 @@ public:
     [[nodiscard]] static std::expected<AccountDatabase, Error>
     openForReading(const std::filesystem::path& path);
 
-    /// The file.
     [[nodiscard]] const std::filesystem::path& path() const { return _database->path(); }
 
     /// The version of the database's form.

@@ -20,7 +20,9 @@ namespace nimbra::device {
 class ConsentDatabase {
 public:
     struct Record {
+        /// Absent for an application without an identifier.
         std::optional<BundleIdentifier> bundle;
+        /// Absent where the user has said nothing yet.
         std::optional<bool> granted;
 
         friend bool operator==(const Record&, const Record&) = default;

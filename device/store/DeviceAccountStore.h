@@ -44,9 +44,9 @@ public:
     /// be read, which is logged.
     [[nodiscard]] std::optional<AccountRecord> record(const AccountIdentifier& identifier);
 
-    /// Writes the changes of `account` in one transaction; null is an error. Waits for the disk,
-    /// and for another program that is writing. An error, which calls the database by its path on
-    /// the device, has been logged, unless it was planned.
+    /// Writes the changes of `account` in one transaction; null, or one of another store, is an
+    /// error. Waits for the disk, and for another program that is writing. An error, which calls
+    /// the database by its path on the device, has been logged, unless it was planned.
     [[nodiscard]] std::expected<void, Error> save(const std::shared_ptr<Account>& account);
 
     /// The outcomes of the next saves, used up one a save, in their order: an error is how that

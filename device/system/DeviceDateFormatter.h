@@ -14,7 +14,7 @@ public:
     /// `locale` is a BCP 47 tag, `timeZone` an IANA name.
     DeviceDateFormatter(const Text& format, const std::string& locale, const std::string& timeZone);
 
-    /// Absent where the pattern has fields that do not exist.
+    /// Absent where the pattern has fields that do not exist, and on a machine without ICU's data.
     [[nodiscard]] Text stringFromDate(Date date) const override;
 
 private:

@@ -15,7 +15,8 @@ class SystemLog;
 
 namespace nimbra::device {
 
-/// Whether every file of preferences on the device can be read.
+/// Whether every file of preferences on the device can be read; the error names the first that
+/// cannot.
 [[nodiscard]] std::expected<void, Error> checkPreferences(const DevicePaths& paths);
 
 /// The preferences of applications as their files have them now. What cannot be read is nothing,

@@ -16,6 +16,7 @@ namespace nimbra::device {
 /// abilities. Copies are the same settings. Any thread.
 class DeviceSettings {
 public:
+    /// Reads the file of the device in `root`. An error names the file and the place in it.
     [[nodiscard]] static std::expected<DeviceSettings, Error>
     open(const std::filesystem::path& root);
 
@@ -30,7 +31,6 @@ public:
     /// The IANA name of the time zone.
     [[nodiscard]] std::string timeZone() const;
 
-    /// Whether the device has cellular data.
     [[nodiscard]] bool hasCellularData() const;
     /// The name of the device's own wording of wireless networks; nothing for the usual one.
     [[nodiscard]] std::optional<std::string> wirelessVariant() const;
