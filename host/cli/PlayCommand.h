@@ -10,6 +10,7 @@
 
 namespace nimbra::cli {
 
+/// What is played, and how.
 struct PlayOptions {
     /// The scenario's file; "-" for standard input.
     std::string scenario;

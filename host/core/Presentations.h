@@ -40,6 +40,7 @@ public:
     /// Shows the controller's page, in a window of its own, over the pane. Where there is one
     /// already, or a share sheet, nothing happens: the pane can present one thing only.
     void present(const std::shared_ptr<SetupController>& controller);
+    /// Puts the alert over all that is shown.
     void present(const std::shared_ptr<AlertController>& alert);
     void present(const std::shared_ptr<AccountAlertView>& alert);
     /// Also over a screen that came while the sheet was made ready; nothing where there is one.

@@ -19,7 +19,9 @@ namespace nimbra::host {
 
 /// What there is to say of one view at one moment.
 struct ViewDescription {
+    /// Its accessibility identifier; empty for none.
     std::string name;
+    /// The platform's own class; "View" for any other.
     std::string className;
     Rect frame;
     double alpha = 1;
@@ -45,7 +47,7 @@ struct ScreenDescription {
     /// Of the bar's buttons: the title, "cancel" or "done" for a system item, absent for none.
     Text leftBarButton;
     Text rightBarButton;
-    /// How large what can be scrolled to is.
+    /// How large what can be scrolled to is; without a scroll view, the page itself.
     Size contentSize;
     /// In tree order, the root first.
     std::vector<ViewDescription> views;

@@ -26,7 +26,8 @@ public:
 
     /// Lets just the applications `identifiers` run: starts those that do not, also those that
     /// have been ended meanwhile, and ends the others. The device directory exists. On an error,
-    /// which names the record that cannot be written, some may run. Main thread.
+    /// which names the record that cannot be written, some may run. Nothing after `end`. Main
+    /// thread.
     [[nodiscard]] std::expected<void, Error> setRunning(const std::set<std::string>& identifiers);
 
     /// Ends all for good, and takes their records away. Any thread.
