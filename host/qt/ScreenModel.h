@@ -30,6 +30,7 @@ public:
 
     /// Gives the screen its size, in points.
     Q_INVOKABLE void setSize(qreal width, qreal height);
+    /// Touches the button of this title, or that of the bar; nothing where the user could not now.
     Q_INVOKABLE void touch(const QString& button);
     Q_INVOKABLE void cancel();
 

@@ -24,7 +24,7 @@ public:
 Q_SIGNALS:
     /// Once: the window was the same over some time in which nothing was left to do.
     void taken(const QImage& picture);
-    /// Once, instead: something still moved after a long time.
+    /// Once, instead: something still moved after some twenty seconds.
     void gaveUp();
 
 private:

@@ -9,8 +9,8 @@ class PaneSession;
 
 namespace nimbra::window {
 
-/// Runs the main queue of a session, which it outlives neither, whenever there is work in it, as a
-/// part of the window's own event loop.
+/// Runs the main queue of a session, which outlives the pump, whenever there is work in it, as a
+/// part of the window's own event loop. Main thread, which is the main queue's.
 class SessionPump final : public QObject {
     Q_OBJECT
 

@@ -7,7 +7,7 @@
 
 namespace nimbra::window {
 
-/// What is no UTF-8 becomes the sign for that.
+/// `text`, in which bytes that are not UTF-8 become the replacement character.
 inline QString qString(const std::string& text) {
     return QString::fromStdString(text);
 }
