@@ -19,11 +19,13 @@ inline constexpr int exitBadArguments = 2;
 /// What the user asked for on the command line.
 struct Arguments {
     Command command = Command::status;
+    /// The device; this machine by default.
     std::filesystem::path root = "/";
     /// diagnose: where the archive is to stand on this machine.
     std::string path;
+    /// diagnose: the archive has no log.
     bool withoutLog = false;
-    /// status.
+    /// status: as JSON.
     bool asJson = false;
 
     /// What the command line says; the exit status where the program is to end at once, because
