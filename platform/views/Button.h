@@ -1,7 +1,7 @@
 #pragma once
 
 #include "platform/views/Color.h"
-#include "platform/views/ControlEvents.h"
+#include "platform/views/ControlTargets.h"
 #include "platform/views/Label.h"
 #include "platform/views/View.h"
 

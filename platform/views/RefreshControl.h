@@ -1,6 +1,6 @@
 #pragma once
 
-#include "platform/views/ControlEvents.h"
+#include "platform/views/ControlTargets.h"
 
 #include <functional>
 #include <memory>
