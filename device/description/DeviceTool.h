@@ -9,9 +9,9 @@
 
 namespace nimbra::device {
 
-/// Puts a script that does what `tool` says in the place of the device's command-line tool, or
-/// takes away what stands there. The real tool is the program `real`, which is told of the device
-/// that the script stands on; it may be empty, and then there is none.
+/// Puts a script that does what `tool` says in the place of the device's command-line tool; for a
+/// missing one it takes away what stands there. The real tool is the program `real`, which is told
+/// of the device that the script stands on; it may be empty, and then it is a missing one.
 [[nodiscard]] std::expected<void, Error> replaceTool(const DevicePaths& paths,
                                                      const DeviceDescription::Tool& tool,
                                                      const std::filesystem::path& real);

@@ -23,7 +23,8 @@ public:
     [[nodiscard]] virtual Locale currentLocale() const = 0;
 
     /// `format` with its placeholders filled from `arguments` by the rules of `locale`. A format
-    /// without placeholders comes back as it stands, and so does one that is malformed.
+    /// without placeholders comes back as it stands, and so does one that cannot be filled,
+    /// which is logged.
     [[nodiscard]] virtual Text
     stringWithFormatLocaleArguments(const Text& format, const Locale& locale,
                                     std::span<const FormatArgument> arguments) const = 0;

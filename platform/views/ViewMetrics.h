@@ -6,7 +6,8 @@
 
 namespace nimbra {
 
-/// How large what a host draws comes out: the host's own fonts and controls. Main queue only.
+/// How large what a host draws comes out: the host's own fonts and controls, in points. Main
+/// queue only.
 class ViewMetrics {
 public:
     virtual ~ViewMetrics() = default;
