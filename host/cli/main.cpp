@@ -1,7 +1,7 @@
 #include "device/DevicePlatform.h"
 #include "host/cli/Arguments.h"
 #include "host/cli/Completion.h"
-#include "host/cli/DeviceLocation.h"
+#include "host/cli/DeviceCreation.h"
 #include "host/cli/Dialog.h"
 #include "host/cli/Failure.h"
 #include "host/cli/PaneCommands.h"

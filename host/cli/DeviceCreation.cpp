@@ -1,4 +1,4 @@
-#include "host/cli/DeviceLocation.h"
+#include "host/cli/DeviceCreation.h"
 
 #include "device/DeviceDirectory.h"
 #include "host/core/BundleSearch.h"
