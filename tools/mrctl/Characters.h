@@ -17,7 +17,7 @@ namespace nimbra::mrctl {
 [[nodiscard]] constexpr bool isUpper(char character) {
     return character >= 'A' && character <= 'Z';
 }
-[[nodiscard]] constexpr bool isWord(char character) {
+[[nodiscard]] constexpr bool isAlphanumeric(char character) {
     return isDigit(character) || isLower(character) || isUpper(character);
 }
 [[nodiscard]] constexpr bool isBeyondAscii(char character) {

@@ -1,5 +1,6 @@
+#include "tools/mrctl/DocumentNames.h"
+
 #include "tools/mrctl/Characters.h"
-#include "tools/mrctl/PathPatterns.h"
 
 #include <algorithm>
 #include <array>
@@ -86,7 +87,7 @@ void findDocumentNames(std::string_view text, std::vector<FoundSecret>& found) {
     std::size_t least = 0;
     for (std::size_t dot = text.find('.'); dot != std::string_view::npos;
          dot = text.find('.', dot + 1)) {
-        const std::size_t end = endOfRun(text, dot + 1, isWord);
+        const std::size_t end = endOfRun(text, dot + 1, isAlphanumeric);
         if (!isDocumentEnding(text.substr(dot + 1, end - dot - 1))) {
             continue;
         }

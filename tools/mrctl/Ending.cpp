@@ -45,7 +45,7 @@ private:
 
 } // namespace
 
-int ended(const std::function<int()>& program, std::ostream& messages) {
+int exitStatusOf(const std::function<int()>& program, std::ostream& messages) {
     const Terminating terminating;
     try {
         return program();

@@ -17,7 +17,7 @@ bool isMark(char32_t character) {
 /// Whether `character` is a sign or a blank between words.
 bool isSign(char32_t character) {
     if (character < 0x80) {
-        return !isWord(static_cast<char>(character));
+        return !isAlphanumeric(static_cast<char>(character));
     }
     return character < 0xC0 || character == 0xD7 || character == 0xF7 ||
            (character >= 0x2000 && character <= 0x206F) ||

@@ -17,7 +17,7 @@ using Found = std::vector<FoundSecret>;
 constexpr auto nowhere = std::string_view::npos;
 
 bool isNameCharacter(char character) {
-    return isWord(character) || character == '_' || character == '-' || character == '.';
+    return isAlphanumeric(character) || character == '_' || character == '-' || character == '.';
 }
 
 /// What may stand between a name and its value, and opens the value.
@@ -51,7 +51,7 @@ std::size_t sizeOfFirstWord(std::string_view text, std::size_t begin) {
 bool isPlainValue(std::string_view text, std::size_t begin) {
     constexpr std::array<std::string_view, 8> words{"null", "true", "false", "nil",
                                                     "none", "yes",  "no",    "(null)"};
-    const std::size_t end = endOfRun(text, begin, isWord);
+    const std::size_t end = endOfRun(text, begin, isAlphanumeric);
     return std::ranges::find(words, lowerCase(text.substr(begin, end - begin))) != words.end();
 }
 
@@ -59,7 +59,8 @@ bool isPlainValue(std::string_view text, std::size_t begin) {
 bool isErrorNumber(std::string_view text, std::size_t begin) {
     constexpr std::size_t mostDigits = 3;
     const std::size_t end = endOfRun(text, begin, isDigit);
-    return end > begin && end - begin <= mostDigits && (end == text.size() || !isWord(text[end]));
+    return end > begin && end - begin <= mostDigits &&
+           (end == text.size() || !isAlphanumeric(text[end]));
 }
 
 /// Whether the value at `begin` is the identifier of an application or a notification.
@@ -153,7 +154,8 @@ void findPasswords(std::string_view text, Found& found) {
         for (std::size_t at = lower.find(word); at != nowhere; at = lower.find(word, at + 1)) {
             // The rest of the name, "password2" and "passwordHash".
             const std::size_t end = endOfRun(text, at + word.size(), [word](char character) {
-                return !isBeyondAscii(word.back()) && (isWord(character) || character == '_');
+                return !isBeyondAscii(word.back()) &&
+                       (isAlphanumeric(character) || character == '_');
             });
             std::size_t value = endOfRun(text, end, isBehindName);
             const bool isSigned =
@@ -163,7 +165,7 @@ void findPasswords(std::string_view text, Found& found) {
                 value = endOfRun(text, value + 2, isBeforeValue);
             }
             value = endOfRun(text, value, [](char character) {
-                return !isWord(character) && !isBeyondAscii(character);
+                return !isAlphanumeric(character) && !isBeyondAscii(character);
             });
             if (value < text.size() && !isPlainValue(text, value)) {
                 addRest(text, value, SecretKind::secret, isSigned, found);
@@ -186,7 +188,7 @@ void findSchemes(std::string_view text, Found& found) {
         for (std::size_t at = lower.find(scheme); at != nowhere; at = lower.find(scheme, at + 1)) {
             const std::size_t end = at + scheme.size();
             const std::size_t begin = endOfRun(text, end, isBlank);
-            if ((at > 0 && isWord(text[at - 1])) || begin == end) {
+            if ((at > 0 && isAlphanumeric(text[at - 1])) || begin == end) {
                 continue;
             }
             const std::size_t behind =

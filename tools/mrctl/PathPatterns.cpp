@@ -1,6 +1,7 @@
 #include "tools/mrctl/PathPatterns.h"
 
 #include "tools/mrctl/Characters.h"
+#include "tools/mrctl/DocumentNames.h"
 
 #include <algorithm>
 #include <array>
@@ -78,7 +79,7 @@ bool isIn(std::string_view path, std::string_view place) {
 /// Whether `path` has no name that a user could have given: it goes on with words of letters.
 bool isPlain(std::string_view path) {
     return std::ranges::all_of(path, [](char character) {
-        return isWord(character) || std::string_view("/.-_").contains(character);
+        return isAlphanumeric(character) || std::string_view("/.-_").contains(character);
     });
 }
 
@@ -145,7 +146,7 @@ std::size_t endOfPublicPath(std::string_view text, std::size_t begin, std::size_
 }
 
 bool canStartName(char character) {
-    return isWord(character) || isBeyondAscii(character) ||
+    return isAlphanumeric(character) || isBeyondAscii(character) ||
            std::string_view("._~@+-%$ ").contains(character);
 }
 
@@ -156,7 +157,8 @@ std::size_t startOfPath(std::string_view text, std::size_t slash) {
         --begin;
     }
     const char before = begin > 0 ? text[begin - 1] : ' ';
-    const bool isInside = isWord(before) || isBeyondAscii(before) || before == '/' || before == '<';
+    const bool isInside =
+        isAlphanumeric(before) || isBeyondAscii(before) || before == '/' || before == '<';
     const bool goesOn = slash + 1 < text.size() && canStartName(text[slash + 1]) &&
                         (text[slash + 1] != ' ' || begin < slash);
     return isInside || !goesOn ? text.size() : begin;
@@ -181,12 +183,12 @@ std::size_t startOfHome(std::string_view text) {
         first = std::min(first, at + file.size() - 1);
     }
     for (std::size_t at = 0; at + 2 < text.size() && at < first; ++at) {
-        const bool isApart = at == 0 || (!isWord(text[at - 1]) && text[at - 1] != '/' &&
+        const bool isApart = at == 0 || (!isAlphanumeric(text[at - 1]) && text[at - 1] != '/' &&
                                          !isBeyondAscii(text[at - 1]));
         const std::string_view rest = text.substr(at);
         const bool isDrive = isLetter(rest[0]) && rest[1] == ':' && rest[2] == '\\';
         const bool isNamed = rest[0] == '~' && (isLetter(rest[1]) || rest[1] == '/');
-        const bool isShare = rest.starts_with("\\\\") && isWord(rest[2]) &&
+        const bool isShare = rest.starts_with("\\\\") && isAlphanumeric(rest[2]) &&
                              rest.substr(0, longestHost).find('\\', 3) != nowhere &&
                              (at == 0 || text[at - 1] != '\\');
         const bool isRelative = rest.starts_with("home/") || rest.starts_with("Users/");

@@ -13,15 +13,12 @@ namespace nimbra::mrctl {
 /// text or before the words of the system for an error.
 void findPaths(std::string_view text, std::string_view root, std::vector<FoundSecret>& found);
 
-/// What a path tells beyond itself: whose home it is in, and what a document is called.
+/// What a path tells beyond itself: whose home it is in, and what a document is called. Empty where
+/// it does not tell.
 struct PathNames {
     std::string user;
     std::string document;
 };
 [[nodiscard]] PathNames namesInPath(std::string_view path);
-
-/// Adds the names of document files in `text` to `found`: with their blanks where they stand in
-/// quotation marks, else from the first of the words with a capital that they end.
-void findDocumentNames(std::string_view text, std::vector<FoundSecret>& found);
 
 } // namespace nimbra::mrctl

@@ -110,7 +110,7 @@ void Pseudonyms::learn(SecretKind kind, const std::string& value, Search search)
 void Pseudonyms::learnWords(SecretKind kind, std::string_view value) {
     constexpr std::size_t leastWord = 5;
     const auto isPart = [](char character) {
-        return isWord(character) || isBeyondAscii(character);
+        return isAlphanumeric(character) || isBeyondAscii(character);
     };
     for (std::size_t begin = 0; begin < value.size();) {
         const std::size_t end = endOfRun(value, begin, isPart);
@@ -200,7 +200,8 @@ void Pseudonyms::search(const std::string& value, std::size_t index) {
 
 void Pseudonyms::findSpellings(std::string_view text, std::vector<Match>& matches) const {
     const auto goesOn = [](std::string_view word, std::size_t index) {
-        return index > 0 && index < word.size() && isWord(word[index - 1]) && isWord(word[index]);
+        return index > 0 && index < word.size() && isAlphanumeric(word[index - 1]) &&
+               isAlphanumeric(word[index]);
     };
     _spellings.find(text, [&](std::size_t begin, std::size_t end, const Spelling& found) {
         if (!found.asWholeWord || (!goesOn(text, begin) && !goesOn(text, end))) {

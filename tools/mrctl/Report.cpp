@@ -144,7 +144,7 @@ private:
     }
     static bool isMadeByProgram(const std::string& name) {
         return std::ranges::all_of(name, [](char character) {
-            return isWord(character) || std::string_view(".-_").contains(character);
+            return isAlphanumeric(character) || std::string_view(".-_").contains(character);
         });
     }
 

@@ -84,7 +84,7 @@ std::optional<SecretKind> kindOfValueNamed(std::string_view name) {
     if (isPartOf(plain, kPasswordWords)) {
         return SecretKind::secret;
     }
-    std::erase_if(plain, [](char character) { return !isWord(character); });
+    std::erase_if(plain, [](char character) { return !isAlphanumeric(character); });
     if (isPartOf(plain, kPasswordWords) || isPartOf(plain, secretParts)) {
         return SecretKind::secret;
     }

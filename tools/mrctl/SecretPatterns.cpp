@@ -2,6 +2,7 @@
 
 #include "tools/mrctl/Characters.h"
 #include "tools/mrctl/DecodedText.h"
+#include "tools/mrctl/DocumentNames.h"
 #include "tools/mrctl/NamedValues.h"
 #include "tools/mrctl/PathPatterns.h"
 #include "tools/mrctl/TokenPatterns.h"
@@ -18,12 +19,13 @@ using Found = std::vector<FoundSecret>;
 constexpr auto nowhere = std::string_view::npos;
 
 bool isLocalPart(char character) {
-    return isWord(character) || isBeyondAscii(character) ||
+    return isAlphanumeric(character) || isBeyondAscii(character) ||
            std::string_view(".!#$%&*+-=?^_{|}~'").contains(character);
 }
 
 bool isHost(char character) {
-    return isWord(character) || isBeyondAscii(character) || character == '.' || character == '-';
+    return isAlphanumeric(character) || isBeyondAscii(character) || character == '.' ||
+           character == '-';
 }
 
 /// The beginning of the name that stands before an address in angle brackets, if it does:
@@ -39,7 +41,7 @@ std::size_t startOfFullName(std::string_view text, std::size_t begin) {
             --word;
         }
         const std::size_t end = word;
-        while (word > 0 && (isWord(text[word - 1]) || isBeyondAscii(text[word - 1]) ||
+        while (word > 0 && (isAlphanumeric(text[word - 1]) || isBeyondAscii(text[word - 1]) ||
                             std::string_view(".-'").contains(text[word - 1]))) {
             --word;
         }

@@ -31,7 +31,7 @@ int classOf(char character) {
 std::size_t changesIn(std::string_view run) {
     std::size_t changes = 0;
     for (std::size_t index = 1; index < run.size(); ++index) {
-        const bool isInWord = isWord(run[index]) && isWord(run[index - 1]);
+        const bool isInWord = isAlphanumeric(run[index]) && isAlphanumeric(run[index - 1]);
         changes += isInWord && classOf(run[index]) != classOf(run[index - 1]) ? 1U : 0U;
     }
     return changes;
@@ -91,7 +91,7 @@ bool isCode(std::string_view piece) {
 Pieces piecesOf(std::string_view run) {
     Pieces pieces;
     for (std::size_t begin = 0; begin < run.size();) {
-        const std::size_t end = endOfRun(run, begin, isWord);
+        const std::size_t end = endOfRun(run, begin, isAlphanumeric);
         if (end > begin) {
             pieces.push_back(run.substr(begin, end - begin));
         }
@@ -155,10 +155,10 @@ bool isToken(std::string_view run) {
 
 void findRuns(std::string_view text, Found& found) {
     const auto isPart = [](char character) {
-        return isWord(character) || std::string_view("-_+/=.~").contains(character);
+        return isAlphanumeric(character) || std::string_view("-_+/=.~").contains(character);
     };
     for (std::size_t begin = 0; begin < text.size();) {
-        if (!isWord(text[begin])) {
+        if (!isAlphanumeric(text[begin])) {
             ++begin;
             continue;
         }
@@ -170,7 +170,7 @@ void findRuns(std::string_view text, Found& found) {
         // What is named does not belong to its name: "serial=C02XK1ZZJGH5".
         std::size_t start = begin;
         for (std::size_t sign = text.find('=', start);
-             sign < end && isWord(text[std::min(sign + 1, end - 1)]);
+             sign < end && isAlphanumeric(text[std::min(sign + 1, end - 1)]);
              sign = text.find('=', start)) {
             if (isToken(text.substr(start, sign - start))) {
                 found.push_back({.begin = start, .size = sign - start, .kind = SecretKind::secret});
@@ -196,7 +196,7 @@ void findPrefixed(std::string_view text, Found& found) {
             const std::size_t end = endOfRun(text, at, [](char character) {
                 return !isBlank(character) && !isQuote(character);
             });
-            const bool isInside = at > 0 && isWord(text[at - 1]);
+            const bool isInside = at > 0 && isAlphanumeric(text[at - 1]);
             if (!isInside && end - at >= start.size() + leastRest) {
                 found.push_back({.begin = at, .size = end - at, .kind = SecretKind::secret});
             }
@@ -215,8 +215,8 @@ void findNetworkAddresses(std::string_view text, Found& found) {
     for (std::size_t begin = 0; begin < text.size();) {
         const std::size_t end = endOfRun(text, begin, isPart);
         const std::string_view run = text.substr(begin, end - begin);
-        const bool isApart =
-            (begin == 0 || !isWord(text[begin - 1])) && (end == text.size() || !isWord(text[end]));
+        const bool isApart = (begin == 0 || !isAlphanumeric(text[begin - 1])) &&
+                             (end == text.size() || !isAlphanumeric(text[end]));
         const std::string_view host = run.substr(0, run.find(':'));
         const Pieces parts = piecesOf(host);
         const bool isQuad =
@@ -280,8 +280,8 @@ void findGroupedNumbers(std::string_view text, Found& found) {
     constexpr std::size_t leastDigits = 8;
     for (std::size_t begin = 0; begin < text.size(); ++begin) {
         const char first = text[begin];
-        const bool isApart = begin == 0 || !isWord(text[begin - 1]);
-        const bool mayBegin = isApart && (beginsTelephone(first) || isWord(first));
+        const bool isApart = begin == 0 || !isAlphanumeric(text[begin - 1]);
+        const bool mayBegin = isApart && (beginsTelephone(first) || isAlphanumeric(first));
         const std::size_t end = mayBegin ? endOfGroupedNumber(text, begin) : begin;
         if (end == begin) {
             continue;

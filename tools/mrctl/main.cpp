@@ -30,7 +30,7 @@ int main(int count, char** words) {
     fillStandardFiles();
     // A file that may not grow is an error of the writing, not the end of the program.
     static_cast<void>(std::signal(SIGXFSZ, SIG_IGN));
-    return mrctl::ended(
+    return mrctl::exitStatusOf(
         [&] {
             const auto arguments = mrctl::Arguments::parse(count, words);
             if (!arguments) {

@@ -25,7 +25,7 @@ ProgramResult runInto(const std::string& redirection, const std::string& argumen
 TEST(MrctlEndingTest, AProgramThatEndsGivesItsStatus) {
     std::ostringstream messages;
 
-    EXPECT_EQ(ended([] { return 2; }, messages), 2);
+    EXPECT_EQ(exitStatusOf([] { return 2; }, messages), 2);
     EXPECT_EQ(messages.str(), "");
 }
 
@@ -33,8 +33,8 @@ TEST(MrctlEndingTest, WhatIsThrownIsOneLineAndStatusOne) {
     std::ostringstream memory;
     std::ostringstream other;
 
-    EXPECT_EQ(ended([]() -> int { throw std::bad_alloc(); }, memory), 1);
-    EXPECT_EQ(ended([]() -> int { throw std::runtime_error("two\nlines"); }, other), 1);
+    EXPECT_EQ(exitStatusOf([]() -> int { throw std::bad_alloc(); }, memory), 1);
+    EXPECT_EQ(exitStatusOf([]() -> int { throw std::runtime_error("two\nlines"); }, other), 1);
 
     EXPECT_EQ(memory.str(), "mrctl: there is not enough memory\n");
     EXPECT_EQ(other.str(), "mrctl: two lines\n");
