@@ -1,0 +1,147 @@
+#include "tests/house/Command.h"
+#include "tests/house/ScratchTree.h"
+
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sstream>
+
+namespace nimbra::test {
+namespace {
+
+using testing::HasSubstr;
+
+/// The last line of the table in `output`, with one blank between its columns.
+std::string sumIn(const std::string& output) {
+    std::istringstream words(output.substr(output.rfind("\nall ") + 1));
+    std::string line;
+    std::string sum;
+    std::getline(words, line);
+    words = std::istringstream(line);
+    for (std::string word; words >> word;) {
+        sum += (sum.empty() ? "" : " ") + word;
+    }
+    return sum;
+}
+
+/// A tree of one source and a program that tests it.
+class Mutations : public testing::Test {
+protected:
+    void SetUp() override {
+        tree.write("CMakeLists.txt",
+                   "cmake_minimum_required(VERSION 3.25)\n"
+                   "project(scratch LANGUAGES CXX)\n"
+                   "set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${PROJECT_BINARY_DIR}/bin)\n"
+                   "add_executable(text-tests support/Less.cpp tests/Test.cpp)\n");
+        tree.write("support/Less.h", "#pragma once\nbool isLess(int left, int right);\n");
+        tree.write("support/Less.cpp", "#include \"support/Less.h\"\n"
+                                       "static_assert(true);\n"
+                                       "bool isLess(int left, int right) {\n"
+                                       "    return left < right;\n"
+                                       "}\n");
+    }
+
+    /// Has the tree's test ask for `condition`.
+    void writeTest(const std::string& condition) const {
+        tree.write("tests/Test.cpp", "#include \"support/Less.h\"\n\nint main() {\n    return " +
+                                         condition + " ? 0 : 1;\n}\n");
+    }
+
+    [[nodiscard]] CommandResult mutate(const std::string& what = "support/Less.cpp") const {
+        return run({NIMBRA_SOURCE_DIR "/tools/dev/mutate", "--root", tree.root(), what});
+    }
+
+    ScratchTree tree;
+};
+
+TEST_F(Mutations, AreMadeInConditionsValuesNamesAndStatements) {
+    tree.write("support/Less.cpp", R"(#define NUMBER 1
+/* 2 + 2 */
+class Base {
+    virtual int number() = 0;
+};
+constexpr std::array<int, 3> numbers{-2};
+
+std::string Derived::text(const Base& base, bool on = true) {
+    std::string line(base.text());
+    if (const auto more = base.more()) {
+        line += *more; // 5
+    }
+    for (const auto& each : base.all()) {
+        base.tell([this](int count) -> std::string {
+            first(Kind::one);
+            second(Kind::two);
+            return count > 0 && !on ? "a" : line;
+        });
+    }
+    return line;
+}
+)");
+
+    EXPECT_EQ(mutate("--list").output, R"(support/Less.cpp:6: `3` becomes `(3 + 1)`
+support/Less.cpp:6: `-` left out
+support/Less.cpp:6: `2` becomes `(2 + 1)`
+support/Less.cpp:8: `true` becomes `false`
+support/Less.cpp:10: condition is false
+support/Less.cpp:10: condition is true
+support/Less.cpp:10: exchanged with the next statement
+support/Less.cpp:11: `+=` becomes `=`
+support/Less.cpp:11: statement left out
+support/Less.cpp:14: statement left out
+support/Less.cpp:15: `one` becomes `two`
+support/Less.cpp:15: statement left out
+support/Less.cpp:15: exchanged with the next statement
+support/Less.cpp:16: `two` becomes `one`
+support/Less.cpp:16: statement left out
+support/Less.cpp:17: `>` becomes `>=`
+support/Less.cpp:17: `>` becomes `<`
+support/Less.cpp:17: `0` becomes `(0 + 1)`
+support/Less.cpp:17: `&&` becomes `||`
+support/Less.cpp:17: `!` left out
+support/Less.cpp:17: condition before `?` is true
+support/Less.cpp:17: condition before `?` is false
+support/Less.cpp:17: `"a"` becomes `"~a"`
+)");
+}
+
+TEST_F(Mutations, PassWhereTheTestsNoticeEach) {
+    writeTest("isLess(1, 2) && !isLess(2, 1) && !isLess(1, 1)");
+
+    const CommandResult result = mutate();
+
+    EXPECT_EQ(result.status, 0) << result.output;
+    EXPECT_EQ(sumIn(result.output), "all 3 2 0 0 1 100.0 %") << "one does not compile";
+}
+
+TEST_F(Mutations, FailWhereOneSurvives) {
+    writeTest("isLess(1, 2) && !isLess(2, 1)");
+
+    const CommandResult result = mutate("support/Less.cpp:4");
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_THAT(result.output,
+                HasSubstr("support/Less.cpp:4: `<` becomes `<=`: return left < right;"));
+    EXPECT_EQ(sumIn(result.output), "all 2 1 1 0 0 50.0 %");
+}
+
+TEST_F(Mutations, FailWhereTooManyAreExceptedOrAnExceptionIsOfNoUse) {
+    writeTest("isLess(1, 2) && !isLess(2, 1)");
+    tree.write("tools/dev/mutate-exceptions", "# What nobody asks for.\n\n"
+                                              "support/Less.cpp\n"
+                                              "return left < right;\n"
+                                              "`<` becomes `<=`\n"
+                                              "Nobody asks for two of one size.\n\n"
+                                              "support/Less.cpp\n"
+                                              "return left < right;\n"
+                                              "`<` becomes `>`\n"
+                                              "It is caught.\n");
+
+    const CommandResult result = mutate();
+
+    EXPECT_EQ(result.status, 1);
+    EXPECT_THAT(result.output, HasSubstr("an exception of no use: support/Less.cpp: `<` becomes "
+                                         "`>`: return left < right;"));
+    EXPECT_EQ(sumIn(result.output), "all 3 1 0 1 1 50.0 %");
+}
+
+} // namespace
+} // namespace nimbra::test

@@ -1,0 +1,289 @@
+# The changes of tools/dev/mutate: reads one C++ source and prints each change that may be made to
+# it, as "NUMBER<tab>LINE<tab>WHAT<tab>TEXT OF THE LINE"; with `-v apply=NUMBER`, the source with
+# that one change.
+#
+# It knows words, not C++: what does not compile is found by the compiler. Comments and lines of the
+# preprocessor stay as they are, and so do declarations but for the values in them.
+
+BEGIN {
+    split("== != != == <= < >= > && || || && + - - + * / / * % * & | | & ++ -- -- ++ -= =", swap, " ")
+    for (i = 1; i in swap; i += 2) other[swap[i]] = swap[i + 1]
+    other["+="] = "="
+    other["true"] = "false"
+    other["false"] = "true"
+    # As brackets of templates, signs and marks of references these have no blanks around them.
+    set(binary, "& && | * / % + -")
+    set(keyword, "if else for while do return break continue switch case throw delete")
+    set(declaring, "const constexpr auto static using struct class enum typedef extern inline")
+    set(beforeBody, ") ] else do try const override noexcept mutable")
+}
+
+function set(target, list, names, i) {
+    split(list, names, " ")
+    for (i in names) target[names[i]] = 1
+}
+
+{ source = source $0 "\n" }
+
+END {
+    readTokens()
+    matchBrackets()
+    changeWords()
+    changeNames()
+    for (i = 1; i <= count; ++i) if (isBody[i]) changeStatements(i)
+    printChanges()
+}
+
+# The tokens: what they are, where they begin, whether blanks stand before them.
+
+function readTokens(    place, rest, size, blank, atStart) {
+    place = 1
+    rest = source
+    atStart = 1
+    while (rest != "") {
+        blank = match(rest, /^[ \n]+/) ? RLENGTH : 0
+        if (blank) {
+            if (substr(rest, 1, blank) ~ /\n/) atStart = 1
+            place += blank
+            rest = substr(rest, blank + 1)
+            continue
+        }
+        if (rest ~ /^\/\// || (atStart && rest ~ /^#/)) {
+            match(rest, /^([^\n\\]|\\\n|\\.)*/)
+            size = RLENGTH
+        } else if (rest ~ /^\/\*/) {
+            size = index(rest, "*/") + 1
+        } else {
+            size = tokenSize(rest)
+            token[++count] = substr(rest, 1, size)
+            begin[count] = place
+        }
+        atStart = 0
+        place += size
+        rest = substr(rest, size + 1)
+    }
+}
+
+function tokenSize(rest,    three) {
+    if (match(rest, /^R"\(/)) return index(rest, ")\"") + 1
+    if (match(rest, /^"([^"\\]|\\.)*"/)) return RLENGTH
+    if (match(rest, /^'([^'\\]|\\.)*'/)) return RLENGTH
+    if (match(rest, /^[0-9]([0-9A-Za-z_.']|[eE][+-][0-9])*/)) return RLENGTH
+    if (match(rest, /^[A-Za-z_][A-Za-z0-9_]*/)) return RLENGTH
+    three = substr(rest, 1, 3)
+    if (three == "<=>" || three == "...") return 3
+    if (match(rest, /^(::|->|==|!=|<=|>=|&&|\|\||\+\+|--|\+=|-=|<<)/)) return RLENGTH
+    return 1
+}
+
+function finish(i) { return begin[i] + length(token[i]) - 1 }
+function text(from, to) { return substr(source, from, to - from + 1) }
+function isBlank(place) { return substr(source, place, 1) ~ /[ \n]/ }
+function standsAlone(i) { return isBlank(begin[i] - 1) && isBlank(finish(i) + 1) }
+function isWord(i) { return token[i] ~ /^[A-Za-z_]/ && !(token[i] in keyword) }
+
+# Which bracket closes which, and which braces hold statements.
+
+function matchBrackets(    i, depth, opening) {
+    for (i = 1; i <= count; ++i) {
+        if (token[i] ~ /^[({[]$/) {
+            opening[++depth] = i
+            isBody[i] = token[i] == "{" && beginsBody(i, opening[depth - 1])
+        } else if (token[i] ~ /^[]})]$/) {
+            partner[opening[depth]] = i
+            partner[i] = opening[depth--]
+        }
+    }
+}
+
+function beginsBody(i, around,    before) {
+    before = token[i - 1]
+    if (before in beforeBody) return 1
+    if (before ~ /^[;{}]$/) return around != "" && isBody[around]
+    # A lambda that says what it returns.
+    for (--i; i > 0 && token[i] ~ /^([A-Za-z_0-9]+|::|<|>|[*&,])$/; --i) {}
+    return token[i] == "->" && token[i - 1] ~ /^(\)|mutable|noexcept)$/
+}
+
+# The changes.
+
+function change(from, to, replacement, what,    key) {
+    ++changes
+    changeFrom[changes] = from
+    changeTo[changes] = to
+    changeText[changes] = replacement
+    changeWhat[changes] = what
+}
+
+function replace(i, replacement) {
+    change(begin[i], finish(i), replacement, quoted(token[i]) " becomes " quoted(replacement))
+}
+
+function quoted(words) { return "`" words "`" }
+
+function changeWords(    i, word) {
+    for (i = 1; i <= count; ++i) {
+        word = token[i]
+        if (word ~ /^[0-9]/) {
+            # A pure virtual function's 0 is no number.
+            if (!(token[i - 1] == "=" && token[i - 2] ~ /^(\)|const|noexcept)$/)) {
+                replace(i, "(" word " + 1)")
+            }
+        } else if (word ~ /^(R"\(|")/) {
+            if (token[i - 1] != "extern") {
+                replace(i, word ~ /^R/ ? "R\"(~" substr(word, 4) : "\"~" substr(word, 2))
+            }
+        } else if (word ~ /^'/) {
+            replace(i, word == "'~'" ? "'-'" : "'~'")
+        } else if (word == "!") {
+            change(begin[i], begin[i], "", "`!` left out")
+        } else if (word == "-" && token[i + 1] ~ /^[0-9]/ && !standsAlone(i)) {
+            change(begin[i], begin[i], "", "`-` left out")
+        } else if (word == "<" || word == "<=") {
+            if (standsAlone(i)) { replace(i, word == "<" ? "<=" : "<"); replace(i, ">") }
+        } else if (word == ">" || word == ">=") {
+            if (standsAlone(i)) { replace(i, word == ">" ? ">=" : ">"); replace(i, "<") }
+        } else if (word in other && token[i - 1] != "operator") {
+            if (!(word in binary) || standsAlone(i)) replace(i, other[word])
+        } else if (word == "?") {
+            change(begin[i], begin[i], "|| true ?", "condition before `?` is true")
+            change(begin[i], begin[i], "&& false ?", "condition before `?` is false")
+        } else if (word ~ /^(if|while|for)$/ && token[i + 1] == "(") {
+            changeCondition(i)
+        }
+    }
+}
+
+function changeCondition(i,    opening, closing, from, to, at, semicolons, declares) {
+    opening = i + 1
+    closing = partner[opening]
+    from = opening + 1
+    to = closing - 1
+    for (at = opening + 1; at < closing; ++at) {
+        if (at in partner && partner[at] > at) {
+            at = partner[at]
+        } else if (token[at] == ";") {
+            ++semicolons
+            if (token[i] == "for" && semicolons == 2) to = at - 1
+            else { from = at + 1; declares = 0 }
+        } else if (token[at] == "=") {
+            declares = 1
+        }
+    }
+    # A loop over a range has no condition.
+    if (token[i] == "for" && semicolons < 2) return
+    if (token[i] != "for" && declares) {
+        change(begin[closing], begin[closing], "; false)", "condition is false")
+        if (token[i] == "if") change(begin[closing], begin[closing], "; true)", "condition is true")
+        return
+    }
+    change(begin[from], finish(to), "false", "condition is false")
+    # Loops without an end prove little and take long.
+    if (token[i] == "if") change(begin[from], finish(to), "true", "condition is true")
+}
+
+# Constants with names: in the place of one stands the next of its kind that the source knows.
+
+function changeNames(    i, kind) {
+    for (i = 1; i <= count; ++i) {
+        kind = kindOfName(i)
+        if (kind != "" && !((kind, token[i]) in known)) {
+            known[kind, token[i]] = ++sizeOf[kind]
+            name[kind, sizeOf[kind]] = token[i]
+        }
+    }
+    for (i = 1; i <= count; ++i) {
+        kind = kindOfName(i)
+        if (kind != "" && sizeOf[kind] > 1) {
+            replace(i, name[kind, known[kind, token[i]] % sizeOf[kind] + 1])
+        }
+    }
+}
+
+function kindOfName(i) {
+    if (token[i + 1] ~ /^(\(|<|::|\{)$/) return ""
+    if (token[i] ~ /^k[A-Z]/) return "k"
+    if (token[i] ~ /^[A-Z].*Key$/) return "Key"
+    if (token[i - 1] == "::" && token[i] ~ /^[_a-z]/ && token[i - 2] ~ /^([A-Z]|log_messages)/) {
+        return token[i - 2]
+    }
+    return ""
+}
+
+# The statements of the body that `opening` begins: each left out, each exchanged with the next.
+
+function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo, lastKind) {
+    closing = partner[opening]
+    lastKind = "none"
+    for (from = opening + 1; from < closing; from = to + 1) {
+        to = statementEnd(from, closing)
+        kind = statementKind(from, to)
+        if (kind == "call" || (kind == "jump" && to - from == 1)) {
+            change(begin[from], finish(to), "", "statement left out")
+        }
+        if (kind ~ /call|block/ && lastKind ~ /call|block/) {
+            change(begin[lastFrom], finish(to),
+                text(begin[from], finish(to)) text(finish(lastTo) + 1, begin[from] - 1) \
+                text(begin[lastFrom], finish(lastTo)), "exchanged with the next statement")
+        }
+        lastFrom = from
+        lastTo = to
+        lastKind = kind
+    }
+}
+
+function statementEnd(from, closing,    i) {
+    if (token[from] ~ /^(if|for|while|switch)$/) {
+        i = partner[from + 1] + 1
+        if (token[i] != "{") return statementEnd(i, closing)
+        i = partner[i]
+        return token[i + 1] == "else" ? statementEnd(i + 2, closing) : i
+    }
+    if (token[from] == "{") return partner[from]
+    for (i = from; i < closing && token[i] != ";"; ++i) {
+        if (i in partner && partner[i] > i) i = partner[i]
+    }
+    return i
+}
+
+function statementKind(from, to) {
+    if (token[from] ~ /^(if|for|while|switch|\{)$/) return "block"
+    if (token[from] ~ /^(return|break|continue|throw)$/) return "jump"
+    return isDeclaration(from, to) ? "declaration" : "call"
+}
+
+# Declarations begin with a word that says so, or with a type and a name.
+function isDeclaration(from, to,    i, depth) {
+    if (token[from] in declaring) return 1
+    for (i = from; isWord(i) && token[i + 1] == "::"; i += 2) {}
+    if (!isWord(i)) return 0
+    if (token[++i] == "<" && !standsAlone(i)) {
+        for (depth = 1; depth > 0 && ++i < to;) depth += (token[i] == "<") - (token[i] == ">")
+        ++i
+    }
+    if (token[i] == "::") return isDeclaration(i + 1, to)
+    for (; token[i] ~ /^([*&]|const)$/; ++i) {}
+    return isWord(i) && token[i + 1] ~ /^[=;({[]$/
+}
+
+# The same change of the same line once more has a number, so that each has a name of its own.
+
+function printChanges(    i, j, lines, at, nth) {
+    if (apply) {
+        printf "%s%s%s", text(1, changeFrom[apply] - 1), changeText[apply],
+            text(changeTo[apply] + 1, length(source))
+        return
+    }
+    lines = split(source, lineText, "\n")
+    at = 1
+    for (i = 1; i <= lines; ++i) {
+        lineBegin[i] = at
+        at += length(lineText[i]) + 1
+    }
+    for (i = 1; i <= changes; ++i) {
+        for (j = 1; j < lines && lineBegin[j + 1] <= changeFrom[i]; ++j) {}
+        sub(/^ +/, "", lineText[j])
+        nth = ++seen[j, changeWhat[i]]
+        print i "\t" j "\t" changeWhat[i] (nth > 1 ? ", number " nth : "") "\t" lineText[j]
+    }
+}
