@@ -1,6 +1,10 @@
 # The changes of tools/dev/mutate: reads one C++ source and prints each change that may be made to
-# it, as "NUMBER<tab>LINE<tab>WHAT<tab>TEXT OF THE LINE"; with `-v apply=NUMBER`, the source with
-# that one change.
+# it, as "NUMBER<tab>LINE<tab>WHAT<tab>TEXT OF THE LINE<tab>together or alone".
+#
+# With `-v apply=NUMBER`, prints the source with that change. With `-v together=1`, prints one source
+# that has every change that can be chosen while the program runs, by its number in the environment
+# variable MUTANT, but for those in `-v without="NUMBER..."`: what the compiler says of such a change
+# it says of the file "mutant", in a line from NUMBER * 1000 on.
 #
 # It knows words, not C++: what does not compile is found by the compiler. Comments and lines of the
 # preprocessor stay as they are, and so do declarations but for the values in them.
@@ -31,7 +35,10 @@ END {
     changeWords()
     changeNames()
     for (i = 1; i <= count; ++i) if (isBody[i]) changeStatements(i)
-    printChanges()
+    findUnits()
+    if (apply) printf "%s", changedText(apply, 1, length(source))
+    else if (together) printTogether()
+    else printChanges()
 }
 
 # The tokens: what they are, where they begin, whether blanks stand before them.
@@ -215,9 +222,11 @@ function kindOfName(i) {
 function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo, lastKind) {
     closing = partner[opening]
     lastKind = "none"
+    unit(finish(opening) + 1, begin[closing] - 1)
     for (from = opening + 1; from < closing; from = to + 1) {
         to = statementEnd(from, closing)
         kind = statementKind(from, to)
+        if (kind != "declaration") unit(begin[from], finish(to))
         if (kind == "call" || (kind == "jump" && to - from == 1)) {
             change(begin[from], finish(to), "", "statement left out")
         }
@@ -266,14 +275,73 @@ function isDeclaration(from, to,    i, depth) {
     return isWord(i) && token[i + 1] ~ /^[=;({[]$/
 }
 
+# Units are what can stand in one branch of a condition as well as in another: statements that
+# declare nothing, and all that is between the braces of a body.
+
+function unit(from, to) {
+    if (to < from) return
+    ++units
+    unitFrom[units] = from
+    unitTo[units] = to
+}
+
+function innermost(from, to, except,    u, best) {
+    for (u = 1; u <= units; ++u) {
+        if (u != except && unitFrom[u] <= from && unitTo[u] >= to &&
+            (!best || unitTo[u] - unitFrom[u] < unitTo[best] - unitFrom[best])) best = u
+    }
+    return best + 0
+}
+
+function findUnits(    i) {
+    for (i = 1; i <= changes; ++i) changeUnit[i] = innermost(changeFrom[i], changeTo[i], 0)
+    for (i = 1; i <= units; ++i) unitAround[i] = innermost(unitFrom[i], unitTo[i], i)
+}
+
+# The text between `from` and `to` with one change in it.
+function changedText(number, from, to) {
+    return text(from, changeFrom[number] - 1) changeText[number] text(changeTo[number] + 1, to)
+}
+
+function printTogether(    i, names) {
+    split(without, names, " ")
+    for (i in names) isLeftOut[names[i]] = 1
+    printf "%s", "extern \"C\" char* getenv(const char*) noexcept;\n" \
+        "extern \"C\" int atoi(const char*) noexcept;\n" \
+        "static bool mutant(int number) {\n" \
+        "    static const char* const chosen = getenv(\"MUTANT\");\n" \
+        "    return chosen != nullptr && atoi(chosen) == number;\n}\n"
+    printf "%s", withUnits(0, 1, length(source))
+}
+
+# The text between `from` and `to`, with the units right below `around` in all their forms.
+function withUnits(around, from, to,    u, following, result) {
+    for (;;) {
+        following = 0
+        for (u = 1; u <= units; ++u) {
+            if (unitAround[u] == around && unitFrom[u] >= from &&
+                (!following || unitFrom[u] < unitFrom[following])) following = u
+        }
+        if (!following) return result text(from, to)
+        result = result text(from, unitFrom[following] - 1) unitForms(following)
+        from = unitTo[following] + 1
+    }
+}
+
+function unitForms(u,    i, result, plain) {
+    plain = withUnits(u, unitFrom[u], unitTo[u])
+    for (i = 1; i <= changes; ++i) {
+        if (changeUnit[i] == u && !(i in isLeftOut)) {
+            result = result "if (mutant(" i ")) {\n#line " i * 1000 " \"mutant\"\n" \
+                changedText(i, unitFrom[u], unitTo[u]) "\n} else "
+        }
+    }
+    return result == "" ? plain : result "{\n#line 1 \"source\"\n" plain "\n}\n"
+}
+
 # The same change of the same line once more has a number, so that each has a name of its own.
 
 function printChanges(    i, j, lines, at, nth) {
-    if (apply) {
-        printf "%s%s%s", text(1, changeFrom[apply] - 1), changeText[apply],
-            text(changeTo[apply] + 1, length(source))
-        return
-    }
     lines = split(source, lineText, "\n")
     at = 1
     for (i = 1; i <= lines; ++i) {
@@ -284,6 +352,7 @@ function printChanges(    i, j, lines, at, nth) {
         for (j = 1; j < lines && lineBegin[j + 1] <= changeFrom[i]; ++j) {}
         sub(/^ +/, "", lineText[j])
         nth = ++seen[j, changeWhat[i]]
-        print i "\t" j "\t" changeWhat[i] (nth > 1 ? ", number " nth : "") "\t" lineText[j]
+        print i "\t" j "\t" changeWhat[i] (nth > 1 ? ", number " nth : "") "\t" lineText[j] "\t" \
+            (changeUnit[i] ? "together" : "alone")
     }
 }
