@@ -94,6 +94,34 @@ TEST_F(FooterProgress, TheEndOfAProgressHidesTheBarAndShowsTheSentence) {
     EXPECT_TRUE(view->needsLayout());
 }
 
+TEST_F(FooterProgress, TheEndOfAProgressComesInItsOrder) {
+    const auto progress = progressCalled("Uploading");
+    Calls seen;
+    const auto note = [&] {
+        seen.push_back(std::string(view->isSyncing() ? "syncing" : "idle") +
+                       (isBarHidden() ? ", no bar" : ", bar"));
+    };
+    progress->whenRemoved = note;
+    platform.lastSync.whenAsked = note;
+
+    platform.progressReports.publish(progress)();
+
+    EXPECT_EQ(seen, (Calls{"syncing, bar", "syncing, bar", "syncing, bar", "idle, no bar"}));
+}
+
+TEST_F(FooterProgress, AProgressThatBeginsIndeterminateShowsTheSentenceBehindTheBarsEnd) {
+    const auto progress = progressCalled("Uploading");
+    progress->indeterminate = true;
+    std::vector<bool> hidden;
+    platform.lastSync.whenAsked = [&] { hidden.push_back(isBarHidden()); };
+
+    const auto end = platform.progressReports.publish(progress);
+
+    EXPECT_EQ(hidden, std::vector<bool>{true});
+    EXPECT_EQ(text(), Text("Synced."));
+    end();
+}
+
 TEST_F(FooterProgress, TheEndHoldsProgressAndView) {
     auto progress = progressCalled("Uploading");
     const std::weak_ptr<FakeProgress> heldProgress = progress;

@@ -23,6 +23,32 @@ TEST_F(FooterWindow, EnteringAWindowReadsTheDateThenObservesThenSubscribes) {
     EXPECT_EQ(text(), Text("Synced."));
 }
 
+TEST_F(FooterWindow, EnteringAWindowHasEachStepBehindTheOther) {
+    storeAge(61s);
+    std::vector<std::size_t> registrations;
+    const auto note = [&] {
+        registrations.push_back(platform.distributedNotificationCenter.registrations.size());
+    };
+    platform.lastSync.whenAsked = note;
+    platform.progressReports.whenCalled = note;
+
+    view->moveToWindow(&window);
+
+    EXPECT_EQ(registrations, (std::vector<std::size_t>{0, 1}));
+}
+
+TEST_F(FooterWindow, LeavingTheWindowForgetsTheSubscriptionBetweenItsEndAndTheSentence) {
+    view->moveToWindow(&window);
+    std::vector<bool> subscribed;
+    const auto note = [&] { subscribed.push_back(view->globalProgressSubscriber() != nullptr); };
+    platform.progressReports.whenCalled = note;
+    platform.lastSync.whenAsked = note;
+
+    view->moveToWindow(nullptr);
+
+    EXPECT_EQ(subscribed, (std::vector<bool>{true, false}));
+}
+
 TEST_F(FooterWindow, WithoutADateTheTextStaysAndNothingIsArmed) {
     view->moveToWindow(&window);
 

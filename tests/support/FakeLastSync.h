@@ -2,6 +2,7 @@
 
 #include "platform/documents/LastSync.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -18,11 +19,16 @@ public:
     }
     [[nodiscard]] std::expected<Text, Error> MRGetLocalizedLastSyncWithError() const override {
         _calls.emplace_back("sentence");
+        if (whenAsked) {
+            whenAsked();
+        }
         return sentence;
     }
 
     std::expected<std::optional<Date>, Error> date;
     std::expected<Text, Error> sentence;
+    /// Called where the sentence is asked for, to see how things stand at that moment.
+    std::function<void()> whenAsked;
 
 private:
     std::vector<std::string>& _calls;

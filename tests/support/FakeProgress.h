@@ -2,6 +2,7 @@
 
 #include "platform/documents/ProgressReport.h"
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -19,6 +20,8 @@ public:
     std::vector<std::string> calls;
     /// The contexts that observers came with, in order.
     std::vector<void*> contexts;
+    /// Called where an observer is removed, to see how things stand at that moment.
+    std::function<void()> whenRemoved;
 
     [[nodiscard]] const UserInfo& userInfo() const override { return info; }
     [[nodiscard]] bool isIndeterminate() const override { return indeterminate; }
@@ -39,6 +42,9 @@ public:
     void removeObserverForKeyPath(const KeyValueObserver& /*observer*/,
                                   const KeyPath& keyPath) override {
         calls.push_back("remove " + keyPath.string());
+        if (whenRemoved) {
+            whenRemoved();
+        }
     }
 
     /// Tells the observer that the value named `keyPath` has changed.

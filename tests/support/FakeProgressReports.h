@@ -2,6 +2,7 @@
 
 #include "platform/documents/ProgressReports.h"
 
+#include <functional>
 #include <memory>
 #include <string>
 #include <utility>
@@ -18,11 +19,17 @@ public:
     _addSubscriberForFileURLWithPublishingHandler(const std::string& url,
                                                   PublishingHandler handler) override {
         _calls.push_back("subscribe " + url);
+        if (whenCalled) {
+            whenCalled();
+        }
         _subscriptions.push_back({std::make_shared<ProgressSubscriber>(), std::move(handler)});
         return _subscriptions.back().subscriber;
     }
 
     void _removeSubscriber(const std::shared_ptr<ProgressSubscriber>& subscriber) override {
+        if (whenCalled) {
+            whenCalled();
+        }
         const auto ended = std::erase_if(_subscriptions, [&](const Subscription& subscription) {
             return subscription.subscriber == subscriber;
         });
@@ -38,6 +45,9 @@ public:
 
     /// Lets go of the handlers, as the platform does when it shuts down.
     void finish() { _subscriptions.clear(); }
+
+    /// Called where somebody subscribes or ends a subscription, to see how things stand then.
+    std::function<void()> whenCalled;
 
 private:
     struct Subscription {
