@@ -32,11 +32,13 @@ public:
 
     void saveVerifiedAccountWithCompletionHandler(const std::shared_ptr<Account>& account,
                                                   SaveCompletion completion) override {
+        noteSave(account);
         saves.push_back(
             {.operation = "saveVerifiedAccount", .account = account, .end = std::move(completion)});
     }
 
     void saveAccount(const std::shared_ptr<Account>& account, SaveOptions options) override {
+        noteSave(account);
         saves.push_back({.operation = options.doVerify
                                           ? "saveAccount, with completion, verified"
                                           : "saveAccount, with completion, not verified",
@@ -78,7 +80,21 @@ public:
     /// The saves under way, in order.
     std::vector<Save> saves;
 
+    /// What the accounts had when they were given to be saved, in order.
+    std::vector<FakeAccount::Flags> given;
+    /// Called where an account is given to be saved, to see how things stand then.
+    std::function<void()> whenGiven;
+
 private:
+    void noteSave(const std::shared_ptr<Account>& account) {
+        if (whenGiven) {
+            whenGiven();
+        }
+        if (account) {
+            given.push_back(std::static_pointer_cast<FakeAccount>(account)->flags);
+        }
+    }
+
     class Helper final : public AccountOperationsHelper {
     public:
         Helper(FakeAccountStore& store, std::weak_ptr<AccountOperationsHelperDelegate> delegate)
@@ -91,6 +107,7 @@ private:
                 delegate->operationsHelperWillSaveAccount(*this, account);
                 delegate->operationsHelperDidSaveAccountWithSuccessError(*this, account, saved);
             };
+            _store.noteSave(account);
             _store.saves.push_back({.operation = requireVerification ? "saveAccount, verified"
                                                                      : "saveAccount, not verified",
                                     .account = account,

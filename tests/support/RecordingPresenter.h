@@ -3,6 +3,7 @@
 #include "platform/host/AccountAlertView.h"
 #include "platform/host/AlertController.h"
 #include "platform/host/Presenter.h"
+#include "platform/host/SettingsListController.h"
 #include "platform/host/SetupController.h"
 #include "platform/host/ShareSheet.h"
 
@@ -33,10 +34,13 @@ public:
     void presentController(const std::shared_ptr<SetupController>& controller,
                            bool animated) override {
         _calls.emplace_back(animated ? "present controller, animated" : "present controller");
+        const auto& root = controller->rootViewController();
+        presentedAsSheet = root && root->isPresentedAsModalSheet();
         presented = controller;
     }
     void presentAlert(const std::shared_ptr<AlertController>& shown, bool animated) override {
         _calls.push_back((animated ? "alert, animated: " : "alert: ") + shown->title().string());
+        answersOfAlert = shown->actions().size();
         alert = shown;
     }
     void showAccountAlert(const std::shared_ptr<AccountAlertView>& shown) override {
@@ -62,7 +66,11 @@ public:
 
     /// What was presented last; a test lets it go, as a host does at its end.
     std::shared_ptr<SetupController> presented;
+    /// Whether its root knew that it was in a sheet when it was presented.
+    bool presentedAsSheet = false;
     std::shared_ptr<AlertController> alert;
+    /// How many answers the alert had when it was presented.
+    std::size_t answersOfAlert = 0;
     std::shared_ptr<AccountAlertView> accountAlert;
     std::shared_ptr<ShareSheet> shareSheet;
     /// Who wanted to be dismissed last; not to be used but for its identity.

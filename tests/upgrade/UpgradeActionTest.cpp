@@ -51,6 +51,7 @@ TEST_F(UpgradeAction, TouchingTheButtonOnlyAsks) {
 
     EXPECT_THAT(platform.calls, ElementsAre("alert, animated: Sure?"));
     const auto alert = platform.presenter.alert;
+    EXPECT_EQ(platform.presenter.answersOfAlert, 2U) << "all of them, before it is shown";
     EXPECT_EQ(alert->message(), Text("No way back."));
     EXPECT_EQ(alert->preferredStyle(), AlertControllerStyle::alert);
     ASSERT_EQ(alert->actions().size(), 2U);
@@ -88,6 +89,10 @@ TEST_F(UpgradeAction, ContinuingMarksTheAccountAndSavesItUnverified) {
     EXPECT_EQ(platform.accountStore.saves.front().operation,
               "saveAccount, with completion, not verified");
     EXPECT_EQ(platform.accountStore.saves.front().account, account);
+    ASSERT_EQ(platform.accountStore.given.size(), 1U);
+    EXPECT_TRUE(
+        platform.accountStore.given.front().enabled.contains(kAccountDataclassTSYShareService))
+        << "saved with all that has changed";
     EXPECT_THAT(platform.calls, ElementsAre("alert, animated: Sure?", "busy: Upgrading"));
 }
 
