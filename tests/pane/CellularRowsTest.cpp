@@ -92,6 +92,7 @@ TEST_F(CellularRowsTest, ADifferenceReadsAsOffAndTurningOnWritesBoth) {
     EXPECT_TRUE(usesCellular(kAccountDataclassKeyValue));
     ASSERT_EQ(platform.accountStore.saves.size(), 1U);
     EXPECT_EQ(platform.accountStore.saves.front().operation, "saveVerifiedAccount");
+    EXPECT_EQ(platform.accountStore.given.front().cellular.size(), 2U) << "both, before the save";
 }
 
 TEST_F(CellularRowsTest, ASetValueIsSavedEvenWhenItIsTheStoredOne) {
@@ -131,6 +132,27 @@ TEST_F(CellularRowsTest, AFailedSaveIsLoggedAndTheSwitchGoesBack) {
     EXPECT_EQ(platform.systemLog.lines,
               FakeSystemLog::Lines({{LogLevel::error, "Error updating use-cellular flag on Nimbra "
                                                       "account: refused (store 7)"}}));
+}
+
+TEST_F(CellularRowsTest, AFailedSaveIsLoggedThenReloadsThenAsksForTheRow) {
+    const auto account = std::static_pointer_cast<FakeAccount>(pane->_vantrelAccount());
+    cellular()->setValue(true);
+    std::vector<int> reloads;
+    const auto note = [&] { reloads.push_back(account->reloads); };
+    platform.systemLog.onWrite = note;
+    platform.workQueues.mainQueue().whenQueued = note;
+
+    platform.accountStore.endSave(std::unexpected(kRefused));
+
+    EXPECT_EQ(reloads, (std::vector{0, 1}));
+}
+
+TEST_F(CellularRowsTest, WithoutAnAccountASetValueIsNotSaved) {
+    platform.accountStore.isReadable = false;
+
+    pane->_createSpecifiersForCellularSwitchCell()->at(1)->setValue(true);
+
+    EXPECT_TRUE(platform.accountStore.saves.empty());
 }
 
 TEST_F(CellularRowsTest, AFailedSaveReloadsTheSameAccountObject) {

@@ -10,9 +10,15 @@ using testing::ElementsAre;
 struct CollectingDiagnostics : DiagnosticsFixture {};
 
 TEST_F(CollectingDiagnostics, ATapMakesThePageBusyAndStartsNothingByItself) {
+    Calls before;
+    platform.workQueues.globalQueueWithQuality(UserInitiatedQuality).whenQueued = [&] {
+        before = platform.calls;
+    };
+
     tap();
 
     EXPECT_THAT(platform.calls, ElementsAre("task added", "busy: Gathering"));
+    EXPECT_EQ(before, platform.calls) << "the page is busy before anything can run";
     EXPECT_TRUE(root->taskIsRunning(pane));
     EXPECT_EQ(platform.workQueues.mainQueue().pendingCount(), 0U);
 }
@@ -186,6 +192,7 @@ TEST_F(CollectingDiagnostics, TheAlertHasOneAnswerThatOnlyClosesIt) {
     EXPECT_EQ(alert->title(), Text("No archive"));
     EXPECT_EQ(alert->message(), Text("Try again."));
     EXPECT_EQ(alert->preferredStyle(), AlertControllerStyle::alert);
+    EXPECT_EQ(platform.presenter.answersOfAlert, 1U) << "before it is shown";
     ASSERT_EQ(alert->actions().size(), 1U);
     EXPECT_EQ(alert->actions().front().title, Text("OK"));
     EXPECT_EQ(alert->actions().front().style, AlertActionStyle::standard);

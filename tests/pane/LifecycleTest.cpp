@@ -83,6 +83,13 @@ TEST_F(LifecycleTest, AFalseFirstSetupReadsTheStore) {
     EXPECT_EQ(pane->_vantrelAccount()->identifier(), AccountIdentifier("primary"));
 }
 
+TEST_F(LifecycleTest, WithoutAnIdentifierNoStoreIsAsked) {
+    entry->setUserInfo({});
+
+    EXPECT_EQ(pane->_vantrelAccount(), nullptr);
+    EXPECT_EQ(platform.accountStore.asked, Calls());
+}
+
 TEST_F(LifecycleTest, LoadingClearsTheBarAndInstallsTheRefreshControl) {
     pane->navigationItem().setLeftBarButtonItem(BarButtonItem{"Back"});
     pane->navigationItem().setRightBarButtonItem(BarButtonItem{"Edit"});

@@ -49,6 +49,7 @@ TEST_F(MasterSwitchTest, TurningOffTakesThePhotoStreamAlongAndRefreshesEveryPare
     EXPECT_FALSE(isEnabled(kAccountDataclassTidewater));
     EXPECT_FALSE(isEnabled(kAccountDataclassLarder));
     EXPECT_EQ(savesUnderWay(), 1U);
+    EXPECT_TRUE(platform.accountStore.given.front().enabled.empty()) << "both, before the save";
     EXPECT_EQ(calls(), Calls({"reload all parent rows"}));
 }
 
@@ -94,6 +95,16 @@ TEST_F(MasterSwitchTest, TheParentIsRefreshedBeforeTheSaveEnds) {
 
     EXPECT_EQ(savesUnderWay(), 1U);
     EXPECT_EQ(calls(), Calls({"reload parent row"}));
+}
+
+TEST_F(MasterSwitchTest, TheSaveIsAskedForBeforeTheParentIsRefreshed) {
+    openWith({});
+    std::size_t callsBefore = 1;
+    platform.accountStore.whenGiven = [&] { callsBefore = calls().size(); };
+
+    flip(true);
+
+    EXPECT_EQ(callsBefore, 0U);
 }
 
 TEST_F(MasterSwitchTest, ASuccessfulSaveShowsTheRowsThenEndsTheBusyIndicator) {
@@ -153,9 +164,14 @@ TEST_F(MasterSwitchTest, AFailedSaveReadsTheAccountAnewOnTheCallingQueue) {
     openWith({});
     flip(true);
     ASSERT_EQ(platform.accountStore.asked, Calls({"primary"}));
+    std::vector<std::size_t> askedBefore;
+    platform.workQueues.mainQueue().whenQueued = [&] {
+        askedBefore.push_back(platform.accountStore.asked.size());
+    };
 
     platform.accountStore.endSave(std::unexpected(kRefused));
 
+    EXPECT_EQ(askedBefore, (std::vector<std::size_t>{2, 2})) << "before the row is asked for";
     // The main queue has not run yet.
     EXPECT_EQ(platform.accountStore.asked, Calls({"primary", "primary"}));
     EXPECT_FALSE(isEnabled(kAccountDataclassTidewater));

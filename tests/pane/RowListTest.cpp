@@ -86,10 +86,11 @@ TEST_F(RowListTest, AbsentRowSourcesContributeNothing) {
 TEST_F(RowListTest, TheSourcesAreAskedInTheirOrderWhateverTheSwitch) {
     storeTidewater(false);
     platform.accountStore.stored.usesStratafile = false;
+    platform.deviceInfo.whenAsked = [this] { pane->asked.emplace_back("cellular"); };
 
     static_cast<void>(pane->specifiers());
 
-    EXPECT_EQ(pane->asked, Calls({"apps", "diagnostics", "upgrade", "tessary"}));
+    EXPECT_EQ(pane->asked, Calls({"apps", "cellular", "diagnostics", "upgrade", "tessary"}));
 }
 
 TEST_F(RowListTest, TheListIsBuiltOnceAndKept) {
@@ -147,7 +148,9 @@ TEST_F(RowListTest, AMissingTextShowsTheStandInAndTheListIsBuiltAllTheSame) {
     platform.bundles.paneBundle = std::make_shared<FakeBundle>(std::map<std::string, Text>());
 
     EXPECT_EQ(rows(), "RSPNimbraDrive RSP_LOCALIZED_STRING_UNAVAILABLE");
-    EXPECT_EQ(syslog.lines.size(), 2U);
+    ASSERT_EQ(syslog.lines.size(), 2U);
+    EXPECT_TRUE(syslog.lines[0].second.ends_with(": CLOUD_DRIVE_EXPLANATION"));
+    EXPECT_TRUE(syslog.lines[1].second.ends_with(": CLOUD_DRIVE"));
 }
 
 TEST_F(RowListTest, WithoutABundleTheTextsAreAbsentAndNothingIsReported) {

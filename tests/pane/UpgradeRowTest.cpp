@@ -56,7 +56,7 @@ TEST_F(UpgradeRow, PresentsTheScreenInAFormSheetOverThePage) {
     EXPECT_EQ(screen->specifier(), entry);
     EXPECT_EQ(screen->delegate(), pane);
     EXPECT_EQ(screen->parentController(), setup);
-    EXPECT_TRUE(screen->isPresentedAsModalSheet());
+    EXPECT_TRUE(platform.presenter.presentedAsSheet) << "before it is presented";
 }
 
 TEST_F(UpgradeRow, EachTapMakesAScreenOfItsOwn) {

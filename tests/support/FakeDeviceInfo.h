@@ -2,6 +2,7 @@
 
 #include "platform/system/DeviceInfo.h"
 
+#include <functional>
 #include <optional>
 #include <string>
 
@@ -11,6 +12,9 @@ namespace nimbra::test {
 class FakeDeviceInfo final : public DeviceInfo {
 public:
     [[nodiscard]] bool boolAnswerForQuestion(const Text& question) const override {
+        if (whenAsked) {
+            whenAsked();
+        }
         return question == Text("cellular-data") && hasCellularData;
     }
     [[nodiscard]] Text copyAnswerForQuestion(const Text& question) const override {
@@ -26,6 +30,8 @@ public:
     [[nodiscard]] std::optional<Screen> mainScreen() const override { return screen; }
 
     bool hasCellularData = false;
+    /// Called where a question is asked that has yes or no for an answer.
+    std::function<void()> whenAsked;
     Text name{"Phone"};
     std::string variant;
     UserInterfaceIdiom idiom = UserInterfaceIdiom::phone;

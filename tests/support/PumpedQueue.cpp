@@ -7,7 +7,9 @@ namespace nimbra::test {
 PumpedQueue::PumpedQueue(std::string label) : _label(std::move(label)) {}
 
 void PumpedQueue::async(Work work) {
-    onAsync();
+    if (whenQueued) {
+        whenQueued();
+    }
     const std::scoped_lock lock(_mutex);
     _work.push_back(std::move(work));
 }

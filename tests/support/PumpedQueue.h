@@ -25,8 +25,8 @@ public:
     void pump();
     [[nodiscard]] std::size_t pendingCount() const;
 
-    /// Called on the thread that queues work, before the work is queued.
-    std::function<void()> onAsync = [] {};
+    /// Called where work is queued, to see how things stand then; not while other threads queue.
+    std::function<void()> whenQueued;
 
 private:
     std::string _label;

@@ -91,7 +91,7 @@ TEST_F(DeviceListRequestTest, TheAnswerChangesNoViewBeforeTheMainQueueRuns) {
 TEST_F(DeviceListRequestTest, BothListsAreThereBeforeTheMainQueueIsTold) {
     screen->loadViewIfNeeded();
     std::vector<std::string> listsAtQueueing;
-    mainQueue().onAsync = [&] {
+    mainQueue().whenQueued = [&] {
         const auto first = [](const std::optional<std::vector<Text>>& names) {
             return names ? names->at(0).string() : "absent";
         };
