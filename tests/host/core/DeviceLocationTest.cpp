@@ -2,27 +2,28 @@
 
 #include "device/files/Files.h"
 #include "tests/device/TestFiles.h"
+#include "tests/support/EnvironmentVariable.h"
 #include "tests/support/TemporaryDirectory.h"
 
-#include <cstdlib>
 #include <filesystem>
 #include <gtest/gtest.h>
+#include <optional>
 #include <string>
 
 namespace nimbra::host {
 namespace {
 
 TEST(DeviceLocation, TheStateStandsWhereTheEnvironmentSays) {
-    ::setenv("HOME", "/users/somebody", 1);
-    ::setenv("XDG_STATE_HOME", "/state", 1);
+    const test::EnvironmentVariable home("HOME", "/users/somebody");
+    test::EnvironmentVariable state("XDG_STATE_HOME", "/state");
     EXPECT_EQ(stateDirectory(), "/state/nimbra");
     EXPECT_EQ(defaultDeviceDirectory(), "/state/nimbra/device");
 
     // A relative one does not count.
-    ::setenv("XDG_STATE_HOME", "state", 1);
+    state.set("state");
     EXPECT_EQ(stateDirectory(), "/users/somebody/.local/state/nimbra");
 
-    ::unsetenv("XDG_STATE_HOME");
+    state.set(std::nullopt);
     EXPECT_EQ(defaultDeviceDirectory(), "/users/somebody/.local/state/nimbra/device");
 }
 

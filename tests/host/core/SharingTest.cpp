@@ -3,14 +3,15 @@
 #include "device/apps/Process.h"
 #include "device/files/Files.h"
 #include "tests/device/TestFiles.h"
+#include "tests/support/EnvironmentVariable.h"
 #include "tests/support/TemporaryDirectory.h"
 
 #include <cerrno>
 #include <chrono>
-#include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <gtest/gtest.h>
+#include <optional>
 #include <string>
 #include <sys/stat.h>
 
@@ -71,14 +72,14 @@ TEST_F(SharingTest, ACopyThatCannotBeMadeIsNamed) {
 
 TEST_F(SharingTest, TheMailProgramIsFoundAmongTheUsersPrograms) {
     const auto program = mailProgram("exit 0");
-    ::setenv("PATH", ("/nowhere::" + path("bin").string()).c_str(), 1);
+    test::EnvironmentVariable programs("PATH", "/nowhere::" + path("bin").string());
     EXPECT_EQ(findMailProgram(), program);
 
     // A file that nobody may run is no program.
     std::filesystem::permissions(program, std::filesystem::perms::owner_read);
     EXPECT_EQ(findMailProgram(), std::nullopt);
 
-    ::unsetenv("PATH");
+    programs.set(std::nullopt);
     EXPECT_EQ(findMailProgram(), std::nullopt);
 }
 
