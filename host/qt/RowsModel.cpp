@@ -6,6 +6,8 @@
 #include <QThread>
 #include <algorithm>
 #include <map>
+#include <string_view>
+#include <unordered_map>
 #include <utility>
 
 namespace nimbra::window {
@@ -58,6 +60,7 @@ QHash<int, QByteArray> RowsModel::roleNames() const {
     return {{KindRole, "kind"},
             {LabelRole, "label"},
             {TitleRole, "title"},
+            {DistinctionRole, "distinction"},
             {ValueRole, "value"},
             {IsOnRole, "isOn"},
             {IsLockedRole, "isLocked"},
@@ -82,6 +85,8 @@ QVariant RowsModel::data(const QModelIndex& index, int role) const {
         return qString(described.label());
     case TitleRole:
         return qString(described.name);
+    case DistinctionRole:
+        return row.sharesName ? qString(described.id) : QString();
     case ValueRole:
         return qString(host::displayedValue(described.value));
     case IsOnRole:
@@ -204,6 +209,29 @@ void RowsModel::recount() {
     if (std::exchange(_applicationCount, count) != count) {
         Q_EMIT applicationCountChanged();
     }
+    recountNames();
+}
+
+void RowsModel::recountNames() {
+    const auto isCounted = [](const Specifier& row) {
+        return row.cellType() != GroupCell && row.name();
+    };
+    std::unordered_map<std::string_view, std::size_t> bearers;
+    bearers.reserve(_rows.size());
+    for (const Row& row : _rows) {
+        if (isCounted(*row.specifier)) {
+            ++bearers[row.specifier->name().string()];
+        }
+    }
+    for (Position place = 0; place < std::ssize(_rows); ++place) {
+        Row& row = _rows[static_cast<std::size_t>(place)];
+        const bool isShared =
+            isCounted(*row.specifier) && bearers[row.specifier->name().string()] > 1;
+        if (std::exchange(row.sharesName, isShared) != isShared) {
+            const QModelIndex told = index(static_cast<int>(place));
+            Q_EMIT dataChanged(told, told, {DistinctionRole});
+        }
+    }
 }
 
 void RowsModel::didInsert(const SpecifierArray& rows, const Specifier& after, bool /*animated*/) {
@@ -303,8 +331,9 @@ void RowsModel::replaceWhatDiffers(const SpecifierArray& rows) {
     }
     for (Position place = 0; place < std::ssize(rows); ++place) {
         if (stayed[static_cast<std::size_t>(place)]) {
-            _rows[static_cast<std::size_t>(place)] = {
-                .specifier = rows[static_cast<std::size_t>(place)], .description = {}};
+            Row& row = _rows[static_cast<std::size_t>(place)];
+            row.specifier = rows[static_cast<std::size_t>(place)];
+            row.description.reset();
             continue;
         }
         Position end = place;

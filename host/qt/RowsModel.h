@@ -24,6 +24,9 @@ public:
         /// What a scenario calls the row.
         LabelRole,
         TitleRole,
+        /// What tells the row from others that have the same title: its identifier; empty where no
+        /// other one has.
+        DistinctionRole,
         ValueRole,
         IsOnRole,
         IsLockedRole,
@@ -86,6 +89,8 @@ private:
         std::shared_ptr<Specifier> specifier;
         /// Of when the view first asked.
         mutable std::optional<host::RowDescription> description;
+        /// Whether another row has the same name.
+        bool sharesName = false;
 
         [[nodiscard]] const host::RowDescription& described() const;
     };
@@ -99,7 +104,9 @@ private:
     void insert(Position position, const SpecifierArray& rows);
     void remove(Position first, Position count);
     void changed(Position first, Position last);
+    /// After rows have come or gone.
     void recount();
+    void recountNames();
 
     Actions _actions;
     std::vector<Row> _rows;

@@ -10,6 +10,7 @@ FocusScope {
     required property string kind
     required property string label
     required property string title
+    required property string distinction
     required property string value
     required property bool isOn
     required property bool isLocked
@@ -42,7 +43,9 @@ FocusScope {
     readonly property real valueWidth: valueLoader.item ? valueLoader.item.implicitWidth : 0
     readonly property real valueHeight: valueLoader.item ? valueLoader.item.height : 0
     readonly property bool isStacked: valueWidth > 0 && titleLabel.implicitWidth + valueWidth + 12 > room
-    readonly property real labelsHeight: isStacked ? titleLabel.height + 4 + valueHeight : Math.max(titleLabel.height, valueHeight)
+    // The title with what tells it apart below it.
+    readonly property real titleHeight: titleLabel.height + (distinctionLoader.active ? Math.ceil(distinctionLoader.implicitHeight) + 2 : 0)
+    readonly property real labelsHeight: isStacked ? titleHeight + 4 + valueHeight : Math.max(titleHeight, valueHeight)
 
     function use() {
         if (!isUsable)
@@ -65,6 +68,8 @@ FocusScope {
     Accessible.name: title !== "" ? title : footer
     Accessible.description: {
         const told = [];
+        if (distinction !== "")
+            told.push(distinction);
         if (!isSwitch && value !== "")
             told.push(value);
         if (isLocked)
@@ -168,7 +173,7 @@ FocusScope {
 
             anchors.left: parent.left
             anchors.leftMargin: Theme.gap + row.iconSpace
-            y: row.isStacked ? (parent.height - row.labelsHeight) / 2 : (parent.height - height) / 2
+            y: (parent.height - (row.isStacked ? row.labelsHeight : row.titleHeight)) / 2
             width: row.room - (row.isStacked || row.valueWidth === 0 ? 0 : row.valueWidth + 12)
             text: row.title
             textFormat: Text.PlainText
@@ -179,11 +184,29 @@ FocusScope {
             Accessible.ignored: true
         }
         Loader {
+            id: distinctionLoader
+
+            anchors.left: titleLabel.left
+            anchors.top: titleLabel.bottom
+            anchors.topMargin: 2
+            width: titleLabel.width
+            active: row.distinction !== ""
+            sourceComponent: Text {
+                text: row.distinction
+                textFormat: Text.PlainText
+                color: Theme.faint
+                font.pixelSize: Theme.small
+                wrapMode: Text.Wrap
+                horizontalAlignment: Text.AlignLeft
+                Accessible.ignored: true
+            }
+        }
+        Loader {
             id: valueLoader
 
             anchors.right: parent.right
             anchors.rightMargin: Theme.gap + row.markSpace
-            y: row.isStacked ? titleLabel.y + titleLabel.height + 4 : (parent.height - height) / 2
+            y: row.isStacked ? titleLabel.y + row.titleHeight + 4 : (parent.height - height) / 2
             width: row.isStacked ? row.room : row.valueWidth
             active: row.value !== "" && !row.isSwitch
             sourceComponent: Text {
@@ -256,7 +279,7 @@ FocusScope {
             Loader {
                 id: status
 
-                y: footer.visible ? Math.ceil(footer.implicitHeight) + 12 : 0
+                y: row.footer !== "" ? Math.ceil(footer.implicitHeight) + 12 : 0
                 width: parent.width
                 height: active ? Math.ceil(Math.max(pane.statusHeight, item ? item.textBottom : 0)) : 0
                 active: row.hasStatus
