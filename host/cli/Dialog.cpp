@@ -14,9 +14,7 @@
 
 #include <algorithm>
 #include <csignal>
-#include <cstdlib>
 #include <iostream>
-#include <string_view>
 #include <termios.h>
 #include <unicode/unistr.h>
 #include <unistd.h>
@@ -47,16 +45,6 @@ std::string trimmed(const std::string& text) {
     std::string blankless;
     icu::UnicodeString::fromUTF8(text).trim().toUTF8String(blankless);
     return blankless;
-}
-
-/// A path as a person types it: "~/" is the home.
-std::filesystem::path withHome(const std::string& path) {
-    // NOLINTNEXTLINE(concurrency-mt-unsafe): nobody changes the environment
-    const char* const home = std::getenv("HOME");
-    constexpr std::string_view start = "~/";
-    return path.starts_with(start) && home != nullptr
-               ? std::filesystem::path(home) / path.substr(start.size())
-               : std::filesystem::path(path);
 }
 
 bool isYes(const std::optional<std::string>& answer, const Text& title) {
@@ -219,7 +207,7 @@ std::expected<ShareOutcome, std::string> Dialog::share(const std::filesystem::pa
         }
         return ShareOutcome::sent;
     }
-    const auto copied = host::copyFile(file, withHome(target));
+    const auto copied = host::copyFile(file, host::withHome(target));
     if (!copied) {
         return std::unexpected(copied.error());
     }

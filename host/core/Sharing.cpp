@@ -94,6 +94,15 @@ bool isProgram(const std::filesystem::path& path) {
 
 } // namespace
 
+std::filesystem::path withHome(const std::string& typed) {
+    // NOLINTNEXTLINE(concurrency-mt-unsafe): nobody changes the environment
+    const char* const home = std::getenv("HOME");
+    const bool isInHome = typed == "~" || typed.starts_with("~/");
+    return isInHome && home != nullptr && *home != '\0'
+               ? std::filesystem::path(home + typed.substr(1))
+               : std::filesystem::path(typed);
+}
+
 std::expected<std::filesystem::path, std::string> copyFile(const std::filesystem::path& file,
                                                            const std::filesystem::path& target) {
     std::error_code failure;

@@ -10,6 +10,10 @@ namespace nimbra::host {
 
 // Ways to share a file of this machine. A failure is told in one line.
 
+/// A path as a person types it, where "~" alone or before "/" is the user's own folder; as it is
+/// where nobody knows which that is.
+[[nodiscard]] std::filesystem::path withHome(const std::string& typed);
+
 /// Copies `file` to `target`, or under its own name into `target` where that is a folder; the copy
 /// is for its owner's eyes only. What stands there already is never replaced, and nothing is left
 /// of a copy that fails. Gives back where the copy is, as an absolute path.

@@ -143,7 +143,7 @@ void SharingModel::save(const QString& target) {
     if (!_sheet) {
         return;
     }
-    const auto copy = host::copyFile(_file, target.trimmed().toStdString());
+    const auto copy = host::copyFile(_file, host::withHome(target.trimmed().toStdString()));
     if (!copy) {
         fail(qString(copy.error()));
         return;

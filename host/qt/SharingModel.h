@@ -39,7 +39,8 @@ public:
 
     /// Hands the file to one of the ways.
     Q_INVOKABLE void share(int way);
-    /// Copies the file to `target`, a folder or the name of what is no file yet.
+    /// Copies the file to `target`, a folder or the name of what is no file yet; "~" is the user's
+    /// own folder.
     Q_INVOKABLE void save(const QString& target);
     Q_INVOKABLE void copyPath();
     /// The user does not want to share.

@@ -70,6 +70,25 @@ TEST_F(SharingTest, ACopyThatCannotBeMadeIsNamed) {
     EXPECT_FALSE(std::filesystem::exists(path("copy")));
 }
 
+TEST_F(SharingTest, ATildeIsTheUsersOwnFolder) {
+    const char* const before = std::getenv("HOME");
+    const std::string earlier = before != nullptr ? before : "";
+    ::setenv("HOME", "/people/somebody", 1);
+    EXPECT_EQ(withHome("~"), "/people/somebody");
+    EXPECT_EQ(withHome("~/copies/one"), "/people/somebody/copies/one");
+    // Only where it stands for it.
+    EXPECT_EQ(withHome("~somebody/copy"), "~somebody/copy");
+    EXPECT_EQ(withHome("copies/~"), "copies/~");
+    EXPECT_EQ(withHome("/~/copy"), "/~/copy");
+    EXPECT_EQ(withHome(""), "");
+
+    ::unsetenv("HOME");
+    EXPECT_EQ(withHome("~/copy"), "~/copy");
+    ::setenv("HOME", "", 1);
+    EXPECT_EQ(withHome("~/copy"), "~/copy");
+    ::setenv("HOME", earlier.c_str(), 1);
+}
+
 TEST_F(SharingTest, TheMailProgramIsFoundAmongTheUsersPrograms) {
     const auto program = mailProgram("exit 0");
     test::EnvironmentVariable programs("PATH", "/nowhere::" + path("bin").string());

@@ -6,6 +6,11 @@
 #include <QClipboard>
 #include <QGuiApplication>
 #include <QTest>
+#include <cerrno>
+#include <csignal>
+#include <fstream>
+#include <sys/stat.h>
+#include <sys/wait.h>
 
 namespace nimbra::window {
 
@@ -45,6 +50,27 @@ protected:
     }
     [[nodiscard]] QString archiveName() { return _host->sharing().property("fileName").toString(); }
     [[nodiscard]] QString problem() { return _host->sharing().property("problem").toString(); }
+    /// Has mail begun by a program that waits at `gate` and ends with `status`. Gives back its
+    /// process when it runs.
+    pid_t beginMail(const Gate& gate, int status) {
+        const auto programs = place("programs");
+        const auto started = place("started");
+        EXPECT_EQ(::mkfifo(started.c_str(), 0600), 0);
+        writeProgram(programs / "xdg-email", "echo $$ > " + started.string() + '\n' +
+                                                 gate.command() + "; exit " +
+                                                 std::to_string(status));
+        setEnvironment("PATH", programs.string() + ":/usr/bin:/bin");
+        openCard();
+        click(control(QStringLiteral("Mail")));
+        pid_t process = 0;
+        std::ifstream(started) >> process;
+        EXPECT_GT(process, 0);
+        return process;
+    }
+    /// Until the window has taken the end of `process`.
+    [[nodiscard]] bool waitForEndOf(pid_t process) {
+        return waitFor([process] { return ::kill(process, 0) != 0 && errno == ESRCH; });
+    }
     void expectRowHasTheFocus() {
         EXPECT_FALSE(isCardShown());
         EXPECT_TRUE(row(diagnose)->hasActiveFocus());
@@ -116,6 +142,16 @@ TEST_F(ShareCard, ACopyIsSavedWhereTheUserSays) {
     EXPECT_EQ(test::contentOf(copy), "collected\n");
     EXPECT_TRUE(isSaid(QString::fromStdString("Saved as " + copy.string())));
     expectRowHasTheFocus();
+}
+
+TEST_F(ShareCard, ATildeIsTheUsersOwnFolder) {
+    openCard();
+    placeField()->setProperty("text", QStringLiteral(" ~/copy.tar.gz"));
+
+    click(control(QStringLiteral("Save a Copy")));
+
+    EXPECT_EQ(test::contentOf(home() / "copy.tar.gz"), "collected\n");
+    EXPECT_FALSE(isCardShown());
 }
 
 TEST_F(ShareCard, ReturnInTheFieldSavesTheCopy) {
@@ -215,6 +251,64 @@ TEST_F(ShareCard, AMailThatCannotBeBegunIsTold) {
     EXPECT_TRUE(isCardShown());
     EXPECT_TRUE(problem().startsWith(QStringLiteral("No mail could be begun: ")));
     EXPECT_TRUE(isSaid(problem()));
+}
+
+TEST_F(ShareCard, AMailThatIsStillBeingBegunDoesNotEndTheNextCard) {
+    // Given a mail program that takes its time, and a user who has left the card since
+    const Gate gate(place("mail"));
+    const pid_t process = beginMail(gate, 0);
+    ASSERT_TRUE(isCardShown());
+    key(Qt::Key_Escape);
+    expectRowHasTheFocus();
+
+    // When a card is open again as it ends
+    click(row(diagnose));
+    ASSERT_TRUE(isCardShown());
+    gate.open();
+    ASSERT_TRUE(waitForEndOf(process));
+    settle();
+
+    // Then that card stands as it was
+    EXPECT_TRUE(isCardShown());
+    EXPECT_EQ(problem(), QString());
+    // and mail can be asked for again
+    writeProgram(place("programs") / "xdg-email", "exit 0");
+    click(control(QStringLiteral("Mail")));
+    ASSERT_TRUE(waitFor([this] { return session().presentations().shareSheet() == nullptr; }));
+    settle();
+    expectRowHasTheFocus();
+}
+
+TEST_F(ShareCard, AMailThatFailsAfterTheCardWasLeftIsNotToldOf) {
+    const Gate gate(place("mail"));
+    const pid_t process = beginMail(gate, 3);
+    key(Qt::Key_Escape);
+    expectRowHasTheFocus();
+
+    gate.open();
+    ASSERT_TRUE(waitForEndOf(process));
+    settle();
+
+    EXPECT_EQ(problem(), QString());
+    expectRowHasTheFocus();
+    click(row(diagnose));
+    ASSERT_TRUE(isCardShown());
+    EXPECT_EQ(problem(), QString());
+}
+
+TEST_F(ShareCard, AMailIsBegunOnceHoweverOftenItIsAskedFor) {
+    const Gate gate(place("mail"));
+    const pid_t process = beginMail(gate, 0);
+
+    // The first one is still at it: a second one would write where nobody reads, and wait.
+    click(control(QStringLiteral("Mail")));
+    gate.open();
+    ASSERT_TRUE(waitForEndOf(process));
+    settle();
+
+    EXPECT_FALSE(isCardShown());
+    EXPECT_EQ(::waitpid(-1, nullptr, WNOHANG), -1);
+    EXPECT_EQ(errno, ECHILD);
 }
 
 TEST_F(ShareCard, AToolThatFailsLeavesNoCard) {
