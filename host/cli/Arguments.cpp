@@ -1,11 +1,9 @@
 #include "host/cli/Arguments.h"
 
-#include "device/system/LanguageChain.h"
-#include "host/cli/Failure.h"
+#include "host/core/CommandLine.h"
 
 #include <CLI/CLI.hpp>
 #include <cstring>
-#include <iostream>
 #include <string_view>
 #include <utility>
 
@@ -31,11 +29,6 @@ constexpr const char* examples =
     "\n"
     "\"settingsctl COMMAND --help\" says more of a command, and the\n"
     "manual page settingsctl(1) all there is.";
-
-std::string checkLocale(const std::string& tag) {
-    return device::isLanguageTag(tag) ? std::string()
-                                      : '"' + tag + "\" is not a language tag such as \"de-DE\"";
-}
 
 /// The command line, and where its words go.
 class Parser {
@@ -69,13 +62,7 @@ public:
         }
     }
 
-    [[nodiscard]] int exit(const CLI::ParseError& error) {
-        if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
-            return _app.exit(error);
-        }
-        std::cerr << "settingsctl: " << error.what() << " (see settingsctl --help)\n";
-        return exitBadInput;
-    }
+    [[nodiscard]] const CLI::App& app() const { return _app; }
 
 private:
     void addCommonOptions() {
@@ -92,7 +79,7 @@ private:
         _app.add_option("--locale", _arguments.locale,
                         "The language, e.g. ja-JP (default: the device's)")
             ->type_name("TAG")
-            ->check(checkLocale);
+            ->check(host::problemOfLanguage);
         _app.add_option("--bundle", _arguments.bundle,
                         "The page's bundle (default: the installed one)")
             ->type_name("DIR");
@@ -188,14 +175,7 @@ private:
 } // namespace
 
 std::expected<Arguments, int> Arguments::parse(int count, char** words) {
-    Arguments arguments;
-    Parser parser(arguments);
-    try {
-        parser.parse(count, words);
-    } catch (const CLI::ParseError& error) {
-        return std::unexpected(parser.exit(error));
-    }
-    return arguments;
+    return host::parseCommandLine<Arguments, Parser, CLI::ParseError>(count, words);
 }
 
 } // namespace nimbra::cli

@@ -1,12 +1,10 @@
 #include "host/qt/Arguments.h"
 
-#include "device/system/LanguageChain.h"
-#include "host/core/ExitStatus.h"
+#include "host/core/CommandLine.h"
 
 #include <CLI/CLI.hpp>
 #include <QString>
 #include <QStringList>
-#include <iostream>
 #include <map>
 #include <optional>
 
@@ -57,13 +55,7 @@ public:
 
     void parse(int count, char** words) { _app.parse(count, words); }
 
-    [[nodiscard]] int exit(const CLI::ParseError& error) {
-        if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
-            return _app.exit(error);
-        }
-        std::cerr << "settingshost: " << error.what() << " (see settingshost --help)\n";
-        return host::exitBadInput;
-    }
+    [[nodiscard]] const CLI::App& app() const { return _app; }
 
 private:
     void addDeviceOptions() {
@@ -79,11 +71,7 @@ private:
         _app.add_option("--locale", _arguments.locale,
                         "The language, e.g. ja-JP (default: the device's)")
             ->type_name("TAG")
-            ->check([](const std::string& tag) {
-                return device::isLanguageTag(tag)
-                           ? std::string()
-                           : '"' + tag + "\" is not a language tag such as \"de-DE\"";
-            });
+            ->check(host::problemOfLanguage);
         _app.add_option("--bundle", _arguments.bundle,
                         "The page's bundle (default: the installed one)")
             ->type_name("DIR");
@@ -104,7 +92,10 @@ private:
         }
         _app.add_option("--screenshot", _arguments.screenshot,
                         "Put a picture of the window here once nothing moves, and end")
-            ->type_name("FILE.png");
+            ->type_name("FILE.png")
+            ->check([](const std::string& place) {
+                return place.empty() ? std::string("the name of a file expected") : std::string();
+            });
         _app.add_option_function<std::string>(
                 "--size",
                 [this](const std::string& word) {
@@ -161,14 +152,7 @@ private:
 } // namespace
 
 std::expected<Arguments, int> Arguments::parse(int count, char** words) {
-    Arguments arguments;
-    Parser parser(arguments);
-    try {
-        parser.parse(count, words);
-    } catch (const CLI::ParseError& error) {
-        return std::unexpected(parser.exit(error));
-    }
-    return arguments;
+    return host::parseCommandLine<Arguments, Parser, CLI::ParseError>(count, words);
 }
 
 } // namespace nimbra::window

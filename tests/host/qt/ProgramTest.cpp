@@ -137,6 +137,25 @@ TEST_F(Program, APictureThatCannotBeWrittenIsOneLineAndNoFile) {
     EXPECT_FALSE(std::filesystem::exists(picture.parent_path()));
 }
 
+TEST_F(Program, APictureWithoutANameIsABadOption) {
+    makeUsedDevice();
+
+    const auto result = run({"--root", root().string(), "--screenshot", ""});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(
+        result.messages,
+        "settingshost: --screenshot: the name of a file expected (see settingshost --help)\n");
+}
+
+TEST_F(Program, ALanguageThatIsNoneIsABadOption) {
+    const auto result = run({"--locale", "x!"});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.messages, "settingshost: --locale: \"x!\" is not a language tag such as "
+                               "\"de-DE\" (see settingshost --help)\n");
+}
+
 TEST_F(Program, AScenarioEndsInAPicture) {
     test::writeTestFile(place("scenario.json"), R"({"device": {}, "steps": [{"do": "open"}]})");
     const auto picture = place("picture.png");

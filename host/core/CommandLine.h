@@ -1,0 +1,38 @@
+#pragma once
+
+#include "host/core/ExitStatus.h"
+
+#include <expected>
+#include <iostream>
+#include <string>
+
+namespace nimbra::host {
+
+// What the command lines of the hosts have in common, whatever library reads them.
+
+/// What is wrong with `tag` as a language that the user names; empty for nothing.
+[[nodiscard]] std::string problemOfLanguage(const std::string& tag);
+
+/// Reads a command line of these words into `Arguments` by a `Parser`, which has a `parse` that
+/// throws an `Error` and gives its program by `app`. The exit status where the program is to end
+/// at once, because help or the version was asked for, or because the line makes no sense. That
+/// has been printed then.
+template <class Arguments, class Parser, class Error>
+[[nodiscard]] std::expected<Arguments, int> parseCommandLine(int count, char** words) {
+    Arguments arguments;
+    Parser parser(arguments);
+    try {
+        parser.parse(count, words);
+    } catch (const Error& error) {
+        const auto& app = parser.app();
+        if (error.get_exit_code() == exitDone) {
+            return std::unexpected(app.exit(error));
+        }
+        std::cerr << app.get_name() << ": " << error.what() << " (see " << app.get_name()
+                  << " --help)\n";
+        return std::unexpected(exitBadInput);
+    }
+    return arguments;
+}
+
+} // namespace nimbra::host
