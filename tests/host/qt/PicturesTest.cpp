@@ -11,6 +11,7 @@
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <nlohmann/json.hpp>
+#include <optional>
 #include <ostream>
 #include <string>
 #include <vector>
@@ -121,6 +122,35 @@ std::vector<Picture> pictures() {
     };
 }
 
+/// While it lives, the user's own folder is called as in the pictures, and there is no program for
+/// mail, whoever draws them.
+class SomebodysHome {
+public:
+    SomebodysHome() {
+        for (const char* const name : {"XDG_CONFIG_HOME", "XDG_STATE_HOME"}) {
+            set(name, "/nonexistent");
+        }
+        set("PATH", "/nonexistent");
+        set("HOME", "/people/somebody");
+    }
+    SomebodysHome(const SomebodysHome&) = delete;
+    SomebodysHome& operator=(const SomebodysHome&) = delete;
+    ~SomebodysHome() {
+        for (const auto& [name, value] : _earlier) {
+            value ? qputenv(name, *value) : qunsetenv(name);
+        }
+    }
+
+private:
+    void set(const char* name, const char* value) {
+        _earlier.emplace_back(name, qEnvironmentVariableIsSet(name) ? std::optional(qgetenv(name))
+                                                                    : std::nullopt);
+        qputenv(name, value);
+    }
+
+    std::vector<std::pair<const char*, std::optional<QByteArray>>> _earlier;
+};
+
 class PicturesTest : public testing::TestWithParam<Picture> {
 protected:
     void start(const Picture& picture) {
@@ -177,6 +207,7 @@ protected:
     [[nodiscard]] SettingsHost& host() { return *_host; }
 
 private:
+    SomebodysHome _home;
     test::TemporaryDirectory _directory;
     std::unique_ptr<SettingsHost> _host;
 };
