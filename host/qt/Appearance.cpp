@@ -3,7 +3,6 @@
 #include "host/qt/DesktopSettings.h"
 
 #include <QColor>
-#include <QDBusConnection>
 #include <QEvent>
 #include <QGuiApplication>
 #include <QMetaType>
@@ -76,25 +75,22 @@ bool isAllChosen(const Appearance::Choice& choice) {
 
 } // namespace
 
-Appearance::Appearance(const Choice& choice) : _choice(choice), _look(currentLook()) {
-    if (!isAllChosen(choice)) {
-        follow(QDBusConnection::sessionBus());
-    }
-}
+Appearance::Appearance(const Choice& choice)
+    : Appearance(choice, DesktopSettings::sessionBus(), QStringLiteral("desktop-settings")) {}
 
-Appearance::Appearance(const Choice& choice, const QDBusConnection& bus)
+Appearance::Appearance(const Choice& choice, const QString& bus, const QString& connection)
     : _choice(choice), _look(currentLook()) {
     if (!isAllChosen(choice)) {
-        follow(bus);
+        follow(bus, connection);
     }
 }
 
 Appearance::~Appearance() = default;
 
-void Appearance::follow(const QDBusConnection& bus) {
+void Appearance::follow(const QString& bus, const QString& connection) {
     qGuiApp->installEventFilter(this);
     _desktop = std::make_unique<DesktopSettings>(
-        bus, QStringList{appearanceSpace(), interfaceSpace(), accessibilitySpace()});
+        bus, connection, QStringList{appearanceSpace(), interfaceSpace(), accessibilitySpace()});
     connect(_desktop.get(), &DesktopSettings::answered, this, &Appearance::takeAll);
     connect(_desktop.get(), &DesktopSettings::changed, this,
             [this](const QString& space, const QString& key, const QVariant& value) {

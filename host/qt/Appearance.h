@@ -8,7 +8,6 @@
 #include <memory>
 #include <optional>
 
-class QDBusConnection;
 class QEvent;
 
 namespace nimbra::window {
@@ -40,8 +39,8 @@ public:
 
     /// On the session bus of the process, which is not touched where everything is chosen.
     explicit Appearance(const Choice& choice);
-    /// On `bus`, which need not be connected.
-    Appearance(const Choice& choice, const QDBusConnection& bus);
+    /// On the bus at the address `bus`, which need not be there; see `DesktopSettings`.
+    Appearance(const Choice& choice, const QString& bus, const QString& connection);
     ~Appearance() override;
 
     [[nodiscard]] bool isDark() const { return _look.dark; }
@@ -77,7 +76,7 @@ private:
         qreal textScale = 1;
     };
 
-    void follow(const QDBusConnection& bus);
+    void follow(const QString& bus, const QString& connection);
     void takeAll(const QMap<QString, QVariantMap>& values);
     void take(const QString& space, const QString& key, const QVariant& value);
     [[nodiscard]] Look currentLook() const;

@@ -1,3 +1,4 @@
+#include "tests/host/qt/SilentBus.h"
 #include "tests/host/qt/WindowFixture.h"
 
 #include <algorithm>
@@ -68,6 +69,23 @@ TEST_F(Start, ASheetIsMadeWhenItIsShown) {
 
     EXPECT_GT(sheets(), 0);
     EXPECT_NE(control(QStringLiteral("Copy Path")), nullptr);
+}
+
+TEST_F(Start, ASessionBusThatNeverAnswersHoldsNothingUp) {
+    test::SilentBus bus;
+    setEnvironment("DBUS_SESSION_BUS_ADDRESS", bus.address());
+    makeUsedDevice();
+    Arguments following = arguments();
+    following.appearance.dark.reset();
+
+    start(following);
+    bus.take();
+    click(row(labels().front()));
+
+    EXPECT_TRUE(pane().isOpen());
+    EXPECT_TRUE(bus.isWaitedFor());
+    _host.reset();
+    bus.awaitLeaving();
 }
 
 } // namespace nimbra::window
