@@ -94,6 +94,7 @@ Sheet {
             height: presented.contentHeight
             views: presented.views
             onTouched: button => presented.touch(button)
+            onFocusLost: sheet.takeFocus()
         }
 
         // The keyboard reaches what lies below.

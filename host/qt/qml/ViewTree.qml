@@ -11,13 +11,56 @@ Item {
     property color ground: Theme.page
     // How far down the lowest text comes that grows beyond its place.
     property real textBottom: 0
+    // The button that had the focus when the views were drawn anew; empty for none.
+    property string focusedButton
     signal touched(string button)
+    // The button that had the focus has gone, and none is in its place.
+    signal focusLost
+
+    function buttons() {
+        const found = [];
+        for (let place = 0; place < drawn.count; ++place) {
+            const item = drawn.itemAt(place);
+            if (item && item.kind === "button" && item.control)
+                found.push(item.control);
+        }
+        return found;
+    }
+    function restoreFocus() {
+        const title = focusedButton;
+        focusedButton = "";
+        const now = Window.activeFocusItem;
+        // Whoever has it by now keeps it.
+        if (title === "" || !enabled || now && now.activeFocusOnTab)
+            return;
+        const usable = buttons().filter(button => button.enabled);
+        const heir = usable.find(button => button.title === title) || usable[0];
+        if (heir)
+            heir.forceActiveFocus(Qt.OtherFocusReason);
+        else
+            focusLost();
+    }
+
+    Connections {
+        target: tree.views
+        function onModelAboutToBeReset() {
+            const focused = tree.buttons().find(button => button.activeFocus);
+            if (focused)
+                tree.focusedButton = focused.title;
+        }
+        function onModelReset() {
+            // The views of now come with it.
+            Qt.callLater(tree.restoreFocus);
+        }
+    }
 
     Accessible.role: Accessible.StaticText
     Accessible.name: spokenText
     Accessible.ignored: spokenText === ""
 
     Repeater {
+        id: drawn
+
         model: tree.views
 
         Item {
@@ -34,6 +77,7 @@ Item {
             required property var isTurning
             required property var source
 
+            readonly property Item control: loader.item
             readonly property bool isStatus: kind === "label" && tree.spokenText !== ""
 
             onYChanged: reach()

@@ -1,6 +1,11 @@
 #include "host/core/PaneSession.h"
 #include "platform/views/Button.h"
+#include "platform/views/Label.h"
 #include "tests/host/qt/WindowFixture.h"
+
+#include <memory>
+#include <utility>
+#include <vector>
 
 namespace nimbra::window {
 
@@ -27,8 +32,36 @@ protected:
         return isSaid(QStringLiteral("Upgrade to Nimbra Drive?")) &&
                control(QStringLiteral("Continue")) != nullptr;
     }
+    /// What is seen of the screen, of this class, back to front.
+    template <class Class>
+    [[nodiscard]] std::vector<std::shared_ptr<Class>> views() {
+        std::vector<std::shared_ptr<Class>> found;
+        collect(session().presentations().screen()->view(), found);
+        return found;
+    }
+    /// Draws the screen as its views are now.
+    void drawAnew() {
+        _host->pump().run();
+        settle();
+    }
     [[nodiscard]] bool isScreenShown() {
         return session().presentations().screen() != nullptr && named("screenButton") != nullptr;
+    }
+
+private:
+    template <class Class>
+    // NOLINTNEXTLINE(misc-no-recursion): a tree
+    static void collect(const std::shared_ptr<View>& view,
+                        std::vector<std::shared_ptr<Class>>& found) {
+        if (view->isHidden()) {
+            return;
+        }
+        if (auto wanted = std::dynamic_pointer_cast<Class>(view)) {
+            found.push_back(std::move(wanted));
+        }
+        for (const auto& subview : view->subviews()) {
+            collect(subview, found);
+        }
     }
 };
 
@@ -151,6 +184,63 @@ TEST_F(UpgradeScreen, AFailureIsToldAndThePageStays) {
     click(upgradeButton());
     click(control(QStringLiteral("Continue")));
     EXPECT_FALSE(pane().isOpen());
+}
+
+TEST_F(UpgradeScreen, TheFocusStaysOnTheButtonWhenViewsComeAndGoAroundIt) {
+    openPaneOfOlderStorage();
+    openScreen();
+    key(Qt::Key_Tab);
+    ASSERT_EQ(focusedName(), "Upgrade");
+    const auto label = views<Label>().front();
+
+    for (const bool isHidden : {true, false}) {
+        label->setHidden(isHidden);
+        drawAnew();
+
+        EXPECT_EQ(focusedName(), "Upgrade") << isHidden;
+        EXPECT_EQ(window().activeFocusItem(), upgradeButton());
+    }
+    // and it works from there
+    key(Qt::Key_Space);
+    EXPECT_TRUE(isQuestionShown());
+}
+
+TEST_F(UpgradeScreen, TheFocusGoesToTheButtonThatTakesThePlaceOfItsOwn) {
+    openPaneOfOlderStorage();
+    openScreen();
+    key(Qt::Key_Tab);
+    ASSERT_EQ(focusedName(), "Upgrade");
+
+    // When the button is called something else, among other views
+    views<Button>().front()->setTitleForState("Go On", ControlState::normal);
+    views<Label>().front()->setHidden(true);
+    drawAnew();
+
+    EXPECT_EQ(focusedName(), "Go On");
+}
+
+TEST_F(UpgradeScreen, TheFocusGoesToTheWayOutWhereItsButtonGoes) {
+    openPaneOfOlderStorage();
+    openScreen();
+    key(Qt::Key_Tab);
+    ASSERT_EQ(focusedName(), "Upgrade");
+
+    views<Button>().front()->setHidden(true);
+    drawAnew();
+
+    EXPECT_EQ(upgradeButton(), nullptr);
+    EXPECT_EQ(focusedName(), "Cancel");
+}
+
+TEST_F(UpgradeScreen, WhereTheFocusIsElsewhereItStaysWhenTheButtonIsDrawnAnew) {
+    openPaneOfOlderStorage();
+    openScreen();
+    ASSERT_EQ(focusedName(), "Cancel");
+
+    views<Label>().front()->setHidden(true);
+    drawAnew();
+
+    EXPECT_EQ(focusedName(), "Cancel");
 }
 
 TEST_F(UpgradeScreen, ItsViewsStandWhereThePageHasPutThem) {
