@@ -12,6 +12,7 @@
 #include <QFontMetricsF>
 #include <QGuiApplication>
 #include <QQmlContext>
+#include <QQmlIncubationController>
 #include <QQuickItem>
 #include <QQuickWindow>
 #include <QThreadPool>
@@ -34,6 +35,19 @@ void warn(const std::expected<void, Error>& outcome) {
     if (!outcome) {
         std::cerr << "settingshost: " << outcome.error().description << '\n';
     }
+}
+
+/// Makes the rows at once that a list in `window` is making ahead of where they are seen, whenever
+/// any of `rows` are about to go: a list of Qt 6.4 that loses one half-made waits for it from then
+/// on, and makes no other one ahead.
+void finishAhead(QQuickWindow& window, const ShownRows& rows) {
+    QObject::connect(&rows, &QAbstractItemModel::rowsAboutToBeRemoved, &window, [&window] {
+        constexpr int milliseconds = 10;
+        QQmlIncubationController& controller = *window.incubationController();
+        while (controller.incubatingObjectCount() > 0) {
+            controller.incubateFor(milliseconds);
+        }
+    });
 }
 
 } // namespace
@@ -208,6 +222,9 @@ std::expected<void, std::string> SettingsHost::loadWindow(const Arguments& argum
     _window = qobject_cast<QQuickWindow*>(_engine->rootObjects().constFirst());
     // The platform says later how large the window is: until then a row is found by this.
     _window->contentItem()->setSize(_window->size());
+    finishAhead(*_window, *_pane->accountRows());
+    finishAhead(*_window, *_pane->rows());
+    finishAhead(*_window, *_pane->detailRows());
     return {};
 }
 

@@ -149,4 +149,21 @@ TEST_F(Search, AFieldThatWasClearedStillSaysWhatIsSearchedFor) {
     EXPECT_EQ(field()->property("text").toString(), QString());
 }
 
+TEST_F(Search, RowsMayGoBeforeThoseBelowTheWindowHaveBeenMade) {
+    // Given a page that has just been drawn for the first time
+    makeSampleDevice();
+    start();
+    pane().open();
+    static_cast<void>(window().grabWindow());
+
+    // When most of its rows go at once, and the page after them
+    pane().rows()->setSearch(QStringLiteral("zebra"));
+    static_cast<void>(window().grabWindow());
+    pane().goBack();
+
+    // Then nothing complains, which would fail the test
+    settle();
+    EXPECT_FALSE(pane().isOpen());
+}
+
 } // namespace nimbra::window
