@@ -48,12 +48,18 @@ std::string kindName(RowKind kind) {
 }
 
 RowDescription RowDescription::of(const Specifier& row) {
+    RowDescription description = withoutValue(row);
+    description.value = row.value();
+    return description;
+}
+
+RowDescription RowDescription::withoutValue(const Specifier& row) {
     const ControllerClass* detail = row.detailControllerClass();
     return {.kind = kindOf(row.cellType()),
             .id = row.identifier(),
             .name = row.name(),
             .enabled = row.isEnabled(),
-            .value = row.value(),
+            .value = {},
             .footer = textValue(row.propertyForKey(FooterTextGroupKey)),
             .footerClass = textValue(row.propertyForKey(FooterCellClassGroupKey)),
             .icon = iconOf(row),

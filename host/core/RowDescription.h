@@ -34,6 +34,8 @@ struct RowDescription {
     std::optional<std::string> detail;
 
     [[nodiscard]] static RowDescription of(const Specifier& row);
+    /// Without asking anybody: of a row whose page has gone.
+    [[nodiscard]] static RowDescription withoutValue(const Specifier& row);
     [[nodiscard]] static std::vector<RowDescription> of(const SpecifierArray& rows);
 
     /// What the row is called: its identifier, or else its name.

@@ -38,7 +38,9 @@ PaneModel::PaneModel(host::PaneSession& session, SessionPump& pump, host::PaneEn
       _rows(actionsOfPane()), _detailRows(actionsOfDetail()), _status(std::move(look)) {
     _session.setListObserver(&_rows.rows());
     connect(&_rows.rows(), &RowsModel::isBehind, this, [this] {
-        _rows.rows().show(_session.isPaneOpen() ? _session.rows() : SpecifierArray());
+        if (_session.isPaneOpen()) {
+            _rows.rows().show(_session.rows());
+        }
     });
     connect(&_pump, &SessionPump::ran, this, &PaneModel::update);
 }
@@ -54,18 +56,9 @@ PaneModel::~PaneModel() {
 }
 
 RowsModel::Actions PaneModel::actionsOfPane() {
-    return {.set =
-                [this](const auto& row, bool isOn) {
-                    const bool isDone = _session.setRow(row, isOn).has_value();
-                    _pump.run();
-                    return isDone;
-                },
-            .tap =
-                [this](const auto& row) {
-                    const bool isDone = _session.tapRow(row).has_value();
-                    _pump.run();
-                    return isDone;
-                }};
+    return {.set = [this](const auto& row,
+                          bool isOn) { return ran(_session.setRow(row, isOn).has_value()); },
+            .tap = [this](const auto& row) { return ran(_session.tapRow(row).has_value()); }};
 }
 
 RowsModel::Actions PaneModel::actionsOfDetail() {
@@ -75,8 +68,7 @@ RowsModel::Actions PaneModel::actionsOfDetail() {
                     if (isDone) {
                         row->setValue(isOn);
                     }
-                    _pump.run();
-                    return isDone;
+                    return ran(isDone);
                 },
             .tap =
                 [this](const auto& row) {
@@ -84,9 +76,13 @@ RowsModel::Actions PaneModel::actionsOfDetail() {
                     if (isDone) {
                         row->performButtonAction();
                     }
-                    _pump.run();
-                    return isDone;
+                    return ran(isDone);
                 }};
+}
+
+bool PaneModel::ran(bool isDone) {
+    _pump.run();
+    return isDone;
 }
 
 std::expected<void, Error> PaneModel::showAccount() {
@@ -177,8 +173,8 @@ bool PaneModel::isReplaceable() const {
 }
 
 void PaneModel::openAnew() {
-    // Nobody asks the rows of the pane that goes, who are shown until the others come.
-    _rows.rows().describeAll();
+    // Nobody asks the rows of the pane that goes, which are shown until the others come.
+    _rows.rows().freeze();
     _session.closePane();
     if (const auto opened = _session.openPane(_entry); !opened) {
         Q_EMIT failed(qString(opened.error().description));
@@ -191,6 +187,9 @@ void PaneModel::openAnew() {
 void PaneModel::update() {
     updatePages();
     updateDetail();
+    if (!_keepsClosed) {
+        dropClosed();
+    }
     updateAlert();
     updateStatus();
     const Text& activity = _session.activity();
@@ -203,14 +202,16 @@ void PaneModel::updatePages() {
     const bool wasOpen = std::exchange(_isOpen, _session.isPaneOpen());
     if (wasOpen && !_isOpen) {
         // Also where the pane has dismissed itself: the page that it was opened from is below it.
-        _rows.rows().show({});
-        _rows.setSearch({});
+        _rows.rows().freeze();
         if (const auto opened = _session.openAccountPage(_entry); !opened) {
             Q_EMIT failed(qString(opened.error().description));
         }
     }
     if (_isOpen && !wasOpen) {
-        // Whoever has opened it: a scenario does so without the user.
+        // Whoever has opened it: a scenario does so without the user. An earlier one may still be
+        // leaving.
+        _rows.setSearch({});
+        _isPaneShown = true;
         _rows.rows().show(_session.rows());
     }
     const auto& account = _session.accountPage();
@@ -238,12 +239,31 @@ void PaneModel::updateDetail() {
         _shownDetail = page;
         if (page) {
             page->setObserver(&_detailRows.rows());
+            _detailRows.rows().show(page->specifiers());
+        } else {
+            _detailRows.rows().freeze();
         }
-        _detailRows.rows().show(page ? page->specifiers() : SpecifierArray());
     }
     _isDetailOpen = page != nullptr;
     if (page) {
+        _isDetailShown = true;
         _detailTitle = qString(_session.detailPage().title());
+    }
+}
+
+void PaneModel::forgetClosed() {
+    dropClosed();
+    updateStatus();
+    Q_EMIT changed();
+}
+
+void PaneModel::dropClosed() {
+    if (!_isOpen && std::exchange(_isPaneShown, false)) {
+        _rows.rows().show({});
+        _rows.setSearch({});
+    }
+    if (!_isDetailOpen && std::exchange(_isDetailShown, false)) {
+        _detailRows.rows().show({});
     }
 }
 
@@ -256,6 +276,9 @@ void PaneModel::updateAlert() {
 }
 
 void PaneModel::updateStatus() {
+    if (!_isOpen && _isPaneShown) {
+        return;
+    }
     const auto footer = _isOpen ? _session.footers().first() : nullptr;
     _status.show(footer.get());
     if (footer) {

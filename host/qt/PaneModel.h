@@ -35,7 +35,13 @@ class PaneModel final : public QObject {
     Q_PROPERTY(nimbra::window::ShownRows* detailRows READ detailRows CONSTANT)
     Q_PROPERTY(nimbra::window::DrawnViews* status READ status CONSTANT)
     Q_PROPERTY(bool isOpen MEMBER _isOpen NOTIFY changed)
+    /// Whether the pane's page can be seen: while it is open, and until it has left.
+    Q_PROPERTY(bool isPaneShown MEMBER _isPaneShown NOTIFY changed)
     Q_PROPERTY(QString title MEMBER _title NOTIFY changed)
+    Q_PROPERTY(bool isDetailShown MEMBER _isDetailShown NOTIFY changed)
+    /// Whether pages that have been closed leave by and by: they stay as they were until
+    /// `forgetClosed`. Else they are gone at once.
+    Q_PROPERTY(bool keepsClosed MEMBER _keepsClosed)
     Q_PROPERTY(bool isDetailOpen MEMBER _isDetailOpen NOTIFY changed)
     Q_PROPERTY(QString detailTitle MEMBER _detailTitle NOTIFY changed)
     /// What the pane is busy with; null while it is not.
@@ -68,6 +74,8 @@ public:
     Q_INVOKABLE void refreshPane();
     Q_INVOKABLE void answerAlert(int action);
     Q_INVOKABLE void setListWidth(qreal width);
+    /// Whatever has been closed has left.
+    Q_INVOKABLE void forgetClosed();
     /// The window has come to the front. A pane whose account has been changed elsewhere is opened
     /// anew then, unless something stands over it or is under way: it asks for its account once.
     void becomeActive();
@@ -96,9 +104,12 @@ Q_SIGNALS:
 private:
     [[nodiscard]] RowsModel::Actions actionsOfPane();
     [[nodiscard]] RowsModel::Actions actionsOfDetail();
+    /// Does what an action has set going, and gives back whether the action `isDone`.
+    [[nodiscard]] bool ran(bool isDone);
     [[nodiscard]] bool isReplaceable() const;
     void openAnew();
     void updatePages();
+    void dropClosed();
     void updateDetail();
     void updateAlert();
     void updateStatus();
@@ -116,6 +127,9 @@ private:
     /// Of when the pane was opened.
     std::optional<host::AccountFlags> _account;
     bool _isOpen = false;
+    bool _isPaneShown = false;
+    bool _isDetailShown = false;
+    bool _keepsClosed = false;
     QString _title;
     bool _isDetailOpen = false;
     QString _detailTitle;

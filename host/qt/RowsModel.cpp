@@ -43,13 +43,6 @@ bool isOfApplication(const Specifier& row) {
 
 } // namespace
 
-const host::RowDescription& RowsModel::Row::described() const {
-    if (!description) {
-        description = host::RowDescription::of(*specifier);
-    }
-    return *description;
-}
-
 RowsModel::RowsModel(Actions actions) : _actions(std::move(actions)) {}
 
 int RowsModel::rowCount(const QModelIndex& parent) const {
@@ -77,7 +70,7 @@ QVariant RowsModel::data(const QModelIndex& index, int role) const {
         return {};
     }
     const Row& row = _rows.at(static_cast<std::size_t>(index.row()));
-    const host::RowDescription& described = row.described();
+    const host::RowDescription& described = descriptionOf(row);
     switch (role) {
     case KindRole:
         return qString(host::kindName(described.kind));
@@ -105,7 +98,7 @@ QVariant RowsModel::data(const QModelIndex& index, int role) const {
         if (group < 0) {
             return role == FooterRole ? QVariant(QString()) : QVariant(false);
         }
-        const auto& heading = _rows.at(static_cast<std::size_t>(group)).described();
+        const auto& heading = descriptionOf(_rows.at(static_cast<std::size_t>(group)));
         return role == FooterRole ? QVariant(qString(heading.footer))
                                   : QVariant(heading.footerClass.isPresent());
     }
@@ -128,14 +121,8 @@ int RowsModel::indexOf(const std::string& label) const {
     return found == _rows.end() ? -1 : static_cast<int>(found - _rows.begin());
 }
 
-void RowsModel::describeAll() const {
-    for (const Row& row : _rows) {
-        static_cast<void>(row.described());
-    }
-}
-
 void RowsModel::readAnew() {
-    if (_rows.empty()) {
+    if (_rows.empty() || _isFrozen) {
         return;
     }
     for (Row& row : _rows) {
@@ -145,6 +132,9 @@ void RowsModel::readAnew() {
 }
 
 void RowsModel::set(int index, bool isOn) {
+    if (_isFrozen) {
+        return;
+    }
     const auto row = _rows.at(static_cast<std::size_t>(index)).specifier;
     if (_actions.set(row, isOn)) {
         // The switch stays as the user has left it until the page says that it is another way.
@@ -159,8 +149,19 @@ void RowsModel::set(int index, bool isOn) {
 }
 
 void RowsModel::tap(int index) {
+    if (_isFrozen) {
+        return;
+    }
     const auto row = _rows.at(static_cast<std::size_t>(index)).specifier;
     static_cast<void>(_actions.tap(row));
+}
+
+const host::RowDescription& RowsModel::descriptionOf(const Row& row) const {
+    if (!row.description) {
+        row.description = _isFrozen ? host::RowDescription::withoutValue(*row.specifier)
+                                    : host::RowDescription::of(*row.specifier);
+    }
+    return *row.description;
 }
 
 RowsModel::Position RowsModel::positionOf(const Specifier& row) const {
@@ -287,6 +288,7 @@ void RowsModel::didReload(const SpecifierArray& rows) {
 }
 
 void RowsModel::show(const SpecifierArray& rows) {
+    _isFrozen = false;
     if (_rows.empty()) {
         insert(0, rows);
     } else if (rows.empty()) {

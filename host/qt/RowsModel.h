@@ -54,8 +54,9 @@ public:
     /// Shows these rows instead of those before.
     void show(const SpecifierArray& rows);
 
-    /// Asks for all values that are not known yet: their page is about to go.
-    void describeAll() const;
+    /// Their page goes, while they are still seen: nobody is asked for a value any more, and
+    /// nothing can be done with them, until others are shown.
+    void freeze() { _isFrozen = true; }
     /// Asks for all values once more: something else than the user has set them.
     void readAnew();
 
@@ -91,11 +92,10 @@ private:
         mutable std::optional<host::RowDescription> description;
         /// Whether another row has the same name.
         bool sharesName = false;
-
-        [[nodiscard]] const host::RowDescription& described() const;
     };
     using Position = std::ptrdiff_t;
 
+    [[nodiscard]] const host::RowDescription& descriptionOf(const Row& row) const;
     [[nodiscard]] Position positionOf(const Specifier& row) const;
     /// The position of the group that the row stands in; -1 for none.
     [[nodiscard]] Position groupOf(Position position) const;
@@ -111,6 +111,7 @@ private:
     Actions _actions;
     std::vector<Row> _rows;
     int _applicationCount = 0;
+    bool _isFrozen = false;
 };
 
 } // namespace nimbra::window

@@ -63,6 +63,11 @@ Window {
             window.notice = told;
         }
     }
+    Binding {
+        target: pane
+        property: "keepsClosed"
+        value: Theme.calm > 0
+    }
     onIsCoveredChanged: Qt.callLater(takeFocus)
 
     Shortcut {
@@ -142,25 +147,27 @@ Window {
                 Loader {
                     id: paneLoader
 
-                    // Slides in over the page that it was opened from, and is gone at once with its rows.
+                    // Slides in over the page that it was opened from, and out again.
                     readonly property bool covers: pane.isOpen && x === 0
                     readonly property real aside: texts.rightToLeft ? -stack.width : stack.width
 
                     width: stack.width
                     height: stack.height
                     x: pane.isOpen ? 0 : aside
-                    active: pane.isOpen || paneSlide.running
+                    active: pane.isPaneShown
                     visible: !detailLoader.covers
                     focus: pane.isOpen && !pane.isDetailOpen
                     enabled: pane.isOpen && !pane.isDetailOpen
 
                     Behavior on x {
-                        enabled: Theme.calm > 0 && pane.isOpen
+                        enabled: Theme.calm > 0 && pane.isPaneShown
                         NumberAnimation {
-                            id: paneSlide
-
                             duration: Theme.calm
                             easing.type: Easing.OutCubic
+                            onRunningChanged: {
+                                if (!running)
+                                    pane.forgetClosed();
+                            }
                         }
                     }
 
@@ -192,16 +199,19 @@ Window {
                     width: stack.width
                     height: stack.height
                     x: pane.isDetailOpen ? 0 : aside
-                    active: pane.isDetailOpen || detailSlide.running
+                    active: pane.isDetailShown
+                    enabled: pane.isDetailOpen
                     focus: pane.isDetailOpen
 
                     Behavior on x {
-                        enabled: Theme.calm > 0 && pane.isDetailOpen
+                        enabled: Theme.calm > 0 && pane.isDetailShown
                         NumberAnimation {
-                            id: detailSlide
-
                             duration: Theme.calm
                             easing.type: Easing.OutCubic
+                            onRunningChanged: {
+                                if (!running)
+                                    pane.forgetClosed();
+                            }
                         }
                     }
 

@@ -1,0 +1,149 @@
+#include "host/core/PaneSession.h"
+#include "tests/host/qt/WindowFixture.h"
+
+namespace nimbra::window {
+
+namespace {
+
+/// Pages that slide, in real time; what they come to is waited for, and nothing is measured.
+class Slide : public WindowTest {
+protected:
+    void openSlidingPane() {
+        makeSampleDevice();
+        Arguments sliding = arguments();
+        sliding.appearance.reducedMotion = false;
+        ASSERT_NO_FATAL_FAILURE(openPane(sliding));
+        ASSERT_TRUE(waitUntilRests("panePage", 0));
+    }
+    /// A page that has been made; null where there is none.
+    [[nodiscard]] QQuickItem* page(const char* name) {
+        for (QQuickItem* const item : shownItems(window().contentItem())) {
+            if (item->objectName() == QLatin1String(name)) {
+                return item;
+            }
+        }
+        return nullptr;
+    }
+    [[nodiscard]] qreal placeOf(const char* name) { return page(name)->mapToScene({}).x(); }
+    [[nodiscard]] bool waitUntilRests(const char* name, qreal place) {
+        return waitFor([&] { return page(name) != nullptr && placeOf(name) == place; });
+    }
+    [[nodiscard]] bool waitUntilGone(const char* name) {
+        return waitFor([&] { return page(name) == nullptr; });
+    }
+};
+
+} // namespace
+
+TEST_F(Slide, ThePaneSlidesOutAsItWasOverThePageBelow) {
+    openSlidingPane();
+    const int rows = pane().rows()->rowCount();
+    const QVariant status = pane().property("statusText");
+    ASSERT_NE(status.toString(), QString());
+
+    // When the user goes back
+    pane().goBack();
+
+    // Then the pane has been closed, and its page is still seen with all that was on it
+    EXPECT_FALSE(session().isPaneOpen());
+    EXPECT_FALSE(pane().isOpen());
+    EXPECT_EQ(pane().rows()->rowCount(), rows);
+    EXPECT_EQ(pane().property("statusText"), status);
+    ASSERT_NE(page("panePage"), nullptr);
+    EXPECT_FALSE(page("panePage")->isEnabled());
+    ASSERT_NE(page("accountPage"), nullptr);
+    EXPECT_TRUE(page("accountPage")->isEnabled());
+
+    // It moves to where it came from
+    ASSERT_TRUE(waitFor([this] { return page("panePage") == nullptr || placeOf("panePage") > 0; }));
+    // and is gone then, with its rows
+    ASSERT_TRUE(waitUntilGone("panePage"));
+    EXPECT_EQ(pane().rows()->rowCount(), 0);
+    EXPECT_EQ(pane().property("statusText").toString(), QString());
+    settle();
+    EXPECT_TRUE(row(labels().front())->hasActiveFocus());
+}
+
+TEST_F(Slide, NobodyAsksTheRowsOfAPaneThatHasBeenClosed) {
+    openSlidingPane();
+    pane().goBack();
+    ShownRows& rows = *pane().rows();
+    ASSERT_GT(rows.rowCount(), 0);
+
+    // When those that nobody has seen yet are looked at, and used
+    for (int row = 0; row < rows.rowCount(); ++row) {
+        EXPECT_TRUE(rows.index(row, 0).data(RowsModel::KindRole).isValid());
+    }
+    const int notes = rows.indexOf(QStringLiteral("com.example.notes"));
+    const QVariant before = rows.index(notes, 0).data(RowsModel::IsOnRole);
+    rows.set(notes, !before.toBool());
+    rows.tap(rows.indexOf(QStringLiteral("CLOUD_DRIVE_DIAGNOSE")));
+    rows.rows().readAnew();
+
+    // Then nothing comes of it
+    EXPECT_EQ(rows.index(notes, 0).data(RowsModel::IsOnRole), before);
+    settle();
+    EXPECT_FALSE(pane().isOpen());
+    EXPECT_FALSE(session().activity());
+}
+
+TEST_F(Slide, APaneThatIsOpenedWhileItLeavesComesBackAsNew) {
+    openSlidingPane();
+    const auto before = labels();
+    pane().rows()->setSearch(QStringLiteral("notes"));
+    pane().goBack();
+    ASSERT_NE(page("panePage"), nullptr);
+
+    pane().open();
+
+    EXPECT_TRUE(pane().isOpen());
+    ASSERT_TRUE(waitUntilRests("panePage", 0));
+    settle();
+    EXPECT_EQ(labels(), before);
+    EXPECT_TRUE(page("panePage")->isEnabled());
+    click(row("com.example.notes"));
+    EXPECT_FALSE(row("com.example.notes")->property("isOn").toBool());
+}
+
+TEST_F(Slide, ADetailPageSlidesOutOverThePane) {
+    openSlidingPane();
+    click(row("Look Me Up by Email"));
+    ASSERT_TRUE(waitUntilRests("detailPage", 0));
+    const int rows = pane().detailRows()->rowCount();
+    ASSERT_GT(rows, 0);
+
+    pane().goBack();
+
+    EXPECT_FALSE(pane().property("isDetailOpen").toBool());
+    EXPECT_EQ(pane().detailRows()->rowCount(), rows);
+    ASSERT_NE(page("detailPage"), nullptr);
+    EXPECT_FALSE(page("detailPage")->isEnabled());
+    ASSERT_NE(page("panePage"), nullptr);
+    EXPECT_TRUE(page("panePage")->isEnabled());
+    ASSERT_TRUE(waitUntilGone("detailPage"));
+    EXPECT_EQ(pane().detailRows()->rowCount(), 0);
+    EXPECT_TRUE(pane().isOpen());
+    EXPECT_GT(pane().rows()->rowCount(), 0);
+    settle();
+    EXPECT_TRUE(row("Look Me Up by Email")->hasActiveFocus());
+}
+
+TEST_F(Slide, AWindowMayCloseWhileAPageLeaves) {
+    openSlidingPane();
+    pane().goBack();
+    ASSERT_NE(page("panePage"), nullptr);
+
+    _host.reset();
+}
+
+TEST_F(Slide, WhereMotionIsReducedAPageIsGoneAtOnce) {
+    makeSampleDevice();
+    openPane();
+
+    pane().goBack();
+
+    EXPECT_EQ(pane().rows()->rowCount(), 0);
+    EXPECT_EQ(page("panePage"), nullptr);
+}
+
+} // namespace nimbra::window
