@@ -136,14 +136,16 @@ void RowsModel::set(int index, bool isOn) {
         return;
     }
     const auto row = _rows.at(static_cast<std::size_t>(index)).specifier;
-    if (_actions.set(row, isOn)) {
-        // The switch stays as the user has left it until the page says that it is another way.
-        const Position position = positionOf(*row);
-        if (position >= 0 && _rows[static_cast<std::size_t>(position)].description) {
-            _rows[static_cast<std::size_t>(position)].description->value = isOn;
-        }
+    // The switch stays as the user has left it until the page says that it is another way, which it
+    // may do before the action is over.
+    if (auto& description = _rows[static_cast<std::size_t>(index)].description) {
+        description->value = isOn;
     }
+    const bool isDone = _actions.set(row, isOn);
     if (const Position position = positionOf(*row); position >= 0) {
+        if (!isDone) {
+            _rows[static_cast<std::size_t>(position)].description.reset();
+        }
         changed(position, position);
     }
 }

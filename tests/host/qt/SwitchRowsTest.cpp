@@ -132,6 +132,21 @@ TEST_F(SwitchRows, ASaveThatFailsPutsTheSwitchBack) {
     EXPECT_NE(labels(), before);
 }
 
+TEST_F(SwitchRows, ASaveThatFailsPutsTheSwitchForCellularDataBack) {
+    makeUsedDevice(R"(, "faults": {"save": [
+        {"domain": "StoreErrorDomain", "code": 7, "description": "the store refuses"}]})");
+    openPane();
+    ASSERT_FALSE(isOn("Use Cellular Data"));
+
+    click(row("Use Cellular Data"));
+
+    EXPECT_FALSE(isOn("Use Cellular Data"));
+    EXPECT_EQ(storedValueOf("Use Cellular Data"), RowValue(false));
+    // The next one is made.
+    click(row("Use Cellular Data"));
+    EXPECT_TRUE(isOn("Use Cellular Data"));
+}
+
 TEST_F(SwitchRows, ARefusedChangeOfAnApplicationShowsWhenThePageLooksAgain) {
     makeUsedDevice(R"(, "faults": {"consentSet": [false]})");
     openPane();
