@@ -233,10 +233,14 @@ void PaneModel::updatePages() {
 void PaneModel::updateDetail() {
     const auto& page = _session.detailPage().page();
     if (page != _shownDetail) {
-        if (_shownDetail) {
-            _shownDetail->setObserver(nullptr);
+        const auto left = std::exchange(_shownDetail, page);
+        if (left) {
+            left->setObserver(nullptr);
         }
-        _shownDetail = page;
+        if (left && _isOpen) {
+            // The row that led there is drawn again, and tells how things are by now.
+            _rows.rows().readLinksAnew();
+        }
         if (page) {
             page->setObserver(&_detailRows.rows());
             _detailRows.rows().show(page->specifiers());

@@ -131,6 +131,16 @@ void RowsModel::readAnew() {
     changed(0, std::ssize(_rows) - 1);
 }
 
+void RowsModel::readLinksAnew() {
+    for (Position place = 0; place < std::ssize(_rows); ++place) {
+        Row& row = _rows[static_cast<std::size_t>(place)];
+        if (row.specifier->cellType() == LinkListCell) {
+            row.description.reset();
+            changed(place, place);
+        }
+    }
+}
+
 void RowsModel::set(int index, bool isOn) {
     if (_isFrozen) {
         return;

@@ -59,6 +59,8 @@ public:
     void freeze() { _isFrozen = true; }
     /// Asks for all values once more: something else than the user has set them.
     void readAnew();
+    /// Asks for the values of the link rows once more: what one leads to may have changed them.
+    void readLinksAnew();
 
     void set(int index, bool isOn);
     void tap(int index);

@@ -90,6 +90,24 @@ TEST_F(Pages, ThePageOfTheDatabaseOpensOverThePaneAndBack) {
     EXPECT_TRUE(row(link)->hasActiveFocus());
 }
 
+TEST_F(Pages, ComingBackFromTheDatabaseShowsItsNumberOfNow) {
+    makeSampleDevice();
+    openPane();
+    const std::string link = "Look Me Up by Email";
+    ASSERT_EQ(descriptionOf(row(link)), "3 apps");
+    click(row(link));
+    ASSERT_TRUE(pane().property("isDetailOpen").toBool());
+    test::writeTestFile(root() / "System/Library/PreferenceBundles/AccountSettings"
+                                 "/TessarySettings.bundle/app-groups.json",
+                        "{\n  \"numAppGroups\": 5\n}\n");
+
+    key(Qt::Key_Escape);
+
+    ASSERT_FALSE(pane().property("isDetailOpen").toBool());
+    EXPECT_EQ(descriptionOf(row(link)), "5 apps");
+    EXPECT_EQ(row(link)->property("value").toString(), QStringLiteral("5 apps"));
+}
+
 TEST_F(Pages, ARowIsShownLitAndFocusedWhereTheUserIsLedToIt) {
     makeSampleDevice();
     start();

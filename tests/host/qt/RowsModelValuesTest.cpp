@@ -77,4 +77,20 @@ TEST_F(RowsModelValues, ARefusedSwitchIsDrawnAsThePageHasIt) {
     EXPECT_EQ(changes.front().front().toModelIndex().row(), switchPlace);
 }
 
+TEST_F(RowsModelValues, OnlyLinksAreReadAnewWhereOnlyTheyMayHaveChanged) {
+    ASSERT_EQ(shownText(), "before");
+    ASSERT_FALSE(isShownOn());
+    _text = "after";
+    _isOn = true;
+    ASSERT_EQ(shownText(), "before");
+    QSignalSpy changes(&_rows, &QAbstractItemModel::dataChanged);
+
+    _rows.readLinksAnew();
+
+    EXPECT_EQ(shownText(), "after");
+    EXPECT_FALSE(isShownOn());
+    ASSERT_EQ(changes.count(), 1);
+    EXPECT_EQ(changes.front().front().toModelIndex().row(), linkPlace);
+}
+
 } // namespace nimbra::window
