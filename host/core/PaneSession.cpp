@@ -148,9 +148,9 @@ void PaneSession::closePane() {
 }
 
 std::shared_ptr<TableCell> PaneSession::cellOfRow(const IndexPath& path) {
-    // A text has all its rows on the screen. A page that has been closed has none.
     const auto row = _pane ? _pane->specifierAtIndexPath(path) : nullptr;
-    return row ? std::make_shared<TableCell>(*_services, Rect(), row->label()) : nullptr;
+    const bool isShown = row && (!_isRowShown || _isRowShown(*row));
+    return isShown ? std::make_shared<TableCell>(*_services, Rect(), row->label()) : nullptr;
 }
 
 void PaneSession::appear() {

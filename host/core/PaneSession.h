@@ -23,6 +23,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 
 namespace nimbra {
 struct Notification;
@@ -106,6 +107,12 @@ public:
     /// Lays the list out `width` points wide from the next layout on; a phone's width to begin
     /// with.
     void setListWidth(double width) { _listWidth = width; }
+    /// Asks `isShown` whether the user sees a row of the pane's list now: only then has its table a
+    /// cell for it. Empty for a host that shows all rows at once, as one is to begin with. Called
+    /// on the main queue while a pane is open.
+    void setRowVisibility(std::function<bool(const Specifier& row)> isShown) {
+        _isRowShown = std::move(isShown);
+    }
 
     /// What the pane is busy with, as it says; absent while it is not.
     [[nodiscard]] const Text& activity() const { return _activity; }
@@ -171,6 +178,8 @@ private:
     void layOut();
     [[nodiscard]] std::expected<void, Error> loadBundle();
     [[nodiscard]] PlatformServices servicesForPane();
+    /// The cell of the row at `path`; null for a row that is not shown. A page that has been closed
+    /// shows none.
     [[nodiscard]] std::shared_ptr<TableCell> cellOfRow(const IndexPath& path);
     [[nodiscard]] std::expected<UserInfo, Error> userInfoFor(const PaneEntry& entry);
 
@@ -192,6 +201,7 @@ private:
     ListWatcher _listWatcher;
     /// What a terminal shows has no width in points: this is a phone's.
     double _listWidth = 390;
+    std::function<bool(const Specifier& row)> _isRowShown;
     std::unique_ptr<GroupFooters> _footers;
     Presentations _presentations;
     DetailPage _detailPage;

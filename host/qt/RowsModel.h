@@ -69,6 +69,10 @@ public:
     [[nodiscard]] int applicationCount() const { return _applicationCount; }
     /// Where the row that is called `label` stands; -1 for nowhere.
     [[nodiscard]] int indexOf(const std::string& label) const;
+    /// Where `row` stands; -1 for nowhere.
+    [[nodiscard]] int indexOf(const Specifier& row) const {
+        return static_cast<int>(positionOf(row));
+    }
 
     [[nodiscard]] int rowCount(const QModelIndex& parent = {}) const override;
     [[nodiscard]] QVariant data(const QModelIndex& index, int role) const override;

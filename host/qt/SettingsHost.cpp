@@ -67,6 +67,7 @@ SettingsHost::SettingsHost(const Arguments& arguments)
 
 SettingsHost::~SettingsHost() {
     // The window looks at the models until it has gone.
+    _window = nullptr;
     _pages.reset();
     _engine.reset();
     if (_session != nullptr && _session->isPaneOpen()) {
@@ -172,6 +173,7 @@ void SettingsHost::makeModels(const Arguments& arguments) {
                   look);
     _screen.emplace(*_session, *_pump, look);
     _sharing.emplace(*_session, *_pump, *_texts);
+    _session->setRowVisibility([this](const Specifier& row) { return isRowShown(row); });
     watchPane();
 }
 
@@ -244,6 +246,20 @@ std::expected<void, std::string> SettingsHost::showRow(const std::string& name) 
                               Q_ARG(QVariant, qString(name)));
     return isShown.toBool() ? std::expected<void, std::string>()
                             : Problem("the row cannot be shown");
+}
+
+bool SettingsHost::isRowShown(const Specifier& row) {
+    // A pane may open before the window, and closes after it.
+    if (_window == nullptr) {
+        return false;
+    }
+    const int place = _pane->rows()->indexOf(row);
+    QVariant isShown;
+    if (place >= 0) {
+        QMetaObject::invokeMethod(_window, "isRowShown", Q_RETURN_ARG(QVariant, isShown),
+                                  Q_ARG(QVariant, place));
+    }
+    return isShown.toBool();
 }
 
 QString SettingsHost::pictureUrl(const std::string& name) const {

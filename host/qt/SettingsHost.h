@@ -22,6 +22,9 @@
 
 class QQuickWindow;
 
+namespace nimbra {
+class Specifier;
+}
 namespace nimbra::host {
 class PaneSession;
 }
@@ -73,6 +76,8 @@ private:
     [[nodiscard]] std::expected<void, std::string> loadWindow(const Arguments& arguments,
                                                               const QString& notice);
     void watchPane();
+    /// Whether the user sees the row of the pane's list.
+    [[nodiscard]] bool isRowShown(const Specifier& row);
     [[nodiscard]] QString pictureUrl(const std::string& name) const;
 
     Appearance _appearance;
@@ -96,6 +101,7 @@ private:
     std::optional<QQmlApplicationEngine> _engine;
     /// The pages, while they are read ahead.
     std::optional<QQmlComponent> _pages;
+    /// Null while there is none.
     QQuickWindow* _window = nullptr;
 };
 

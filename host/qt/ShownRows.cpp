@@ -82,6 +82,11 @@ int ShownRows::indexOf(const QString& label) const {
     return row < 0 ? -1 : mapFromSource(_rows.index(row)).row();
 }
 
+int ShownRows::indexOf(const Specifier& row) const {
+    const int place = _rows.indexOf(row);
+    return place < 0 ? -1 : mapFromSource(_rows.index(place)).row();
+}
+
 QString ShownRows::labelOf(int row) const {
     return index(row, 0).data(RowsModel::LabelRole).toString();
 }

@@ -34,6 +34,8 @@ public:
     Q_INVOKABLE void tap(int row);
     /// The shown row that a scenario calls `label`; -1 for none.
     Q_INVOKABLE [[nodiscard]] int indexOf(const QString& label) const;
+    /// Where `row` stands among those that are shown; -1 where it does not.
+    [[nodiscard]] int indexOf(const Specifier& row) const;
     /// What a scenario calls the shown row.
     Q_INVOKABLE [[nodiscard]] QString labelOf(int row) const;
     /// Whether the user can put the focus on the row.

@@ -35,6 +35,13 @@ FocusScope {
         list.bringTo(row, ListView.Center);
         return true;
     }
+    // Whether a part of the row's card is in sight.
+    function isRowShown(row) {
+        // Rows that have come or gone just now have moved others.
+        list.forceLayout();
+        const item = list.itemAtIndex(row);
+        return item !== null && item.y + item.cardBottom > list.contentY && item.y + item.cardTop < list.contentY + list.height;
+    }
     function search() {
         if (searchBar.visible)
             searchField.forceActiveFocus(Qt.ShortcutFocusReason);
@@ -214,11 +221,11 @@ FocusScope {
 
             parent: list.contentItem
             visible: row !== null && row.activeFocus
-            x: visible ? row.card.x + 1 : 0
-            y: visible ? row.y + row.card.y + 1 : 0
+            x: visible ? row.margin + 1 : 0
+            y: visible ? row.y + row.cardTop + 1 : 0
             z: 2
-            width: visible ? row.card.width - 2 : 0
-            height: visible ? row.card.height - 2 : 0
+            width: visible ? row.columnWidth - 2 : 0
+            height: visible ? row.cardBottom - row.cardTop - 2 : 0
             radius: Theme.radius - 1
             color: "transparent"
             border.color: Theme.accent

@@ -18,6 +18,10 @@ Window {
     function showRow(label) {
         return paneLoader.item !== null && paneLoader.item.showRow(label);
     }
+    // Whether the row of the pane is on the screen, be it under what stands over the page.
+    function isRowShown(row) {
+        return paneLoader.item !== null && paneLoader.visible && paneLoader.item.isRowShown(row);
+    }
     function takeFocus() {
         if (pane.alert)
             alertSheet.takeFocus();

@@ -24,7 +24,9 @@ FocusScope {
     readonly property bool isGroup: kind === "group"
     readonly property bool isSwitch: kind === "switch"
     readonly property bool isUsable: !isLocked
-    readonly property alias card: card
+    // Where the row itself stands, between its heading and what is under it.
+    readonly property real cardTop: card.y
+    readonly property real cardBottom: card.y + card.height
     // Whether the user has been led here.
     property bool isLit: false
     property var list

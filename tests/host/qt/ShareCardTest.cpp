@@ -1,4 +1,5 @@
 #include "host/core/PaneSession.h"
+#include "platform/views/TableCell.h"
 #include "tests/device/TestFiles.h"
 #include "tests/host/qt/Gate.h"
 #include "tests/host/qt/WindowFixture.h"
@@ -110,6 +111,42 @@ TEST_F(ShareCard, NothingOfThePageCanBeUsedWhileItCollects) {
     EXPECT_EQ(control(told, QAccessible::Dialog), nullptr);
     EXPECT_TRUE(isCardShown());
     EXPECT_EQ(focusedName(), "Cancel");
+}
+
+TEST_F(ShareCard, ItPointsToTheButtonOnlyWhereThatIsInSight) {
+    // Given a list that is longer than the window, and a tool that takes its time
+    const Gate gate(place("gate"));
+    writeTool(gate.command() + R"(; echo collected > "$3")");
+    Arguments small = arguments();
+    small.size = {320, 320};
+    small.appearance.textScale = 2;
+    openPane(small);
+    const auto collect = [&](bool scrollsAway) {
+        row(diagnose)->forceActiveFocus();
+        QTest::keyClick(&window(), Qt::Key_Return);
+        ASSERT_TRUE(waitFor([this] { return session().activity().isPresent(); }));
+        if (scrollsAway) {
+            list()->setProperty("contentY", list()->property("originY"));
+        }
+        static_cast<void>(window().grabWindow());
+        gate.open();
+        settle();
+        ASSERT_TRUE(isCardShown());
+    };
+    const auto sourceView = [this] {
+        return session().presentations().shareSheet()->popoverPresentationController().sourceView;
+    };
+
+    // When its button is scrolled away meanwhile
+    ASSERT_NO_FATAL_FAILURE(collect(true));
+    EXPECT_EQ(sourceView(), nullptr);
+
+    // and when it is not
+    key(Qt::Key_Escape);
+    ASSERT_NO_FATAL_FAILURE(collect(false));
+    const auto cell = std::dynamic_pointer_cast<TableCell>(sourceView());
+    ASSERT_NE(cell, nullptr);
+    EXPECT_EQ(cell->label(), Text(diagnose));
 }
 
 TEST_F(ShareCard, ItOffersThePagesWaysInTheirOrder) {
