@@ -192,6 +192,7 @@ std::expected<ShareOutcome, std::string> Dialog::share(const std::filesystem::pa
     if (!_ask) {
         return ShareOutcome::cancelled;
     }
+    // The sheet's activities limit the ways of sending; a copy on this machine is none of them.
     const auto& types = sheet.includedActivityTypes();
     const bool mayMail = !types || std::ranges::find(*types, ActivityTypeMail) != types->end();
     const auto mail = mayMail ? host::findMailProgram() : std::nullopt;

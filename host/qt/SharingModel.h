@@ -20,8 +20,8 @@ namespace nimbra::window {
 class HostTexts;
 class SessionPump;
 
-/// The share sheet that a pane has presented: the ways that it allows, in its order, and what this
-/// host offers with any file. Main queue.
+/// The share sheet that a pane has presented: the ways of sending that it allows, in its order, and
+/// what this host offers with any file, which sends it nowhere: a copy, and its path. Main queue.
 class SharingModel final : public QObject {
     Q_OBJECT
     Q_PROPERTY(bool isShown MEMBER _isShown NOTIFY changed)

@@ -40,7 +40,9 @@ public:
 
     [[nodiscard]] const std::vector<FileURL>& activityItems() const { return _activityItems; }
 
-    /// The only ways that are offered, in this order; all that the host knows where none are set.
+    /// The only ways of sending that are offered, in this order; all that the host knows where none
+    /// are set. To keep a copy on the device, or to note where the files are, is no activity: a
+    /// host may offer that on any sheet.
     [[nodiscard]] const std::optional<std::vector<ActivityType>>& includedActivityTypes() const {
         return _includedActivityTypes;
     }

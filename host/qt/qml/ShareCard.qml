@@ -103,6 +103,7 @@ Sheet {
                         onPressed: sharing.share(modelData.way)
                     }
                 }
+                // Here and below: what sends the file nowhere, no page has to allow.
                 CardRow {
                     objectName: "copyPath"
                     title: texts.text("copyPath")
