@@ -17,8 +17,8 @@ class QDBusMessage;
 namespace nimbra::window {
 
 /// What the desktop tells every program of its settings: its portal on the session bus. Nothing
-/// here waits for the bus, not even for one that takes the connection and never says a word. Main
-/// thread only.
+/// here waits for the bus, not even for one that takes the connection and never says a word; only
+/// the end waits for one that has yet to take it. Main thread only.
 class DesktopSettings : public QObject {
     Q_OBJECT
 

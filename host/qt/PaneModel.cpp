@@ -208,9 +208,12 @@ void PaneModel::updatePages() {
         }
     }
     if (_isOpen && !wasOpen) {
-        // Whoever has opened it: a scenario does so without the user. An earlier one may still be
-        // leaving.
-        _rows.setSearch({});
+        // Whoever has opened it: a scenario does so without the user.
+        if (_isPaneShown) {
+            // An earlier one that is still leaving is another page, and gone at once.
+            forgetPane();
+            Q_EMIT changed();
+        }
         _isPaneShown = true;
         _rows.rows().show(_session.rows());
     }
@@ -241,6 +244,10 @@ void PaneModel::updateDetail() {
             // The row that led there is drawn again, and tells how things are by now.
             _rows.rows().readLinksAnew();
         }
+        if (page && !left && _isDetailShown) {
+            forgetDetail();
+            Q_EMIT changed();
+        }
         if (page) {
             page->setObserver(&_detailRows.rows());
             _detailRows.rows().show(page->specifiers());
@@ -262,13 +269,23 @@ void PaneModel::forgetClosed() {
 }
 
 void PaneModel::dropClosed() {
-    if (!_isOpen && std::exchange(_isPaneShown, false)) {
-        _rows.rows().show({});
-        _rows.setSearch({});
+    if (!_isOpen && _isPaneShown) {
+        forgetPane();
     }
-    if (!_isDetailOpen && std::exchange(_isDetailShown, false)) {
-        _detailRows.rows().show({});
+    if (!_isDetailOpen && _isDetailShown) {
+        forgetDetail();
     }
+}
+
+void PaneModel::forgetPane() {
+    _isPaneShown = false;
+    _rows.rows().show({});
+    _rows.setSearch({});
+}
+
+void PaneModel::forgetDetail() {
+    _isDetailShown = false;
+    _detailRows.rows().show({});
 }
 
 void PaneModel::updateAlert() {

@@ -110,6 +110,8 @@ private:
     void openAnew();
     void updatePages();
     void dropClosed();
+    void forgetPane();
+    void forgetDetail();
     void updateDetail();
     void updateAlert();
     void updateStatus();

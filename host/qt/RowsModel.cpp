@@ -300,15 +300,31 @@ void RowsModel::didReload(const SpecifierArray& rows) {
 }
 
 void RowsModel::show(const SpecifierArray& rows) {
-    _isFrozen = false;
+    // Rows that go stay frozen until they have gone: their page may be gone by now.
     if (_rows.empty()) {
+        _isFrozen = false;
         insert(0, rows);
     } else if (rows.empty()) {
         remove(0, std::ssize(_rows));
+        _isFrozen = false;
     } else {
         replaceWhatDiffers(rows);
     }
     recount();
+}
+
+void RowsModel::removeAllBut(const std::vector<bool>& staying) {
+    for (Position last = std::ssize(staying); last > 0;) {
+        const Position end = last;
+        while (last > 0 && !staying[static_cast<std::size_t>(last - 1)]) {
+            --last;
+        }
+        if (last < end) {
+            remove(last, end - last);
+        } else {
+            --last;
+        }
+    }
 }
 
 void RowsModel::replaceWhatDiffers(const SpecifierArray& rows) {
@@ -332,22 +348,19 @@ void RowsModel::replaceWhatDiffers(const SpecifierArray& rows) {
             next = known->second + 1;
         }
     }
-    for (Position last = std::ssize(before); last > 0;) {
-        const Position end = last;
-        while (last > 0 && !stays[static_cast<std::size_t>(last - 1)]) {
-            --last;
-        }
-        if (last < end) {
-            remove(last, end - last);
-        } else {
-            --last;
+    removeAllBut(stays);
+    // All that are left are of the new list before any of them is asked.
+    auto survivor = _rows.begin();
+    for (std::size_t place = 0; place < rows.size(); ++place) {
+        if (stayed[place]) {
+            survivor->specifier = rows[place];
+            survivor->description.reset();
+            ++survivor;
         }
     }
+    _isFrozen = false;
     for (Position place = 0; place < std::ssize(rows); ++place) {
         if (stayed[static_cast<std::size_t>(place)]) {
-            Row& row = _rows[static_cast<std::size_t>(place)];
-            row.specifier = rows[static_cast<std::size_t>(place)];
-            row.description.reset();
             continue;
         }
         Position end = place;

@@ -106,6 +106,7 @@ private:
     /// The position of the group that the row stands in; -1 for none.
     [[nodiscard]] Position groupOf(Position position) const;
     /// Of two lists with rows.
+    void removeAllBut(const std::vector<bool>& staying);
     void replaceWhatDiffers(const SpecifierArray& rows);
     void insert(Position position, const SpecifierArray& rows);
     void remove(Position first, Position count);

@@ -27,7 +27,7 @@ namespace {
 using Problem = std::unexpected<std::string>;
 
 QUrl mainPage() {
-    return QUrl(QStringLiteral("qrc:/qt/qml/Nimbra/Window/qml/Main.qml"));
+    return {QStringLiteral("qrc:/qt/qml/Nimbra/Window/qml/Main.qml")};
 }
 
 /// What the user loses nothing by but a word later on; told where a terminal looks on.
@@ -43,8 +43,10 @@ void warn(const std::expected<void, Error>& outcome) {
 void finishAhead(QQuickWindow& window, const ShownRows& rows) {
     QObject::connect(&rows, &QAbstractItemModel::rowsAboutToBeRemoved, &window, [&window] {
         constexpr int milliseconds = 10;
+        constexpr int turns = 100;
         QQmlIncubationController& controller = *window.incubationController();
-        while (controller.incubatingObjectCount() > 0) {
+        // One whose making takes the rows away cannot be finished here, however often it is tried.
+        for (int turn = 0; turn < turns && controller.incubatingObjectCount() > 0; ++turn) {
             controller.incubateFor(milliseconds);
         }
     });

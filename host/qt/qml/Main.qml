@@ -130,6 +130,12 @@ Window {
                 width: parent.width
                 clip: true
 
+                // Whoever leaves first waits for the other one.
+                function settle() {
+                    if (!paneSlide.running && !detailSlide.running)
+                        pane.forgetClosed();
+                }
+
                 Loader {
                     id: accountLoader
 
@@ -166,12 +172,11 @@ Window {
                     Behavior on x {
                         enabled: Theme.calm > 0 && pane.isPaneShown
                         NumberAnimation {
+                            id: paneSlide
+
                             duration: Theme.calm
                             easing.type: Easing.OutCubic
-                            onRunningChanged: {
-                                if (!running)
-                                    pane.forgetClosed();
-                            }
+                            onRunningChanged: Qt.callLater(stack.settle)
                         }
                     }
 
@@ -210,12 +215,11 @@ Window {
                     Behavior on x {
                         enabled: Theme.calm > 0 && pane.isDetailShown
                         NumberAnimation {
+                            id: detailSlide
+
                             duration: Theme.calm
                             easing.type: Easing.OutCubic
-                            onRunningChanged: {
-                                if (!running)
-                                    pane.forgetClosed();
-                            }
+                            onRunningChanged: Qt.callLater(stack.settle)
                         }
                     }
 

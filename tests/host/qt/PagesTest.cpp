@@ -90,6 +90,20 @@ TEST_F(Pages, ThePageOfTheDatabaseOpensOverThePaneAndBack) {
     EXPECT_TRUE(row(link)->hasActiveFocus());
 }
 
+TEST_F(Pages, ARowKeepsItsHeightUnderAnotherPage) {
+    makeSampleDevice();
+    openPane();
+    // With an explanation and the status of the sync below it.
+    const QQuickItem* const first = row("Nimbra Drive");
+    const qreal height = first->height();
+
+    click(row("Look Me Up by Email"));
+
+    ASSERT_TRUE(pane().property("isDetailOpen").toBool());
+    ASSERT_FALSE(first->isVisible());
+    EXPECT_EQ(first->height(), height);
+}
+
 TEST_F(Pages, ComingBackFromTheDatabaseShowsItsNumberOfNow) {
     makeSampleDevice();
     openPane();

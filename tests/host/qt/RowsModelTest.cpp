@@ -76,6 +76,49 @@ TEST_F(RowsModelTest, RowsOfOneTitleAreToldApartWhileThereAreSeveral) {
     EXPECT_EQ(distinctions(), (Texts{"", "", "com.example.reader", "org.example.reader"}));
 }
 
+TEST_F(RowsModelTest, RowsOfAPageThatHasGoneAreAskedNothingWhileTheyGo) {
+    // Given rows that nobody has looked at before their page goes
+    int questions = 0;
+    const auto counted = [&questions](const char* identifier) {
+        auto row =
+            Specifier::preferenceSpecifierNamed("Notes", {.target = nullptr,
+                                                          .set = {},
+                                                          .get =
+                                                              [&questions](const Specifier&) {
+                                                                  ++questions;
+                                                                  return RowValue(true);
+                                                              },
+                                                          .cell = SwitchCell});
+        row->setIdentifier(identifier);
+        return row;
+    };
+    const SpecifierArray gone{counted("one"), counted("two"), counted("three")};
+    const auto lookAtAll = [this] {
+        for (int row = 0; row < _rows.rowCount(); ++row) {
+            static_cast<void>(_rows.index(row).data(RowsModel::IsOnRole));
+        }
+    };
+    QObject::connect(&_rows, &RowsModel::rowsAboutToBeRemoved, lookAtAll);
+    _rows.show(gone);
+    _rows.freeze();
+
+    // When another list takes their place, of which one has the identifier of one that goes
+    const auto stays = rowOf("Notes", "two");
+    _rows.show({stays});
+    EXPECT_EQ(questions, 0);
+
+    // And when nothing does
+    _rows.show(gone);
+    _rows.freeze();
+    _rows.show({});
+    EXPECT_EQ(questions, 0);
+
+    // Then those of a list that is shown again are asked as ever
+    _rows.show(gone);
+    lookAtAll();
+    EXPECT_EQ(questions, 3);
+}
+
 TEST_F(RowsModelTest, AListThatIsBuiltAnewTellsItsOwnRowsApart) {
     _rows.show({rowOf("Reader", "one"), rowOf("Reader", "two")});
     ASSERT_EQ(distinctions(), (Texts{"one", "two"}));

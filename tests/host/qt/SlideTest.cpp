@@ -105,6 +105,22 @@ TEST_F(Slide, APaneThatIsOpenedWhileItLeavesComesBackAsNew) {
     EXPECT_FALSE(row("com.example.notes")->property("isOn").toBool());
 }
 
+TEST_F(Slide, APaneThatIsOpenedWhileItLeavesBeginsAtItsBeginning) {
+    openSlidingPane();
+    list()->forceActiveFocus();
+    key(Qt::Key_End);
+    ASSERT_FALSE(list()->property("atYBeginning").toBool());
+    pane().goBack();
+    ASSERT_NE(page("panePage"), nullptr);
+
+    pane().open();
+
+    ASSERT_TRUE(waitUntilRests("panePage", 0));
+    settle();
+    EXPECT_TRUE(list()->property("atYBeginning").toBool());
+    EXPECT_TRUE(row("Nimbra Drive")->hasActiveFocus());
+}
+
 TEST_F(Slide, ADetailPageSlidesOutOverThePane) {
     openSlidingPane();
     click(row("Look Me Up by Email"));
@@ -126,6 +142,24 @@ TEST_F(Slide, ADetailPageSlidesOutOverThePane) {
     EXPECT_GT(pane().rows()->rowCount(), 0);
     settle();
     EXPECT_TRUE(row("Look Me Up by Email")->hasActiveFocus());
+}
+
+TEST_F(Slide, WhoGoesBackTwiceSeesBothPagesToTheirEnds) {
+    openSlidingPane();
+    click(row("Look Me Up by Email"));
+    ASSERT_TRUE(waitUntilRests("detailPage", 0));
+    pane().goBack();
+    ASSERT_TRUE(waitFor([this] { return placeOf("detailPage") > 0; }));
+
+    const QQuickItem* const place = page("panePage")->parentItem();
+
+    // When the pane follows before the first page has left
+    pane().goBack();
+
+    // Then its page is gone only when it has come to where it goes
+    ASSERT_TRUE(waitUntilGone("panePage"));
+    EXPECT_EQ(place->x(), window().width());
+    EXPECT_EQ(page("detailPage"), nullptr);
 }
 
 TEST_F(Slide, AWindowMayCloseWhileAPageLeaves) {
