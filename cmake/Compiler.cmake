@@ -15,3 +15,8 @@ if(NIMBRA_SANITIZERS)
   # GCC 12's sanitizers make the optimiser see doubtful accesses in the standard library.
   add_compile_options($<$<CXX_COMPILER_ID:GNU>:-Wno-maybe-uninitialized>)
 endif()
+
+if(CMAKE_UNITY_BUILD)
+  # What one source calls by a name, another one may shadow; by itself, as it is installed, none does.
+  add_compile_options(-Wno-shadow -Wno-subobject-linkage)
+endif()
