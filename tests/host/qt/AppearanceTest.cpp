@@ -1,15 +1,12 @@
 #include "host/qt/Appearance.h"
 
+#include "tests/host/qt/DesktopPalette.h"
 #include "tests/host/qt/PortalStandIn.h"
 #include "tests/support/PrivateBus.h"
 
-#include <QColor>
 #include <QCoreApplication>
 #include <QDBusConnection>
 #include <QDBusVariant>
-#include <QEvent>
-#include <QGuiApplication>
-#include <QPalette>
 #include <QRegularExpression>
 #include <QSignalSpy>
 #include <cmath>
@@ -22,6 +19,7 @@ namespace nimbra::window {
 namespace {
 
 using test::PortalStandIn;
+using test::usePalette;
 
 const QString appearance = QStringLiteral("org.freedesktop.appearance");
 const QString interface = QStringLiteral("org.gnome.desktop.interface");
@@ -69,15 +67,6 @@ protected:
         while (!areTwoThere()) {
             QCoreApplication::processEvents();
         }
-    }
-
-    /// As the platform does it while the application runs.
-    static void usePalette(const QColor& window) {
-        QPalette palette;
-        palette.setColor(QPalette::Window, window);
-        QGuiApplication::setPalette(palette);
-        QEvent change(QEvent::ApplicationPaletteChange);
-        QCoreApplication::sendEvent(qGuiApp, &change);
     }
 
     /// Lets arrive what the bus has sent to the appearance.

@@ -1,54 +1,31 @@
 #include "host/qt/Appearance.h"
 #include "host/qt/DesktopSettings.h"
 #include "tests/device/TestFiles.h"
+#include "tests/host/qt/DesktopPalette.h"
 #include "tests/host/qt/SilentBus.h"
+#include "tests/support/EnvironmentVariable.h"
 #include "tests/support/TemporaryDirectory.h"
 
-#include <QColor>
 #include <QCoreApplication>
 #include <QDBusConnection>
-#include <QEvent>
-#include <QGuiApplication>
-#include <QPalette>
 #include <gtest/gtest.h>
 #include <optional>
-#include <utility>
-#include <vector>
 
 namespace nimbra::window {
 
 namespace {
 
+using test::usePalette;
+
 /// How an appearance comes to its bus, or does not.
 class DesktopBus : public testing::Test {
 protected:
-    DesktopBus() {
-        for (const char* const name : {"DBUS_SESSION_BUS_ADDRESS", "XDG_RUNTIME_DIR"}) {
-            _environment.emplace_back(name, qEnvironmentVariableIsSet(name)
-                                                ? std::optional(qgetenv(name))
-                                                : std::nullopt);
-        }
-    }
-    ~DesktopBus() override {
-        for (const auto& [name, value] : _environment) {
-            value ? qputenv(name, *value) : qunsetenv(name);
-        }
-        usePalette(Qt::white);
-    }
+    ~DesktopBus() override { usePalette(Qt::white); }
 
     static QString connection() { return QStringLiteral("bus"); }
 
-    /// As the platform does it while the application runs.
-    static void usePalette(const QColor& window) {
-        QPalette palette;
-        palette.setColor(QPalette::Window, window);
-        QGuiApplication::setPalette(palette);
-        QEvent change(QEvent::ApplicationPaletteChange);
-        QCoreApplication::sendEvent(qGuiApp, &change);
-    }
-
-private:
-    std::vector<std::pair<const char*, std::optional<QByteArray>>> _environment;
+    test::EnvironmentVariable _bus{"DBUS_SESSION_BUS_ADDRESS", std::nullopt};
+    test::EnvironmentVariable _runtime{"XDG_RUNTIME_DIR", std::nullopt};
 };
 
 } // namespace
@@ -115,18 +92,18 @@ TEST_F(DesktopBus, AnAppearanceMayEndWhileItIsOnItsWayToTheBus) {
 }
 
 TEST_F(DesktopBus, TheBusIsWhereTheEnvironmentSays) {
-    qputenv("DBUS_SESSION_BUS_ADDRESS", "unix:path=/told");
+    _bus.set("unix:path=/told");
     EXPECT_EQ(DesktopSettings::sessionBus(), QStringLiteral("unix:path=/told"));
 
     // Or where every user has one.
     const test::TemporaryDirectory folder;
-    qputenv("XDG_RUNTIME_DIR", QByteArray::fromStdString(folder.path().string()));
-    qunsetenv("DBUS_SESSION_BUS_ADDRESS");
+    _runtime.set(folder.path().string());
+    _bus.set(std::nullopt);
     EXPECT_EQ(DesktopSettings::sessionBus(), QString());
     test::writeTestFile(folder.path() / "bus", "");
     EXPECT_EQ(DesktopSettings::sessionBus().toStdString(),
               "unix:path=" + (folder.path() / "bus").string());
-    qunsetenv("XDG_RUNTIME_DIR");
+    _runtime.set(std::nullopt);
     EXPECT_EQ(DesktopSettings::sessionBus(), QString());
 }
 
