@@ -242,7 +242,7 @@ void PaneModel::updateDetail() {
         }
         if (left && _isOpen) {
             // The row that led there is drawn again, and tells how things are by now.
-            _rows.rows().readLinksAnew();
+            _rows.rows().drawLinksAnew();
         }
         if (page && !left && _isDetailShown) {
             forgetDetail();

@@ -70,6 +70,10 @@ QVariant RowsModel::data(const QModelIndex& index, int role) const {
         return {};
     }
     const Row& row = _rows.at(static_cast<std::size_t>(index.row()));
+    // The page is asked for what a link shows each time it is drawn: other programs change that.
+    if (role == ValueRole && !_isFrozen && row.specifier->cellType() == LinkListCell) {
+        row.description.reset();
+    }
     const host::RowDescription& described = descriptionOf(row);
     switch (role) {
     case KindRole:
@@ -131,11 +135,9 @@ void RowsModel::readAnew() {
     changed(0, std::ssize(_rows) - 1);
 }
 
-void RowsModel::readLinksAnew() {
+void RowsModel::drawLinksAnew() {
     for (Position place = 0; place < std::ssize(_rows); ++place) {
-        Row& row = _rows[static_cast<std::size_t>(place)];
-        if (row.specifier->cellType() == LinkListCell) {
-            row.description.reset();
+        if (_rows[static_cast<std::size_t>(place)].specifier->cellType() == LinkListCell) {
             changed(place, place);
         }
     }

@@ -59,8 +59,8 @@ public:
     void freeze() { _isFrozen = true; }
     /// Asks for all values once more: something else than the user has set them.
     void readAnew();
-    /// Asks for the values of the link rows once more: what one leads to may have changed them.
-    void readLinksAnew();
+    /// Has the link rows drawn once more: what one leads to may have changed what it shows.
+    void drawLinksAnew();
 
     void set(int index, bool isOn);
     void tap(int index);
@@ -106,8 +106,8 @@ private:
     /// The position of the group that the row stands in; -1 for none.
     [[nodiscard]] Position groupOf(Position position) const;
     /// Of two lists with rows.
-    void removeAllBut(const std::vector<bool>& staying);
     void replaceWhatDiffers(const SpecifierArray& rows);
+    void removeAllBut(const std::vector<bool>& staying);
     void insert(Position position, const SpecifierArray& rows);
     void remove(Position first, Position count);
     void changed(Position first, Position last);
