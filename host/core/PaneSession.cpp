@@ -225,11 +225,7 @@ std::expected<void, RowRefusal> PaneSession::setRow(const std::shared_ptr<Specif
     if (auto uncovered = uncoverRows(); !uncovered) {
         return uncovered;
     }
-    if (auto refusal = refusalToSet(*row)) {
-        return std::unexpected(std::move(*refusal));
-    }
-    row->setValue(isOn);
-    return {};
+    return turnSwitch(*row, isOn);
 }
 
 std::expected<void, RowRefusal> PaneSession::tapRow(std::string_view name) {
@@ -241,14 +237,13 @@ std::expected<void, RowRefusal> PaneSession::tapRow(const std::shared_ptr<Specif
     if (auto uncovered = uncoverRows(); !uncovered) {
         return uncovered;
     }
+    if (row->cellType() != LinkListCell) {
+        return pressButton(*row);
+    }
     if (auto refusal = refusalToTap(*row)) {
         return std::unexpected(std::move(*refusal));
     }
-    if (row->cellType() == LinkListCell) {
-        openDetail(row);
-    } else {
-        row->performButtonAction();
-    }
+    openDetail(row);
     return {};
 }
 

@@ -145,20 +145,6 @@ std::optional<RowRefusal> refusalToRead(const Specifier& row) {
                       quoted(row) + " is " + withArticle(row) + " and has no value"};
 }
 
-std::optional<RowRefusal> refusalToSet(const Specifier& row) {
-    if (row.cellType() != SwitchCell) {
-        return RowRefusal{Reason::notASwitch,
-                          quoted(row) + " is " + withArticle(row) + ", not a switch"};
-    }
-    if (!row.isEnabled()) {
-        return locked(row);
-    }
-    if (!row.hasSetter()) {
-        return RowRefusal{Reason::noSetter, quoted(row) + " cannot be changed"};
-    }
-    return std::nullopt;
-}
-
 std::optional<RowRefusal> refusalToTap(const Specifier& row) {
     if (row.cellType() != ButtonCell && row.cellType() != LinkListCell) {
         return RowRefusal{Reason::notAButton,
@@ -180,6 +166,29 @@ std::optional<RowRefusal> refusalToOpen(const Specifier& row) {
     }
     return RowRefusal{Reason::noPage,
                       quoted(row) + " leads to a page that this device does not have"};
+}
+
+std::expected<void, RowRefusal> turnSwitch(Specifier& row, bool isOn) {
+    if (row.cellType() != SwitchCell) {
+        return std::unexpected(RowRefusal{
+            Reason::notASwitch, quoted(row) + " is " + withArticle(row) + ", not a switch"});
+    }
+    if (!row.isEnabled()) {
+        return std::unexpected(locked(row));
+    }
+    if (!row.hasSetter()) {
+        return std::unexpected(RowRefusal{Reason::noSetter, quoted(row) + " cannot be changed"});
+    }
+    row.setValue(isOn);
+    return {};
+}
+
+std::expected<void, RowRefusal> pressButton(Specifier& row) {
+    if (auto refusal = refusalToTap(row)) {
+        return std::unexpected(std::move(*refusal));
+    }
+    row.performButtonAction();
+    return {};
 }
 
 } // namespace nimbra::host

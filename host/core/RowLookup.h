@@ -49,11 +49,14 @@ findRow(const SpecifierArray& rows, std::string_view name);
 [[nodiscard]] RowRefusal refusalOfCoveredPage();
 /// Why `row` has no value to read; nothing when it has one. Asks the getter.
 [[nodiscard]] std::optional<RowRefusal> refusalToRead(const Specifier& row);
-/// Why `row` cannot be switched on or off; nothing when it can.
-[[nodiscard]] std::optional<RowRefusal> refusalToSet(const Specifier& row);
 /// Why `row` cannot be tapped; nothing when it can, also where a link then opens no page.
 [[nodiscard]] std::optional<RowRefusal> refusalToTap(const Specifier& row);
 /// That the link `row` opens no page; nothing for one that does, and for a row of another kind.
 [[nodiscard]] std::optional<RowRefusal> refusalToOpen(const Specifier& row);
+
+/// Switches `row` on or off, unless that is refused.
+[[nodiscard]] std::expected<void, RowRefusal> turnSwitch(Specifier& row, bool isOn);
+/// Does what the button `row` is for, unless that is refused.
+[[nodiscard]] std::expected<void, RowRefusal> pressButton(Specifier& row);
 
 } // namespace nimbra::host

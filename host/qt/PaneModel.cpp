@@ -62,22 +62,9 @@ RowsModel::Actions PaneModel::actionsOfPane() {
 }
 
 RowsModel::Actions PaneModel::actionsOfDetail() {
-    return {.set =
-                [this](const auto& row, bool isOn) {
-                    const bool isDone = !host::refusalToSet(*row);
-                    if (isDone) {
-                        row->setValue(isOn);
-                    }
-                    return ran(isDone);
-                },
-            .tap =
-                [this](const auto& row) {
-                    const bool isDone = !host::refusalToTap(*row);
-                    if (isDone) {
-                        row->performButtonAction();
-                    }
-                    return ran(isDone);
-                }};
+    return {.set = [this](const auto& row,
+                          bool isOn) { return ran(host::turnSwitch(*row, isOn).has_value()); },
+            .tap = [this](const auto& row) { return ran(host::pressButton(*row).has_value()); }};
 }
 
 bool PaneModel::ran(bool isDone) {

@@ -88,19 +88,29 @@ TEST(RowLookup, NamesTheIdentifiersOfRowsThatHaveTheSameName) {
               R"("Twin" stands for 2 rows, and none has an identifier)");
 }
 
-TEST(RowLookup, ASwitchWithASetterCanBeSet) {
-    EXPECT_FALSE(refusalToSet(*settableSwitch()).has_value());
+TEST(RowLookup, ASwitchWithASetterIsSet) {
+    std::vector<RowValue> set;
+    const auto settable = Specifier::preferenceSpecifierNamed(
+        "Atlas", {.set = [&set](const RowValue& value, const auto&) { set.push_back(value); },
+                  .cell = SwitchCell});
+
+    EXPECT_TRUE(turnSwitch(*settable, true).has_value());
+    settable->setPropertyForKey(false, EnabledKey);
+    EXPECT_FALSE(turnSwitch(*settable, false).has_value());
+
+    EXPECT_EQ(set, std::vector<RowValue>{true}) << "what is refused is not done";
 }
 
 TEST(RowLookup, SaysWhyARowCannotBeSet) {
     const auto locked = settableSwitch();
     locked->setPropertyForKey(false, EnabledKey);
 
-    EXPECT_EQ(refusalToSet(*locked)->reason, Reason::locked);
-    EXPECT_EQ(refusalToSet(*row(nullptr, "a", ButtonCell))->reason, Reason::notASwitch);
-    EXPECT_EQ(refusalToSet(*Specifier::groupSpecifierWithID("a"))->reason, Reason::notASwitch);
-    EXPECT_EQ(refusalToSet(*row(nullptr, "a"))->reason, Reason::noSetter);
-    EXPECT_EQ(refusalToSet(*row(nullptr, nullptr))->explanation,
+    EXPECT_EQ(turnSwitch(*locked, true).error().reason, Reason::locked);
+    EXPECT_EQ(turnSwitch(*row(nullptr, "a", ButtonCell), true).error().reason, Reason::notASwitch);
+    EXPECT_EQ(turnSwitch(*Specifier::groupSpecifierWithID("a"), true).error().reason,
+              Reason::notASwitch);
+    EXPECT_EQ(turnSwitch(*row(nullptr, "a"), true).error().reason, Reason::noSetter);
+    EXPECT_EQ(turnSwitch(*row(nullptr, nullptr), true).error().explanation,
               "the row without a name cannot be changed");
 }
 
@@ -108,11 +118,16 @@ TEST(RowLookup, SaysWhyARowCannotBeTapped) {
     const auto button = row(nullptr, "a", ButtonCell);
     EXPECT_EQ(refusalToTap(*button)->reason, Reason::noAction);
 
-    button->setButtonAction([](const std::shared_ptr<Specifier>&) {});
+    int presses = 0;
+    button->setButtonAction([&presses](const std::shared_ptr<Specifier>&) { ++presses; });
     EXPECT_FALSE(refusalToTap(*button).has_value());
+    EXPECT_TRUE(pressButton(*button).has_value());
+    EXPECT_EQ(presses, 1);
 
     button->setPropertyForKey(false, EnabledKey);
     EXPECT_EQ(refusalToTap(*button)->reason, Reason::locked);
+    EXPECT_EQ(pressButton(*button).error().reason, Reason::locked);
+    EXPECT_EQ(presses, 1) << "what is refused is not done";
     EXPECT_EQ(refusalToTap(*row(nullptr, "a"))->reason, Reason::notAButton);
 }
 
