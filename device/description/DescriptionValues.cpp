@@ -1,23 +1,15 @@
 #include "device/description/DescriptionValues.h"
 
 #include "device/description/Instant.h"
+#include "device/system/LanguageChain.h"
 
 #include <algorithm>
 #include <unicode/timezone.h>
-#include <unicode/uloc.h>
 #include <unicode/unistr.h>
 
 namespace nimbra::device {
 
 namespace {
-
-bool isLanguageTag(const std::string& tag) {
-    UErrorCode status = U_ZERO_ERROR;
-    char locale[ULOC_FULLNAME_CAPACITY]; // NOLINT(*-avoid-c-arrays): the library's interface
-    int parsed = 0;
-    uloc_forLanguageTag(tag.c_str(), locale, ULOC_FULLNAME_CAPACITY, &parsed, &status);
-    return U_SUCCESS(status) != 0 && !tag.empty() && static_cast<std::size_t>(parsed) == tag.size();
-}
 
 bool isTimeZone(const std::string& name) {
     UErrorCode status = U_ZERO_ERROR;
