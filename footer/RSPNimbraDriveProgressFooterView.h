@@ -44,8 +44,6 @@ public:
 
     [[nodiscard]] const std::shared_ptr<ProgressView>& progressBar() const { return _progressBar; }
     [[nodiscard]] const std::shared_ptr<Label>& statusLabel() const { return _statusLabel; }
-    /// Whether the sentence is kept fresh by the timer.
-    [[nodiscard]] bool isLastSyncAutoUpdating() const { return _lastSyncAutoUpdate; }
 
     void willMoveToWindow(Window* window) override;
     void observeValueForKeyPath(const KeyPath& keyPath, const Observation& observation) override;

@@ -96,9 +96,8 @@ std::optional<std::string> RSPNimbraDriveViewController::_diagnosePathForMR() co
                         created.error().line());
         return std::nullopt;
     }
-    return std::string(archiveDirectory) + "stratafile-" +
-           _sanitizeForDiagnoseName(name ? name.string() : "") + '-' +
-           formatter->stringFromDate(services().clock->now()).string() + ".tar.gz";
+    return std::string(archiveDirectory) + "stratafile-" + _sanitizeForDiagnoseName(name.string()) +
+           '-' + formatter->stringFromDate(services().clock->now()).string() + ".tar.gz";
 }
 
 std::optional<FileURL> RSPNimbraDriveViewController::_collectMRLogs() const {

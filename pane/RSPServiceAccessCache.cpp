@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <ranges>
 
 namespace nimbra {
 
@@ -47,12 +48,8 @@ std::optional<std::vector<BundleIdentifier>> RSPServiceAccessCache::allBundleIDs
     if (!_accessInfoByBundleID) {
         return std::nullopt;
     }
-    std::vector<BundleIdentifier> bundleIDs;
-    bundleIDs.reserve(_accessInfoByBundleID->size());
-    for (const auto& [bundleID, entry] : *_accessInfoByBundleID) {
-        bundleIDs.push_back(bundleID);
-    }
-    return bundleIDs;
+    const auto bundleIDs = std::views::keys(*_accessInfoByBundleID);
+    return std::vector(bundleIDs.begin(), bundleIDs.end());
 }
 
 bool RSPServiceAccessCache::isAccessGrantedForBundleID(const BundleIdentifier& bundleID) const {

@@ -2,8 +2,6 @@
 
 #include "platform/system/SystemLog.h"
 
-#include <array>
-#include <string>
 #include <string_view>
 
 namespace nimbra {
@@ -40,15 +38,6 @@ inline constexpr LogMessage settingShareSourceView{
     "VTUIDocumentsDataViewController: Setting source view of activity VC as %@."};
 inline constexpr LogMessage noLastSyncDate{LogLevel::error, "Can't retrieve last sync date; %@"};
 inline constexpr LogMessage noLastSyncSentence{LogLevel::error, "can't fetch last sync; %@"};
-
-inline constexpr std::array all{
-    markingAccount,         enablingDataclasses,
-    updatedCellularFlag,    failedToUpdateCellularFlag,
-    loadingTessaryBundle,   noBundleForIdentifier,
-    noCachedAccess,         failedToCreateDiagnoseDirectory,
-    settingShareSourceView, noLastSyncDate,
-    noLastSyncSentence,
-};
 
 } // namespace log_messages
 

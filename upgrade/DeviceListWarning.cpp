@@ -122,7 +122,7 @@ RSPUpgradeViewController::_warningForSomeDevicesBeingEligibleForUpgrade() const 
     const char* sentence = "CLOUD_DRIVE_UPGRADE_WARNING_NO_KNOWN_DEVICES";
     if (needUpgrade == 1) {
         sentence = "CLOUD_DRIVE_UPGRADE_WARNING_ONE_OTHER_DEVICE";
-    } else if (needUpgrade > 1) {
+    } else if (needUpgrade >= 2) {
         sentence = "CLOUD_DRIVE_UPGRADE_WARNING_MULTIPLE_OTHER_DEVICES";
     }
     warning.appendAttributedString(_plain(sentence));
@@ -158,7 +158,7 @@ RSPUpgradeViewController::_commaSeparatedStringWithBoldNamesForDevices(
         // The tables know the key by this spelling.
         list.appendAttributedString(_plain("CLOUD_DRIVE_DEVICE_LIST_TWO_ITEM_SEPARAOTR"));
         list.appendAttributedString({devices->back(), _boldTextAttributes});
-    } else if (devices->size() > 2) {
+    } else if (devices->size() >= 3) {
         const MutableAttributedString separator = _plain("CLOUD_DRIVE_DEVICE_LIST_SEPARATOR");
         const MutableAttributedString lastSeparator =
             _plain("CLOUD_DRIVE_DEVICE_LIST_LAST_SEPARATOR");

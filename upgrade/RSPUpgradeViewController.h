@@ -6,7 +6,6 @@
 #include <expected>
 #include <memory>
 #include <optional>
-#include <string>
 #include <vector>
 
 namespace nimbra {

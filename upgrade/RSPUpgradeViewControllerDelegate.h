@@ -6,9 +6,9 @@ namespace nimbra {
 
 class RSPUpgradeViewController;
 
-/// Is told how the screen that moves an account to the new document service has ended: at most one
-/// of the two is called for a screen, on the main queue, and none where the screen ends with the
-/// page that it was opened from.
+/// Is told how the screen that moves an account to the new document service has ended, on the main
+/// queue, each time the screen comes to an end; not where it ends with the page that it was opened
+/// from.
 class RSPUpgradeViewControllerDelegate {
 public:
     virtual ~RSPUpgradeViewControllerDelegate() = default;

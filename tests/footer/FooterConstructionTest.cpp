@@ -16,7 +16,7 @@ TEST_F(Footer, ANewViewShowsFourBlanksAndNoBar) {
     EXPECT_EQ(view->progressBar()->progress(), 0);
     EXPECT_EQ(view->progressBar()->style(), ProgressViewStyle::standard);
     EXPECT_FALSE(view->isSyncing());
-    EXPECT_FALSE(view->isLastSyncAutoUpdating());
+    EXPECT_FALSE(isAutoUpdating());
     EXPECT_EQ(view->globalProgressSubscriber(), nullptr);
     EXPECT_EQ(view->lastSyncDateSubscriber(), nullptr);
     EXPECT_EQ(takeCalls(), Calls()) << "nothing is asked before the view is in a window";
@@ -113,7 +113,7 @@ TEST_F(Footer, TheGroupDoesNotMatter) {
 TEST_F(Footer, ARunningTimerIsCancelledWithTheView) {
     storeAge(std::chrono::seconds(30));
     view->moveToWindow(&window);
-    ASSERT_TRUE(view->isLastSyncAutoUpdating());
+    ASSERT_TRUE(isAutoUpdating());
     const std::shared_ptr<FakeTimer> kept = platform.workQueues.timers().at(0);
     kept->calls.clear();
 

@@ -40,6 +40,10 @@ struct FooterFixture : testing::Test {
 
     [[nodiscard]] FakeTimer& timer() const { return *platform.workQueues.timers().at(0); }
     [[nodiscard]] const Text& text() const { return view->statusLabel()->text(); }
+    /// Whether the timer keeps the sentence fresh.
+    [[nodiscard]] bool isAutoUpdating() const {
+        return view->valueForKey(KeyPath("lastSyncAutoUpdate")) == RowValue(true);
+    }
     [[nodiscard]] bool isBarHidden() const { return view->progressBar()->isHidden(); }
 
     /// The daemon has this date of the last sync.

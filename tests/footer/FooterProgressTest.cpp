@@ -302,7 +302,7 @@ TEST_F(FooterProgress, AChangeOfAnotherObjectIsTheBaseClasss) {
 
 TEST_F(FooterProgress, AMissingSentenceUnderAnIndeterminateProgressSuspendsTheTimer) {
     postLastSync({{MRSyncStatusLastSyncDateKey, now}});
-    ASSERT_TRUE(view->isLastSyncAutoUpdating());
+    ASSERT_TRUE(isAutoUpdating());
     const auto progress = progressCalled("Uploading");
     const auto end = platform.progressReports.publish(progress);
     timer().calls.clear();

@@ -24,7 +24,7 @@ struct FooterTimer : FooterFixture {
 TEST_F(FooterTimer, ASyncOfThisMinuteIsRefreshedAfterSixtySeconds) {
     EXPECT_EQ(callsForAge(0s), (Calls{arm(60), "resume"}));
     EXPECT_EQ(timer().leeway, 0ns);
-    EXPECT_TRUE(view->isLastSyncAutoUpdating());
+    EXPECT_TRUE(isAutoUpdating());
 }
 
 TEST_F(FooterTimer, ASyncThirtySecondsAgoIsRefreshedAfterSixtySeconds) {
@@ -63,7 +63,7 @@ TEST_F(FooterTimer, ARunningTimerIsOnlyArmedAnew) {
     postLastSync({{MRSyncStatusLastSyncDateKey, now - 5min}});
 
     EXPECT_EQ(timer().calls, Calls{arm(5)});
-    EXPECT_TRUE(view->isLastSyncAutoUpdating());
+    EXPECT_TRUE(isAutoUpdating());
 }
 
 TEST_F(FooterTimer, AFiringRefreshesTheSentenceAndDoesNotArm) {
@@ -99,7 +99,7 @@ TEST_F(FooterTimer, AMissingSentenceSuspendsARunningTimerOnce) {
     timer().fire();
     EXPECT_EQ(timer().calls, Calls{"suspend"});
     EXPECT_FALSE(text());
-    EXPECT_FALSE(view->isLastSyncAutoUpdating());
+    EXPECT_FALSE(isAutoUpdating());
 
     postLastSync({});
     EXPECT_EQ(timer().calls, Calls{"suspend"}) << "a second missing sentence suspends nothing";
@@ -110,7 +110,7 @@ TEST_F(FooterTimer, ADateArmsNothingWhileThereIsNoSentence) {
 
     EXPECT_EQ(callsForAge(61s), Calls());
     EXPECT_FALSE(text());
-    EXPECT_FALSE(view->isLastSyncAutoUpdating());
+    EXPECT_FALSE(isAutoUpdating());
 
     postLastSync({{MRSyncStatusLastSyncDateKey, now}});
     EXPECT_EQ(timer().calls, Calls());
@@ -126,7 +126,7 @@ TEST_F(FooterTimer, ASuspendedTimerRunsAgainWhenASentenceAndADateCome) {
     postLastSync({{MRSyncStatusLastSyncDateKey, now}});
 
     EXPECT_EQ(timer().calls, (Calls{arm(60), "resume"}));
-    EXPECT_TRUE(view->isLastSyncAutoUpdating());
+    EXPECT_TRUE(isAutoUpdating());
 }
 
 TEST_F(FooterTimer, AnEmptySentenceIsASentence) {
@@ -146,7 +146,7 @@ TEST_F(FooterTimer, ASentenceThatCannotBeFetchedLeavesTextAndTimer) {
 
     EXPECT_EQ(text(), Text("Synced."));
     EXPECT_EQ(timer().calls, Calls());
-    EXPECT_TRUE(view->isLastSyncAutoUpdating());
+    EXPECT_TRUE(isAutoUpdating());
     const FakeSystemLog::Lines expected{
         {LogLevel::error, "can't fetch last sync; no answer (daemon 4)"}};
     EXPECT_EQ(platform.systemLog.lines, expected);
@@ -170,7 +170,7 @@ TEST_F(FooterTimer, ASentenceThatCannotBeFetchedUnderAnEmptyTextArmsNothing) {
 
     EXPECT_EQ(timer().calls, Calls());
     EXPECT_FALSE(text());
-    EXPECT_FALSE(view->isLastSyncAutoUpdating());
+    EXPECT_FALSE(isAutoUpdating());
 }
 
 } // namespace

@@ -86,7 +86,7 @@ TEST_F(FooterWindow, LeavingTheWindowEndsTheSubscriptionAndRefreshesTheSentence)
     EXPECT_EQ(view->globalProgressSubscriber(), nullptr);
     EXPECT_EQ(text(), Text("Synced later."));
     EXPECT_EQ(timer().calls, Calls()) << "the timer goes on";
-    EXPECT_TRUE(view->isLastSyncAutoUpdating());
+    EXPECT_TRUE(isAutoUpdating());
     EXPECT_EQ(platform.distributedNotificationCenter.registrations.size(), 1U);
     EXPECT_NE(view->lastSyncDateSubscriber(), nullptr);
 }
@@ -138,7 +138,7 @@ TEST_F(FooterWindow, NewsOfTheLastSyncReachAViewThatHasLeftItsWindow) {
     postLastSync({{MRSyncStatusLastSyncDateKey, now}});
 
     EXPECT_EQ(text(), Text("Synced later."));
-    EXPECT_TRUE(view->isLastSyncAutoUpdating());
+    EXPECT_TRUE(isAutoUpdating());
 }
 
 TEST_F(FooterWindow, NewsWithoutADateRefreshTheSentenceAndArmNothing) {

@@ -53,6 +53,15 @@ TEST(LayerCheckOfTheProject, TheProjectKeepsItsLayers) {
     EXPECT_EQ(result.output, "");
 }
 
+TEST_F(LayerCheck, ALineForTheLogStandsWithTheOthers) {
+    tree.write("pane/Pane.cpp", "services().systemLog->write(LogLevel::error, \"Oops\");\n");
+    expectFault("pane/Pane.cpp:1", "writes a line of its own");
+    tree.write("pane/Pane.cpp", "constexpr LogMessage oops{LogLevel::error, \"Oops\"};\n");
+    expectFault("pane/Pane.cpp:1", "writes a line of its own");
+    tree.write("pane/Pane.cpp", "writeLogMessage(services().systemLog, log_messages::oops);\n");
+    EXPECT_EQ(checkLayers(tree.root()).output, "");
+}
+
 TEST_F(LayerCheck, ATreeThatKeepsItsLayersPasses) {
     const CommandResult result = checkLayers(tree.root());
 

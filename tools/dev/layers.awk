@@ -130,6 +130,11 @@ FNR == longest + 1 { fault("is longer than " longest " lines") }
     checkLibrary(pieces[2])
 }
 
+# Whoever searches a log knows every line that the page can write.
+layer ~ /^(footer|upgrade|pane)$/ && /systemLog *(->|[.])|LogMessage( +[A-Za-z]+)? *[{]/ {
+    fault("writes a line of its own; the page's lines stand in support/LogMessages.h")
+}
+
 # Follows the includes of one file; one that leads back to a file under way closes a circle.
 function follow(from, path, i, to) {
     state[from] = "under way"
