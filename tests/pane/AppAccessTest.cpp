@@ -158,6 +158,16 @@ TEST_F(AppAccessTest, BeforeAnyListNothingIsWritten) {
     EXPECT_EQ(takeCalls(), Calls());
 }
 
+TEST_F(AppAccessTest, BeforeAnyListAHiddenApplicationIsAskedForAndNotWritten) {
+    platform.applications.install("com.example.notes", "Notes").granted = {
+        {"com.vantrel.private.vantrelaccount.app-hidden-from-nimbra-settings", {true}}};
+
+    EXPECT_EQ(pane->_appSpecifierWithBundleID(kNotes), nullptr);
+
+    EXPECT_EQ(log(), kNoCache) << "asked once, and written never";
+    EXPECT_EQ(takeCalls(), Calls());
+}
+
 TEST_F(AppAccessTest, AnApplicationThatHasGoneFromTheRecordsIsLoggedAndWritesNothing) {
     addNotes({kPRVServiceTidewater}, true);
     const auto row = notes();

@@ -61,6 +61,17 @@ TEST_F(DependentRowsTest, TurningOffRemovesTheRowsInOneAnimatedBatch) {
     EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPLookMeUpByEmail T");
 }
 
+TEST_F(DependentRowsTest, BeforeAnyListThereIsNothingToPutRowsInto) {
+    storeTidewater(true);
+    fillAllRows();
+
+    pane->_reloadSpecifiersThatDependOnDocumentsAndDataSwitchState();
+
+    EXPECT_EQ(platform.calls, Calls({"begin", "end"}));
+    EXPECT_EQ(rows(), "RSPNimbraDrive Nimbra Drive RSPStatusInfo RSPLookMeUpByEmail T RSPUIApps "
+                      "Alpha Zeta RSPCellular Cellular RSPDiagnostics D");
+}
+
 TEST_F(DependentRowsTest, TurningOffTwiceFindsNothingToRemove) {
     storeTidewater(true);
     fillAllRows();

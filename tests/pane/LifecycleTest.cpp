@@ -1,5 +1,7 @@
 #include "tests/pane/PaneFixture.h"
 
+#include <functional>
+
 namespace nimbra::test {
 namespace {
 
@@ -30,15 +32,23 @@ public:
     addObserverForName(const NotificationName& /*name*/, Observation /*observation*/) override {
         const auto token = std::make_shared<ObserverToken>();
         given.push_back(token);
+        if (whenChanged) {
+            whenChanged();
+        }
         return token;
     }
     void removeObserver(const std::shared_ptr<ObserverToken>& token) override {
         removed.push_back(token.get());
+        if (whenChanged) {
+            whenChanged();
+        }
     }
     void postNotification(const Notification& /*notification*/) override {}
 
     std::vector<std::weak_ptr<ObserverToken>> given;
     std::vector<const ObserverToken*> removed;
+    /// Called when a registration begins or ends.
+    std::function<void()> whenChanged;
 };
 
 TEST_F(LifecycleTest, TheAccountIsReadOnFirstUseAndKept) {
@@ -241,6 +251,38 @@ TEST_F(LifecycleTest, TheTokensStayInTheirFieldsUntilThePaneGoes) {
     for (const auto& token : center.given) {
         EXPECT_TRUE(token.expired());
     }
+}
+
+TEST_F(LifecycleTest, RegistrationsBeginAndEndBeforeTheHintingDoes) {
+    TokenCenter center;
+    PlatformServices services = platform.services();
+    services.notificationCenter = center;
+    pane = std::make_shared<PaneWithRows>(services);
+    pane->setSpecifier(entry);
+    const auto hinting = [this] {
+        return platform.workQueues.queueLabelled("container-priority-hinting");
+    };
+    int begun = 0;
+    center.whenChanged = [&] {
+        ++begun;
+        EXPECT_EQ(hinting(), nullptr);
+    };
+
+    pane->viewDidAppear(true);
+
+    EXPECT_EQ(begun, 3);
+    ASSERT_NE(hinting(), nullptr);
+    hinting()->pump();
+    int ended = 0;
+    center.whenChanged = [&] {
+        ++ended;
+        EXPECT_EQ(hinting()->pendingCount(), 0U);
+    };
+
+    pane->viewDidDisappear(true);
+
+    EXPECT_EQ(ended, 3);
+    EXPECT_GT(hinting()->pendingCount(), 0U);
 }
 
 TEST_F(LifecycleTest, ARefreshEndsOnTheControlThatWasPulled) {

@@ -19,6 +19,7 @@ class PaneWithRows final : public RSPNimbraDriveViewController {
 public:
     using RSPNimbraDriveViewController::_accessCache;
     using RSPNimbraDriveViewController::_appAccessGrantedForBundleID;
+    using RSPNimbraDriveViewController::_appSpecifierWithBundleID;
     using RSPNimbraDriveViewController::_collectMRLogs;
     using RSPNimbraDriveViewController::_createSpecifiersForCellularSwitchCell;
     using RSPNimbraDriveViewController::_diagnosePathForMR;
