@@ -23,9 +23,10 @@ set(CPACK_DEBIAN_PACKAGE_SECTION utils)
 # The libraries are read off the programs; the platform's own is in the package.
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
 set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS_PRIVATE_DIRS ${CMAKE_LIBRARY_OUTPUT_DIRECTORY})
-# No program shows that it imports these: the window's modules and the font it falls back to.
+# No program shows that it imports these: the window's modules and the font it falls back to, whose
+# light face the upgrade's title has.
 string(CONCAT CPACK_DEBIAN_PACKAGE_DEPENDS
-  "fonts-dejavu-core, qml6-module-qtqml, qml6-module-qtqml-models, "
+  "fonts-dejavu-core, fonts-dejavu-extra, qml6-module-qtqml, qml6-module-qtqml-models, "
   "qml6-module-qtqml-workerscript, qml6-module-qtquick, qml6-module-qtquick-window")
 set(CPACK_DEBIAN_PACKAGE_RECOMMENDS "qt6-wayland, xdg-utils")
 
