@@ -217,7 +217,8 @@ function kindOfName(i) {
     return ""
 }
 
-# The statements of the body that `opening` begins: each left out, each exchanged with the next.
+# The statements of the body that `opening` begins: each left out, each exchanged with the next one,
+# but for two that set different properties of one object, whose order is nobody's business.
 
 function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo, lastKind) {
     closing = partner[opening]
@@ -230,7 +231,10 @@ function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo,
         if (kind == "call" || (kind == "jump" && to - from == 1)) {
             change(begin[from], finish(to), "", "statement left out")
         }
-        if (kind ~ /call|block/ && lastKind ~ /call|block/) {
+        if (returnsMore(from, to) && !deducesReturn(opening)) {
+            change(begin[from], finish(to), "return {};", "nothing returned")
+        }
+        if (kind ~ /call|block/ && lastKind ~ /call|block/ && !setOneObject(lastFrom, from)) {
             change(begin[lastFrom], finish(to),
                 text(begin[from], finish(to)) text(finish(lastTo) + 1, begin[from] - 1) \
                 text(begin[lastFrom], finish(lastTo)), "exchanged with the next statement")
@@ -239,6 +243,34 @@ function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo,
         lastTo = to
         lastKind = kind
     }
+}
+
+# Whether the statement returns something else than what stands for nothing.
+function returnsMore(from, to) {
+    return token[from] == "return" && to - from > 1 &&
+        text(begin[from + 1], finish(to - 1)) !~ /^(false|true|0|nullptr|std::nullopt|{})$/
+}
+
+# Whether the body is that of a lambda that does not say what it returns.
+function deducesReturn(opening) {
+    for (--opening; token[opening] ~ /^(mutable|noexcept|const)$/; --opening) {}
+    if (token[opening] == ")") opening = partner[opening] - 1
+    return token[opening] == "]"
+}
+
+function setOneObject(first, second,    here, there) {
+    here = setter(first)
+    there = setter(second)
+    if (!here || !there || token[here] == token[there]) return 0
+    return text(begin[first], begin[here] - 1) == text(begin[second], begin[there] - 1)
+}
+
+# The name of the property that the statement sets of an object that has a name: `view->setText(...)`,
+# or `style.spacing = 8`; 0 where it does something else.
+function setter(i) {
+    for (; isWord(i) && token[i + 1] ~ /^(->|\.)$/; i += 2) {}
+    if (token[i - 1] !~ /^(->|\.)$/) return 0
+    return token[i] ~ /^set[A-Z]/ && token[i + 1] == "(" || token[i + 1] == "=" ? i : 0
 }
 
 function statementEnd(from, closing,    i) {
