@@ -207,6 +207,7 @@ QString SettingsHost::noticeOfDied() {
 
 std::expected<void, std::string> SettingsHost::loadWindow(const Arguments& arguments,
                                                           const QString& notice) {
+    // NOLINTNEXTLINE(cppcoreguidelines-owning-memory): the engine owns it
     _engine->addImageProvider(QLatin1String(ApplicationIcons::kProvider), new ApplicationIcons);
     QQmlContext* const context = _engine->rootContext();
     context->setContextProperty(QStringLiteral("appearance"), &_appearance);

@@ -28,7 +28,7 @@ class BundleDependencies : public testing::TestWithParam<const char*> {};
 TEST_P(BundleDependencies, ABundleNeedsThePlatformTheRuntimeAndLibcOnly) {
     std::string allowed =
         R"((libnimbra-platform|libstdc\+\+|libgcc_s|libc|libm|ld-linux.*)\.so\..*)";
-#if defined(__SANITIZE_ADDRESS__) || defined(__SANITIZE_THREAD__)
+#ifdef NIMBRA_SANITIZED
     allowed += R"(|lib(asan|ubsan|tsan)\.so\..*)";
 #endif
 

@@ -16,7 +16,8 @@ protected:
     /// The bundle of that class.
     [[nodiscard]] std::shared_ptr<Bundle> bundleOfClassIn(const DeviceBundle& bundle) {
         const auto object = objectOf(bundle);
-        return bundles().bundleForClass(typeid(*object));
+        const SettingsListController& controller = *object;
+        return bundles().bundleForClass(typeid(controller));
     }
 
 private:
@@ -130,11 +131,12 @@ TEST_F(DeviceBundlesTest, AClassOfNoLoadedBundleHasNone) {
     ClassRegistry otherClasses;
     const DeviceBundles others(paths(), settings(), otherClasses, log());
     const auto object = objectOf(*bundle);
+    const SettingsListController& controller = *object;
 
     EXPECT_EQ(bundles().bundleForClass(typeid(DeviceBundles)), nullptr);
     EXPECT_EQ(bundles().bundleForClass(typeid(SettingsListController)), nullptr);
     EXPECT_EQ(bundles().bundleForClass(typeid(int)), nullptr);
-    EXPECT_EQ(others.bundleForClass(typeid(*object)), nullptr);
+    EXPECT_EQ(others.bundleForClass(typeid(controller)), nullptr);
 }
 
 TEST_F(DeviceBundlesTest, WhatIsNoFolderIsNoBundle) {

@@ -56,7 +56,7 @@ TEST(MrctlEndingTest, OutputThatCannotBeWrittenIsOneLineAndStatusOne) {
 }
 
 // The sanitizers need far more memory than they are given here.
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#ifndef NIMBRA_SANITIZED
 TEST(MrctlEndingTest, TooLittleMemoryIsOneLineAndLeavesNothing) {
     const Diagnosis diagnosis;
     diagnosis.make({});
