@@ -19,10 +19,17 @@ namespace {
 
 constexpr mode_t readableByEverybody = 0755;
 
-/// `path` as an absolute one, without a slash at its end.
-std::filesystem::path absoluteName(const std::filesystem::path& path) {
+/// `path` as an absolute one, without a slash at its end. There is none for an empty path, nor in a
+/// working directory that has been removed.
+std::expected<std::filesystem::path, Error> absoluteName(const std::filesystem::path& path) {
+    if (path.empty()) {
+        return std::unexpected(deviceError("the name of a directory is empty"));
+    }
     std::error_code failure;
-    auto name = std::filesystem::absolute(path, failure).lexically_normal();
+    const auto name = std::filesystem::absolute(path, failure).lexically_normal();
+    if (failure) {
+        return std::unexpected(fileError(path, "cannot be made", failure.value()));
+    }
     return name.has_filename() ? name : name.parent_path();
 }
 
@@ -60,8 +67,12 @@ std::expected<void, Error> moveTo(const std::filesystem::path& from,
 } // namespace
 
 std::expected<StagedDirectory, Error> StagedDirectory::start(const std::filesystem::path& target) {
+    const auto absolute = absoluteName(target);
+    if (!absolute) {
+        return std::unexpected(absolute.error());
+    }
     StagedDirectory staged;
-    staged._target = absoluteName(target);
+    staged._target = *absolute;
     std::error_code failure;
     staged._targetExists = std::filesystem::exists(staged._target, failure);
     if (staged._targetExists) {
@@ -109,7 +120,8 @@ StagedDirectory::~StagedDirectory() {
 std::expected<void, Error> StagedDirectory::makeParents() {
     std::vector<std::filesystem::path> missing;
     std::error_code failure;
-    for (auto parent = _target.parent_path(); !std::filesystem::exists(parent, failure);
+    for (auto parent = _target.parent_path();
+         parent.has_relative_path() && !std::filesystem::exists(parent, failure);
          parent = parent.parent_path()) {
         missing.push_back(parent);
     }

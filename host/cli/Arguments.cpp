@@ -69,7 +69,8 @@ private:
         _deviceOptions = {
             _app.add_option("--root", _arguments.root,
                             "The device (default: ~/.local/state/nimbra/device)")
-                ->type_name("DIR"),
+                ->type_name("DIR")
+                ->check(host::problemOfPath),
             _app.add_option("--account", _arguments.account,
                             "The account (default: the device's first)")
                 ->type_name("ID"),
@@ -82,7 +83,8 @@ private:
             ->check(host::problemOfLanguage);
         _app.add_option("--bundle", _arguments.bundle,
                         "The page's bundle (default: the installed one)")
-            ->type_name("DIR");
+            ->type_name("DIR")
+            ->check(host::problemOfPath);
     }
 
     CLI::App* add(Command command, const std::string& name, const std::string& summary) {
@@ -130,19 +132,23 @@ private:
         CLI::App* init = add(Command::init, "init", "Make a device directory");
         init->add_option("DIR", _arguments.directory, "Where; must not exist or be empty")
             ->required()
-            ->type_name("");
+            ->type_name("")
+            ->check(host::problemOfPath);
         init->add_option("--from", _arguments.from,
                          "The device's description (default: the sample's)")
-            ->type_name("DEVICE.json");
+            ->type_name("DEVICE.json")
+            ->check(host::problemOfPath);
 
         CLI::App* play = add(Command::play, "play", "Play a scenario and print a trace of it");
         play->add_option("SCENARIO", _arguments.scenario,
                          "The scenario's file; - for standard input")
             ->required()
-            ->type_name("");
+            ->type_name("")
+            ->check(host::problemOfPath);
         play->add_option("--keep", _arguments.keep,
                          "Keep the device here; must not exist or be empty")
-            ->type_name("DIR");
+            ->type_name("DIR")
+            ->check(host::problemOfPath);
         play->footer(
             "A scenario describes a device and what is done on it, step by step. The trace\n"
             "is one JSON object a line. Exit status: 1 for a step that could not be done,\n"

@@ -9,4 +9,8 @@ std::string problemOfLanguage(const std::string& tag) {
                                       : '"' + tag + "\" is not a language tag such as \"de-DE\"";
 }
 
+std::string problemOfPath(const std::string& path) {
+    return path.empty() ? "is empty" : "";
+}
+
 } // namespace nimbra::host

@@ -13,6 +13,9 @@ namespace nimbra::host {
 /// What is wrong with `tag` as a language that the user names; empty for nothing.
 [[nodiscard]] std::string problemOfLanguage(const std::string& tag);
 
+/// What is wrong with `path` as a path that the user names; empty for nothing.
+[[nodiscard]] std::string problemOfPath(const std::string& path);
+
 /// Reads a command line of these words into `Arguments` by a `Parser`, which has a `parse` that
 /// throws an `Error` and gives its program by `app`. The exit status where the program is to end
 /// at once, because help or the version was asked for, or because the line makes no sense. That

@@ -62,7 +62,8 @@ private:
         const auto ownDevice = [this](CLI::Option* option) { _deviceOptions.push_back(option); };
         ownDevice(_app.add_option("--root", _arguments.root,
                                   "The device (default: ~/.local/state/nimbra/device)")
-                      ->type_name("DIR"));
+                      ->type_name("DIR")
+                      ->check(host::problemOfPath));
         ownDevice(_app.add_option("--account", _arguments.account,
                                   "The account (default: the device's first)")
                       ->type_name("ID"));
@@ -74,7 +75,8 @@ private:
             ->check(host::problemOfLanguage);
         _app.add_option("--bundle", _arguments.bundle,
                         "The page's bundle (default: the installed one)")
-            ->type_name("DIR");
+            ->type_name("DIR")
+            ->check(host::problemOfPath);
     }
 
     void addWindowOptions() {
@@ -86,6 +88,7 @@ private:
             _app.add_option("--scenario", _arguments.scenario,
                             "Play this scenario before the user's eyes, on a device of its own")
                 ->type_name("FILE")
+                ->check(host::problemOfPath)
                 ->excludes(_row);
         for (CLI::Option* option : _deviceOptions) {
             scenario->excludes(option);

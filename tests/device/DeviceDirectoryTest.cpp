@@ -291,6 +291,13 @@ TEST_F(DeviceDirectoryTest, ADeviceWithADamagedFileIsNotChanged) {
     EXPECT_EQ(treeOf(place()), before);
 }
 
+TEST_F(DeviceDirectoryTest, AnEmptyNameMakesNoDevice) {
+    const auto created = createDeviceDirectory("", {});
+
+    ASSERT_FALSE(created);
+    EXPECT_EQ(created.error().description, "the name of a directory is empty");
+}
+
 TEST_F(DeviceDirectoryTest, APartThatCannotBeWrittenIsReported) {
     create();
     std::filesystem::remove(state("restrictions.json"));

@@ -10,6 +10,11 @@ namespace nimbra::mrctl {
 
 namespace {
 
+/// What is wrong with `path` as a path that the user names; empty for nothing.
+std::string problemOfPath(const std::string& path) {
+    return path.empty() ? "is empty" : "";
+}
+
 void addDiagnose(CLI::App& app, Arguments& arguments) {
     CLI::App* const command =
         app.add_subcommand("diagnose", "Write an archive for somebody who looks for a fault");
@@ -17,9 +22,7 @@ void addDiagnose(CLI::App& app, Arguments& arguments) {
     command->add_option("PATH", arguments.path, "The archive, usually called NAME.tar.gz")
         ->required()
         ->type_name("")
-        ->check([](const std::string& path) {
-            return path.empty() ? std::string("is empty") : std::string();
-        });
+        ->check(problemOfPath);
     command->add_flag("--no-logarchive", arguments.withoutLog, "Leave the log out");
     command->footer("Names, addresses, tokens and the like stand as pseudonyms in it.");
 }
@@ -54,7 +57,8 @@ std::expected<Arguments, int> Arguments::parse(int count, char** words) {
         ->description("Print the version and end");
     app.set_help_flag("-h,--help", "Say this and end");
     app.add_option("--root", arguments.root, "The device (default: this machine)")
-        ->type_name("DIR");
+        ->type_name("DIR")
+        ->check(problemOfPath);
     addDiagnose(app, arguments);
     addStatus(app, arguments);
     try {

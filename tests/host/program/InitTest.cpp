@@ -62,6 +62,20 @@ TEST(Init, RefusesADescriptionWithItsPlaceAndMakesNothing) {
     EXPECT_FALSE(std::filesystem::exists(program.path("device")));
 }
 
+TEST(Init, SaysThatTheWorkingDirectoryIsGone) {
+    const Program program;
+    program.write("gone/file", "");
+
+    const auto result = program.runOther(
+        {"sh", "-c", "cd \"$1\" && rm -r \"$1\" && exec \"$2\" init phone --from \"$3\"", "sh",
+         program.path("gone").string(), NIMBRA_SETTINGSCTL,
+         program.write("phone.json", "{}").string()});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.output, "");
+    EXPECT_EQ(result.messages, "settingsctl: phone: cannot be made: No such file or directory\n");
+}
+
 TEST(Init, LeavesADirectoryThatIsInUseAsItIs) {
     const Program program;
     program.write("used/file", "mine");

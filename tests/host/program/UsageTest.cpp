@@ -22,6 +22,12 @@ TEST(Usage, AMistakeOnTheCommandLineIsOneLineAndMakesNothing) {
         {"--unknown", "list"},
         {"play", "--root", "somewhere", "scenario.json"},
         {"init", "--account", "a", "somewhere"},
+        {"--root", "", "list"},
+        {"--bundle", "", "list"},
+        {"init", ""},
+        {"init", "somewhere", "--from", ""},
+        {"play", ""},
+        {"play", "scenario.json", "--keep", ""},
     };
     for (const auto& arguments : mistakes) {
         const Program program;
@@ -35,6 +41,17 @@ TEST(Usage, AMistakeOnTheCommandLineIsOneLineAndMakesNothing) {
         EXPECT_EQ(result.messages.find('\n'), result.messages.size() - 1) << result.messages;
         EXPECT_FALSE(std::filesystem::exists(program.path("state")));
     }
+}
+
+TEST(Usage, AnEmptyPathIsNamed) {
+    const Program program;
+
+    EXPECT_EQ(program.run({"--root", "", "list"}).messages,
+              "settingsctl: --root: is empty (see settingsctl --help)\n");
+    EXPECT_EQ(program.run({"init", ""}).messages,
+              "settingsctl: DIR: is empty (see settingsctl --help)\n");
+    EXPECT_EQ(program.run({"--bundle", "", "list"}).messages,
+              "settingsctl: --bundle: is empty (see settingsctl --help)\n");
 }
 
 TEST(Usage, HelpNamesEveryCommand) {

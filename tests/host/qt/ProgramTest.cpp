@@ -148,6 +148,16 @@ TEST_F(Program, APictureWithoutANameIsABadOption) {
         "settingshost: --screenshot: the name of a file expected (see settingshost --help)\n");
 }
 
+TEST_F(Program, APathThatIsEmptyIsABadOption) {
+    for (const std::string option : {"--root", "--bundle", "--scenario"}) {
+        const auto result = run({option, "", "--screenshot", place("picture.png").string()});
+
+        EXPECT_EQ(result.status, 2);
+        EXPECT_EQ(result.messages,
+                  "settingshost: " + option + ": is empty (see settingshost --help)\n");
+    }
+}
+
 TEST_F(Program, ALanguageThatIsNoneIsABadOption) {
     const auto result = run({"--locale", "x!"});
 

@@ -14,10 +14,18 @@ ProgramResult run(std::vector<std::string> arguments) {
 }
 
 TEST(MrctlUsageTest, BadArgumentsAreOneLineAndStatusTwo) {
-    const std::vector<std::vector<std::string>> lines{
-        {},          {"diagnose"},        {"diagnose", ""},           {"diagnose", "a", "b"},
-        {"unknown"}, {"status", "extra"}, {"status", "--no"},         {"status", "--no-logarchive"},
-        {"--root"},  {"--wrong\nline"},   {"diagnose", "--json", "a"}};
+    const std::vector<std::vector<std::string>> lines{{},
+                                                      {"diagnose"},
+                                                      {"diagnose", ""},
+                                                      {"diagnose", "a", "b"},
+                                                      {"unknown"},
+                                                      {"status", "extra"},
+                                                      {"status", "--no"},
+                                                      {"status", "--no-logarchive"},
+                                                      {"--root"},
+                                                      {"--wrong\nline"},
+                                                      {"diagnose", "--json", "a"},
+                                                      {"--root", "", "status"}};
     for (const auto& line : lines) {
         const ProgramResult result = run(line);
         EXPECT_EQ(result.status, 2) << result.messages;
