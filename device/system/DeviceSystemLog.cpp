@@ -3,6 +3,7 @@
 #include "device/DeviceError.h"
 #include "device/files/Descriptor.h"
 
+#include <cerrno>
 #include <cstdlib>
 #include <fcntl.h>
 #include <filesystem>
@@ -12,8 +13,10 @@
 #include <spdlog/sinks/rotating_file_sink.h>
 #include <string>
 #include <string_view>
+#include <sys/stat.h>
 #include <sys/uio.h>
 #include <syslog.h>
+#include <system_error>
 #include <systemd/sd-journal.h>
 #include <utility>
 #include <vector>
@@ -39,6 +42,29 @@ int priorityOf(LogLevel level) {
 void writeToStandardError(const std::string& line) {
     // One insertion, so that the lines of two threads do not mix.
     std::cerr << std::string(programName) + ": " + line + '\n';
+}
+
+/// The system's words in what the library says of a failure: it names the file, but not as its user
+/// knows it, and the reason behind it.
+std::string reasonIn(const std::string& said) {
+    const auto colon = said.rfind(": ");
+    return colon == std::string::npos ? said : said.substr(colon + 2);
+}
+
+/// Makes the file at `place`, with its folders, as the library would, which does not say why it
+/// fails. Gives 0, or the errno.
+int makeFile(const std::filesystem::path& place) {
+    std::error_code failure;
+    std::filesystem::create_directories(place.parent_path(), failure);
+    if (failure) {
+        return failure.value();
+    }
+    constexpr mode_t asMasked = 0666;
+    // Nobody is waited for where a pipe stands.
+    const Descriptor file(::open(place.c_str(),
+                                 O_WRONLY | O_APPEND | O_CREAT | O_NONBLOCK | O_NOCTTY | O_CLOEXEC,
+                                 asMasked));
+    return file.isOpen() ? 0 : errno;
 }
 
 } // namespace
@@ -73,18 +99,23 @@ private:
         // and one in the place of a device that has been removed meanwhile would come back.
         const auto place = std::filesystem::path("/proc/self/fd") / std::to_string(_root.number()) /
                            path->lexically_relative(paths.root());
+        if (const int failure = makeFile(place); failure != 0) {
+            writeToStandardError(fileError(*path, "cannot be made", failure).description);
+            return;
+        }
         try {
             _logger = std::make_unique<spdlog::logger>(
                 programName, std::make_shared<spdlog::sinks::rotating_file_sink_mt>(
                                  place.string(), largest, earlierFiles));
         } catch (const spdlog::spdlog_ex& exception) {
-            writeToStandardError(oneLine(path->string() + ": " + exception.what()));
+            writeToStandardError(
+                oneLine(path->string() + ": cannot be opened: " + reasonIn(exception.what())));
             return;
         }
         _logger->set_pattern("%Y-%m-%dT%H:%M:%S.%e%z %v");
         _logger->flush_on(spdlog::level::trace);
-        _logger->set_error_handler([name = path->string()](const std::string& reason) {
-            writeToStandardError(oneLine(name + ": " + reason));
+        _logger->set_error_handler([name = path->string()](const std::string& said) {
+            writeToStandardError(oneLine(name + ": cannot be written: " + reasonIn(said)));
         });
     }
 

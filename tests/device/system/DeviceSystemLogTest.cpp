@@ -1,14 +1,18 @@
 #include "device/system/DeviceSystemLog.h"
 
+#include "tests/device/FullDisk.h"
+#include "tests/device/ReadOnly.h"
 #include "tests/device/TestFiles.h"
 #include "tests/device/Threads.h"
 #include "tests/support/TemporaryDirectory.h"
 
-#include <algorithm>
 #include <cstdlib>
 #include <gtest/gtest.h>
+#include <iostream>
 #include <regex>
+#include <sstream>
 #include <string>
+#include <sys/stat.h>
 #include <vector>
 
 namespace nimbra::device {
@@ -96,9 +100,8 @@ TEST_F(DeviceSystemLogTest, AFileThatCannotBeOpenedIsToldOnceAndErrorsStillShow)
     systemLog.write(LogLevel::error, "failed");
 
     const std::string shown = testing::internal::GetCapturedStderr();
-    EXPECT_TRUE(shown.starts_with("nimbra-settings: " + file().string() + ": ")) << shown;
-    EXPECT_TRUE(shown.ends_with("\nnimbra-settings: error: failed\n")) << shown;
-    EXPECT_EQ(std::ranges::count(shown, '\n'), 2);
+    EXPECT_EQ(shown, "nimbra-settings: " + file().string() +
+                         ": cannot be made: Not a directory\nnimbra-settings: error: failed\n");
     EXPECT_EQ(test::contentOf(root() / "var/log"), "in the way");
 }
 
@@ -114,8 +117,52 @@ TEST_F(DeviceSystemLogTest, ADeviceThatIsRemovedDoesNotComeBackWithItsLog) {
     EXPECT_FALSE(std::filesystem::exists(device));
     const std::string shown = testing::internal::GetCapturedStderr();
     const std::string place = (device / "var/log/nimbra/settings.log").string();
-    EXPECT_TRUE(shown.starts_with("nimbra-settings: " + place + ": ")) << shown;
-    EXPECT_EQ(std::ranges::count(shown, '\n'), 1);
+    EXPECT_EQ(shown, "nimbra-settings: " + place + ": cannot be made: No such file or directory\n");
+}
+
+TEST_F(DeviceSystemLogTest, OnADeviceThatCanOnlyBeReadTheLineNamesItsFileAndTheReason) {
+    DeviceSystemLog systemLog = log();
+    testing::internal::CaptureStderr();
+
+    {
+        const test::ReadOnly readOnly(root());
+        systemLog.write(LogLevel::standard, "did");
+    }
+
+    EXPECT_EQ(testing::internal::GetCapturedStderr(),
+              "nimbra-settings: " + file().string() + ": cannot be made: Permission denied\n");
+    EXPECT_TRUE(test::treeOf(root()).empty());
+}
+
+TEST_F(DeviceSystemLogTest, APipeInThePlaceOfTheFileIsNotWaitedFor) {
+    std::filesystem::create_directories(file().parent_path());
+    ASSERT_EQ(::mkfifo(file().c_str(), 0600), 0);
+    DeviceSystemLog systemLog = log();
+    testing::internal::CaptureStderr();
+
+    systemLog.write(LogLevel::standard, "did");
+
+    EXPECT_EQ(testing::internal::GetCapturedStderr(),
+              "nimbra-settings: " + file().string() +
+                  ": cannot be made: No such device or address\n");
+}
+
+TEST_F(DeviceSystemLogTest, ALineThatFindsNoRoomIsToldWithTheReason) {
+    DeviceSystemLog systemLog = log();
+    systemLog.write(LogLevel::standard, "did");
+    // On no disk, which is full for every file.
+    std::ostringstream shown;
+    std::streambuf* const usual = std::cerr.rdbuf(shown.rdbuf());
+
+    {
+        const test::FullDisk full;
+        systemLog.write(LogLevel::standard, "did more");
+    }
+
+    std::cerr.rdbuf(usual);
+    EXPECT_EQ(linesOfFile(), "default: did\n");
+    EXPECT_EQ(shown.str(),
+              "nimbra-settings: " + file().string() + ": cannot be written: File too large\n");
 }
 
 TEST_F(DeviceSystemLogTest, ManyThreadsMayWriteWholeLines) {
