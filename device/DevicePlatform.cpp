@@ -1,6 +1,5 @@
 #include "device/DevicePlatform.h"
 
-#include "device/DeviceError.h"
 #include "device/accounts/DeviceListService.h"
 #include "device/apps/ApplicationFolders.h"
 #include "device/apps/DeviceAppTerminator.h"
@@ -14,6 +13,7 @@
 #include "device/documents/DeviceProgressReports.h"
 #include "device/documents/ProgressFolder.h"
 #include "device/documents/ProgressPublisher.h"
+#include "device/files/Folders.h"
 #include "device/store/DeviceAccountStore.h"
 #include "device/store/DevicePrivacyConsentStore.h"
 #include "device/system/DeviceAbilities.h"
@@ -29,7 +29,6 @@
 #include "device/system/DeviceWorkQueues.h"
 #include "platform/system/ClassRegistry.h"
 
-#include <system_error>
 #include <utility>
 
 namespace nimbra::device {
@@ -121,15 +120,8 @@ struct DevicePlatform::Parts {
 namespace {
 
 std::expected<void, Error> checkState(const DevicePaths& paths) {
-    const auto state = paths.resolve(kStateDirectory);
-    if (!state) {
-        return std::unexpected(state.error());
-    }
-    std::error_code failure;
-    if (!std::filesystem::is_directory(*state, failure)) {
-        return std::unexpected(deviceError(paths.root().string() +
-                                           ": not a device directory: it has no folder " +
-                                           std::string(kStateDirectory.substr(1))));
+    if (auto checked = checkStateFolder(paths); !checked) {
+        return checked;
     }
     for (const DescriptionFile* file : {&restrictionsFile, &documentsFile}) {
         if (const auto description = readDescriptionFile(paths, *file); !description) {

@@ -57,6 +57,24 @@ int madeAt(const Descriptor& parent, const std::string& name, const FolderMaking
 
 } // namespace
 
+std::expected<void, Error> checkStateFolder(const DevicePaths& paths) {
+    const auto state = paths.resolve(kStateDirectory);
+    if (!state) {
+        return std::unexpected(state.error());
+    }
+    std::error_code failure;
+    switch (std::filesystem::status(*state, failure).type()) {
+    case std::filesystem::file_type::directory:
+        return {};
+    case std::filesystem::file_type::none:
+        return std::unexpected(fileError(*state, "cannot be read", failure.value()));
+    default:
+        return std::unexpected(deviceError(paths.root().string() +
+                                           ": not a device directory: it has no folder " +
+                                           std::string(kStateDirectory.substr(1))));
+    }
+}
+
 int makeFolderAt(const DevicePaths& paths, const std::filesystem::path& place,
                  const FolderMaking& making) {
     std::vector<std::string> names = namesBelowRoot(paths, place);

@@ -13,6 +13,10 @@ namespace nimbra::device {
 
 // Folders of the device; any thread.
 
+/// Whether what `paths` leads to is laid out as a device: it has the folder of a device's state.
+/// The error says that it has none, or why that cannot be seen.
+[[nodiscard]] std::expected<void, Error> checkStateFolder(const DevicePaths& paths);
+
 /// How a folder is made.
 struct FolderMaking {
     /// Whether folders that are missing above it are made, and one that stands there will do.

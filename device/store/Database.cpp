@@ -5,9 +5,11 @@
 
 #include <SQLiteCpp/SQLiteCpp.h>
 #include <cerrno>
+#include <fcntl.h>
 #include <map>
 #include <sqlite3.h>
 #include <system_error>
+#include <unistd.h>
 #include <utility>
 
 namespace nimbra::device {
@@ -47,8 +49,9 @@ bool hasPendingChanges(const std::filesystem::path& path) {
     return !absent && size > 0;
 }
 
-/// Whether all that stands at and beside `path` for the database are plain files, in the place of
-/// which a pipe, for example, would be waited for.
+/// Whether the file at `path` can be read, and all that stands there and beside it for the database
+/// are plain files, in the place of which a pipe, for example, would be waited for. An error of the
+/// domain POSIX says why it cannot be read.
 std::expected<void, Error> checkFiles(const std::filesystem::path& path) {
     std::error_code failure;
     // The library would make others, or do without them.
@@ -62,6 +65,11 @@ std::expected<void, Error> checkFiles(const std::filesystem::path& path) {
     failure.clear();
     const auto status = std::filesystem::status(path, failure);
     if (std::filesystem::is_regular_file(status)) {
+        // The library would only say that it cannot open it. To open it here as well and close it
+        // again would give up the locks that this process has on it.
+        if (::faccessat(AT_FDCWD, path.c_str(), R_OK, AT_EACCESS) != 0) {
+            return std::unexpected(fileError(path, "cannot be read", errno));
+        }
         return {};
     }
     if (!failure && std::filesystem::exists(status) && !std::filesystem::is_directory(status)) {

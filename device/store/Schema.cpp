@@ -73,8 +73,12 @@ std::expected<void, Error> migrate(const Schema& schema, Database& database) {
     });
 }
 
-/// `error` of the database at `path`, told as the reason why it is none of the schema's kind.
+/// `error` of the database at `path`, told as the reason why it is none of the schema's kind. Of a
+/// file that cannot be read nobody knows that.
 Error notOfKind(const Schema& schema, const std::filesystem::path& path, const Error& error) {
+    if (error.domain == "POSIX") {
+        return error;
+    }
     const std::string start = path.string() + ": ";
     const bool namesPath = error.description.starts_with(start);
     return deviceError(start + "not " + std::string(schema.kind) + ": " +

@@ -303,6 +303,17 @@ TEST_F(DevicePlatformTest, ADirectoryThatIsNoDeviceIsReported) {
     EXPECT_FALSE(std::filesystem::exists(root() / "none"));
 }
 
+TEST_F(DevicePlatformTest, AStateThatCannotBeSeenIsReportedWithTheReason) {
+    std::filesystem::create_symlink("round", root() / "round");
+
+    const auto platform = DevicePlatform::open(root() / "round", mainQueue());
+
+    ASSERT_FALSE(platform);
+    EXPECT_EQ(platform.error().description,
+              (root() / "round/var/lib/nimbra").string() +
+                  ": cannot be read: Too many levels of symbolic links");
+}
+
 TEST_F(DevicePlatformTest, EachMissingFileIsReported) {
     for (const char* const name : {"device.json", "restrictions.json", "documents.json"}) {
         const std::string content = test::contentOf(state(name));
@@ -311,8 +322,7 @@ TEST_F(DevicePlatformTest, EachMissingFileIsReported) {
         test::writeTestFile(state(name), content);
     }
     std::filesystem::remove(state("accounts.db"));
-    expectRefusal("accounts.db",
-                  "not an account database: cannot be read: No such file or directory");
+    expectRefusal("accounts.db", "cannot be read: No such file or directory");
 }
 
 TEST_F(DevicePlatformTest, EachDamagedFileIsReportedWithItsPlaceAndLeftAsItWas) {

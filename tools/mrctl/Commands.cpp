@@ -2,6 +2,7 @@
 
 #include "device/DeviceError.h"
 #include "device/description/DescriptionFiles.h"
+#include "device/files/Folders.h"
 #include "tools/mrctl/ArchiveFile.h"
 #include "tools/mrctl/DeviceContents.h"
 #include "tools/mrctl/Report.h"
@@ -9,7 +10,6 @@
 
 #include <cerrno>
 #include <ostream>
-#include <string_view>
 #include <system_error>
 
 namespace nimbra::mrctl {
@@ -39,12 +39,8 @@ std::expected<void, Error> diagnose(const Arguments& arguments, const DevicePath
 
 std::expected<void, Error> showStatus(const Arguments& arguments, const DevicePaths& paths,
                                       std::ostream& output) {
-    const auto state = paths.resolve(device::kStateDirectory);
-    std::error_code failure;
-    if (!state || !std::filesystem::is_directory(*state, failure)) {
-        return std::unexpected(device::deviceError(paths.root().string() +
-                                                   ": not a device directory: it has no folder " +
-                                                   std::string(device::kStateDirectory.substr(1))));
+    if (auto checked = device::checkStateFolder(paths); !checked) {
+        return checked;
     }
     const auto contents = DeviceContents::read(paths, false);
     for (const auto& [part, what] : contents.problems) {

@@ -29,6 +29,44 @@ private:
     test::TemporaryDirectory _directory;
 };
 
+TEST_F(FoldersTest, ADeviceIsKnownByTheFolderOfItsState) {
+    const auto expectNone = [this] {
+        const auto checked = checkStateFolder(DevicePaths(root()));
+        ASSERT_FALSE(checked);
+        EXPECT_EQ(checked.error().description,
+                  root().string() + ": not a device directory: it has no folder var/lib/nimbra");
+    };
+    expectNone();
+    std::filesystem::create_directories(root() / "var/lib");
+    std::ofstream(root() / "var/lib/nimbra") << "in the way";
+    expectNone();
+
+    std::filesystem::remove(root() / "var/lib/nimbra");
+    std::filesystem::create_directory(root() / "var/lib/nimbra");
+
+    EXPECT_TRUE(checkStateFolder(DevicePaths(root())));
+}
+
+TEST_F(FoldersTest, AStateThatCannotBeSeenIsNotTakenForNone) {
+    using std::filesystem::perms;
+    std::filesystem::create_directories(root() / "var/lib/nimbra");
+    const auto other = root() / "other";
+    std::filesystem::create_directory(other);
+    std::filesystem::permissions(root().parent_path(), perms(0755));
+    std::filesystem::permissions(root() / "var", perms::none);
+
+    const auto checked = [&] {
+        // Root sees everything, so the test is somebody else for a while.
+        const test::ReadOnly readOnly(other);
+        return checkStateFolder(DevicePaths(root()));
+    }();
+    std::filesystem::permissions(root() / "var", perms::owner_all);
+
+    ASSERT_FALSE(checked);
+    EXPECT_EQ(checked.error().description,
+              (root() / "var/lib/nimbra").string() + ": cannot be read: Permission denied");
+}
+
 TEST_F(FoldersTest, AFolderIsMadeWithThoseAboveIt) {
     const auto made = make("/run/nimbra/progress");
 

@@ -44,9 +44,11 @@ protected:
         const auto before = test::treeOf(directory());
         const auto database = AccountDatabase::open(path());
         ASSERT_FALSE(database);
-        EXPECT_EQ(database.error().description,
-                  path().string() + ": not an account database: " + reason);
+        EXPECT_EQ(database.error().description, path().string() + ": " + reason);
         EXPECT_EQ(test::treeOf(directory()), before);
+    }
+    void expectNoDatabase(const std::string& reason) const {
+        expectRefusal("not an account database: " + reason);
     }
 
 private:
@@ -204,24 +206,24 @@ TEST_F(AccountDatabaseTest, ADirectoryInItsPlaceIsReported) {
 
 TEST_F(AccountDatabaseTest, AFileThatIsNoDatabaseIsReportedAndLeftAsItWas) {
     test::writeTestFile(path(), std::string(5000, 'x'));
-    expectRefusal("file is not a database");
+    expectNoDatabase("file is not a database");
 }
 
 TEST_F(AccountDatabaseTest, AnEmptyFileIsReportedAndLeftAsItWas) {
     test::writeTestFile(path(), "");
-    expectRefusal("it has no version");
+    expectNoDatabase("it has no version");
 }
 
 TEST_F(AccountDatabaseTest, ADatabaseOfAnotherProgramIsReportedAndLeftAsItWas) {
     SQLite::Database(path().string(), SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE)
         .exec("CREATE TABLE notes (t); PRAGMA user_version = 1");
-    expectRefusal("no such table: accounts");
+    expectNoDatabase("no such table: accounts");
 }
 
 TEST_F(AccountDatabaseTest, ADatabaseOfALaterVersionIsReportedAndLeftAsItWas) {
     create({{.identifier = "a"}});
     execute("PRAGMA user_version = 7");
-    expectRefusal("it has version 7, this program knows up to 1");
+    expectNoDatabase("it has version 7, this program knows up to 1");
 }
 
 TEST_F(AccountDatabaseTest, ADamagedDatabaseIsReportedAndLeftAsItWas) {

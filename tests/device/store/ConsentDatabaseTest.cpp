@@ -59,10 +59,12 @@ protected:
         const auto before = test::treeOf(directory());
         const auto database = ConsentDatabase::open(path());
         ASSERT_FALSE(database);
-        EXPECT_TRUE(database.error().description.starts_with(path().string() +
-                                                             ": not a consent database: " + reason))
+        EXPECT_TRUE(database.error().description.starts_with(path().string() + ": " + reason))
             << database.error();
         EXPECT_EQ(test::treeOf(directory()), before);
+    }
+    void expectNoDatabase(const std::string& reason) const {
+        expectRefusal("not a consent database: " + reason);
     }
 
 private:
@@ -247,24 +249,24 @@ TEST_F(ConsentDatabaseTest, ADirectoryInItsPlaceIsReported) {
 
 TEST_F(ConsentDatabaseTest, AFileThatIsNoDatabaseIsReportedAndLeftAsItWas) {
     test::writeTestFile(path(), std::string(5000, 'x'));
-    expectRefusal("file is not a database");
+    expectNoDatabase("file is not a database");
 }
 
 TEST_F(ConsentDatabaseTest, AnEmptyFileIsReportedAndLeftAsItWas) {
     test::writeTestFile(path(), "");
-    expectRefusal("it has no version");
+    expectNoDatabase("it has no version");
 }
 
 TEST_F(ConsentDatabaseTest, ADatabaseOfAnotherKindIsReportedAndLeftAsItWas) {
     SQLite::Database(path().string(), SQLite::OPEN_READWRITE | SQLite::OPEN_CREATE)
         .exec("CREATE TABLE accounts (t); PRAGMA user_version = 1");
-    expectRefusal("no such table: consent");
+    expectNoDatabase("no such table: consent");
 }
 
 TEST_F(ConsentDatabaseTest, ADatabaseOfALaterVersionIsReportedAndLeftAsItWas) {
     create({{.service = tidewater, .bundle = "a"}});
     execute("PRAGMA user_version = 7");
-    expectRefusal("it has version 7, this program knows up to 1");
+    expectNoDatabase("it has version 7, this program knows up to 1");
 }
 
 TEST_F(ConsentDatabaseTest, ADamagedDatabaseIsReportedAndLeftAsItWas) {
@@ -274,7 +276,7 @@ TEST_F(ConsentDatabaseTest, ADamagedDatabaseIsReportedAndLeftAsItWas) {
     std::ranges::fill(bytes.begin() + 4096, bytes.end(), '\xa5');
     test::writeTestFile(path(), bytes);
 
-    expectRefusal("it is damaged: ");
+    expectNoDatabase("it is damaged: ");
 }
 
 TEST_F(ConsentDatabaseTest, TheRecordsOfAllServicesCanBeReadWithoutWriting) {

@@ -1,5 +1,6 @@
 #include "device/store/Database.h"
 
+#include "tests/device/ReadOnly.h"
 #include "tests/device/TestFiles.h"
 #include "tests/support/TemporaryDirectory.h"
 
@@ -95,6 +96,24 @@ TEST_F(DatabaseTest, AMissingFileIsNotMade) {
     EXPECT_EQ(opened.error().description,
               missing.string() + ": cannot be read: No such file or directory");
     EXPECT_FALSE(std::filesystem::exists(missing));
+}
+
+TEST_F(DatabaseTest, AFileThatMayNotBeReadIsReportedWithTheReason) {
+    using std::filesystem::perms;
+    const auto other = path().parent_path() / "other";
+    std::filesystem::create_directory(other);
+    std::filesystem::permissions(path().parent_path(), perms(0755));
+    std::filesystem::permissions(path(), perms::none);
+
+    for (const auto access : {Database::Access::existing, Database::Access::reading}) {
+        // Root may read everything, so the test is somebody else for a while.
+        const test::ReadOnly readOnly(other);
+        const auto opened = Database::open(path(), access);
+
+        ASSERT_FALSE(opened);
+        EXPECT_EQ(opened.error().description,
+                  path().string() + ": cannot be read: Permission denied");
+    }
 }
 
 TEST_F(DatabaseTest, APipeInItsPlaceOrBesideItIsNotWaitedFor) {
