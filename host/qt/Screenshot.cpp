@@ -2,7 +2,10 @@
 
 #include "host/core/PaneSession.h"
 
+#include <QBuffer>
 #include <QQuickWindow>
+#include <QSaveFile>
+#include <QString>
 #include <chrono>
 #include <utility>
 
@@ -14,6 +17,17 @@ Screenshot::Screenshot(QQuickWindow& window, host::PaneSession& session)
     _timer.setInterval(std::chrono::milliseconds(80));
     connect(&_timer, &QTimer::timeout, this, &Screenshot::look);
     _timer.start();
+}
+
+bool Screenshot::save(const QImage& picture, const QString& place) {
+    QBuffer png;
+    if (!png.open(QIODevice::WriteOnly) || !picture.save(&png, "PNG")) {
+        return false;
+    }
+    QSaveFile file(place);
+    // What is still to be written when it commits may get lost without a word.
+    return file.open(QIODevice::WriteOnly) && file.write(png.data()) == png.size() &&
+           file.flush() && file.commit();
 }
 
 void Screenshot::look() {

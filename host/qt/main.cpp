@@ -10,7 +10,6 @@
 #include <QImage>
 #include <QMetaObject>
 #include <QQuickWindow>
-#include <QSaveFile>
 #include <QSemaphore>
 #include <csignal>
 #include <expected>
@@ -30,12 +29,6 @@ using host::exitRefused;
 int complain(const std::string& problem, int status) {
     std::cerr << "settingshost: " << problem << '\n';
     return status;
-}
-
-/// Nothing is left of a picture that cannot be written to its end.
-bool save(const QImage& picture, const QString& place) {
-    QSaveFile file(place);
-    return file.open(QIODevice::WriteOnly) && picture.save(&file, "PNG") && file.commit();
 }
 
 /// For the time in which the application is made: Qt ends a program without a display by a crash.
@@ -101,7 +94,7 @@ int runProgram(int count, char** words) {
         screenshot.emplace(window, (*host)->session());
         QObject::connect(&*screenshot, &Screenshot::taken, [&](const QImage& picture) {
             const std::string place = arguments->screenshot->string();
-            QGuiApplication::exit(save(picture, QString::fromStdString(place))
+            QGuiApplication::exit(Screenshot::save(picture, QString::fromStdString(place))
                                       ? 0
                                       : complain(place + ": cannot be written", exitRefused));
         });

@@ -3,6 +3,7 @@
 #include "host/qt/OpenPanes.h"
 #include "host/qt/ScenarioDrive.h"
 #include "host/qt/Screenshot.h"
+#include "tests/device/FullDisk.h"
 #include "tests/device/TestFiles.h"
 #include "tests/host/qt/WindowFixture.h"
 #include "tests/support/ProgramRun.h"
@@ -135,6 +136,25 @@ TEST_F(Program, APictureThatCannotBeWrittenIsOneLineAndNoFile) {
     EXPECT_EQ(result.output, "");
     EXPECT_EQ(result.messages, "settingshost: " + picture.string() + ": cannot be written\n");
     EXPECT_FALSE(std::filesystem::exists(picture.parent_path()));
+}
+
+TEST_F(Program, APictureOnAFullDiskIsNoneAndLeavesTheEarlierOne) {
+    const auto place = this->place("picture.png");
+    const QString name = QString::fromStdString(place.string());
+    QImage picture(1, 1, QImage::Format_RGB32);
+    picture.fill(Qt::white);
+    ASSERT_TRUE(Screenshot::save(picture, name));
+    const std::string before = test::contentOf(place);
+
+    {
+        const test::FullDisk full;
+        EXPECT_FALSE(Screenshot::save(picture, name));
+        EXPECT_FALSE(Screenshot::save(picture, name + QStringLiteral(".new")));
+    }
+
+    EXPECT_EQ(QImage(name).size(), QSize(1, 1));
+    EXPECT_EQ(test::contentOf(place), before);
+    EXPECT_FALSE(std::filesystem::exists(place.string() + ".new"));
 }
 
 TEST_F(Program, APictureWithoutANameIsABadOption) {
