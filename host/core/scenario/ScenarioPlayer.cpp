@@ -128,14 +128,14 @@ ScenarioPlayer::Outcome ScenarioPlayer::perform(const ScenarioStep& step) {
         return std::unexpected("this version does not know the step");
     }
     if (handler->needsPane && !_session.isPaneOpen()) {
-        return std::unexpected("no pane is open");
+        return std::unexpected("no page is open");
     }
     return (this->*handler->perform)(step);
 }
 
 ScenarioPlayer::Outcome ScenarioPlayer::open(const ScenarioStep& step) {
     if (_session.isPaneOpen()) {
-        return std::unexpected("the pane is open already");
+        return std::unexpected("the page is open already");
     }
     if (const auto opened = _session.openPane(_scenario.entry); !opened) {
         return std::unexpected(opened.error().description);

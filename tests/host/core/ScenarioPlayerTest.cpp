@@ -142,7 +142,7 @@ TEST_F(ScenarioPlayerTest, NoStepIsLeftAfterOneThatCannotBeDone) {
     ASSERT_FALSE(done);
     EXPECT_EQ(done.error().index, 0U);
     EXPECT_EQ(done.error().name, "list");
-    EXPECT_EQ(done.error().reason, "no pane is open");
+    EXPECT_EQ(done.error().reason, "no page is open");
     EXPECT_FALSE(player.hasNext());
     EXPECT_FALSE(prepared->session->isPaneOpen());
 }

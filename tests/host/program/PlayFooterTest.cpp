@@ -50,9 +50,9 @@ TEST(PlayFooter, AProgressIsPublishedOnce) {
 }
 
 TEST(PlayFooter, AStepWithoutItsFooterCannotBeDone) {
-    expectFailure(R"({"do": "footer"})", "step 0 (footer): no pane is open");
+    expectFailure(R"({"do": "footer"})", "step 0 (footer): no page is open");
     expectFailure(R"({"do": "moveFooter", "window": true})",
-                  "step 0 (moveFooter): no pane is open");
+                  "step 0 (moveFooter): no page is open");
     expectFailure(R"({"do": "open"}, {"do": "set", "row": "Nimbra Drive", "value": false},
                      {"do": "footer"})",
                   "step 2 (footer): the page shows no status footer");

@@ -104,7 +104,7 @@ TEST(PlayScreen, WithoutAnAccountTheUpgradeFailsAndSaysSo) {
 TEST(PlayScreen, AfterTheUpgradeThePageIsClosed) {
     expectRefused(play(std::string(tapUpgrade) + R"(, {"do": "tapButton", "title": "Upgrade"},
                        {"do": "alert", "choose": "Continue"}, {"do": "list"})"),
-                  "4 (list): no pane is open");
+                  "4 (list): no page is open");
 }
 
 } // namespace

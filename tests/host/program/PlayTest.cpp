@@ -124,7 +124,7 @@ TEST(Play, AStepThatNeedsAPaneFailsWithoutOne) {
         const auto result = program.run({"play", "-"}, R"({"steps": [)" + step + "]}");
 
         EXPECT_EQ(result.status, 1) << step;
-        EXPECT_TRUE(result.messages.ends_with("no pane is open\n")) << result.messages;
+        EXPECT_TRUE(result.messages.ends_with("no page is open\n")) << result.messages;
         EXPECT_TRUE(program.leftNothingBehind());
     }
 }
@@ -136,7 +136,7 @@ TEST(Play, APaneThatIsOpenIsNotOpenedAgain) {
         program.run({"play", "-"}, R"({"steps": [{"do": "open"}, {"do": "open"}]})");
 
     EXPECT_EQ(result.status, 1);
-    EXPECT_EQ(result.messages, "settingsctl: step 1 (open): the pane is open already\n");
+    EXPECT_EQ(result.messages, "settingsctl: step 1 (open): the page is open already\n");
 }
 
 TEST(Play, NothingIsSharedWithoutASheet) {
@@ -246,7 +246,7 @@ TEST(Play, TracesThatThePaneReloadsItsParentAndLeaves) {
     EXPECT_EQ(eventsOfStep(result.output, 2),
               R"({"event":"dismiss","queue":"main","what":"pane","animated":true})"
               "\n");
-    EXPECT_EQ(result.messages, "settingsctl: step 3 (list): no pane is open\n");
+    EXPECT_EQ(result.messages, "settingsctl: step 3 (list): no page is open\n");
 }
 
 TEST(Play, ARowWithoutAValueIsPrintedAsNull) {
