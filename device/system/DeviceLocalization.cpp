@@ -55,11 +55,21 @@ Text DeviceLocalization::stringWithFormatLocaleArguments(
     std::span<const FormatArgument> arguments) const {
     auto filled = formatMessage(format.string(), locale, _settings.timeZone(), arguments);
     if (!filled) {
-        _log.write(LogLevel::error,
-                   "Can't fill the format \"" + format.string() + "\": " + filled.error());
+        logOnce("Can't fill the format \"" + format.string() + "\": " + filled.error());
         return format;
     }
     return *filled == format.string() ? format : Text(std::move(*filled));
+}
+
+void DeviceLocalization::logOnce(const std::string& line) const {
+    bool isNew = false;
+    {
+        const std::scoped_lock lock(_mutex);
+        isNew = _logged.insert(line).second;
+    }
+    if (isNew) {
+        _log.write(LogLevel::error, line);
+    }
 }
 
 int DeviceLocalization::localizedStandardCompare(const Text& left, const Text& right) const {

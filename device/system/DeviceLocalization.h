@@ -6,6 +6,8 @@
 #include <cstdint>
 #include <memory>
 #include <mutex>
+#include <set>
+#include <string>
 #include <vector>
 
 namespace nimbra {
@@ -19,7 +21,8 @@ class DeviceSettings;
 /// Comparing and formatting by the rules of ICU. Any thread.
 ///
 /// Dates are shown in the device's time zone; their placeholders stand outside those of plurals
-/// and choices. A format that cannot be filled comes back as it stands, with a line in the log.
+/// and choices. A format that cannot be filled comes back as it stands, with a line in the log: one
+/// for each fault, however often the format is used.
 class DeviceLocalization final : public Localization {
 public:
     /// Neither `settings` nor `log` is owned; both outlive it.
@@ -39,6 +42,7 @@ private:
     class Order;
     [[nodiscard]] const Order& orderOfUser() const;
     [[nodiscard]] const Order& findOrder() const;
+    void logOnce(const std::string& line) const;
 
     const DeviceSettings& _settings;
     SystemLog& _log;
@@ -49,6 +53,8 @@ private:
     mutable std::mutex _mutex;
     /// The orders of all locales so far: another thread may still compare by an earlier one.
     mutable std::vector<std::unique_ptr<const Order>> _orders;
+    /// What the log has been told; under the mutex.
+    mutable std::set<std::string> _logged;
 };
 
 } // namespace nimbra::device

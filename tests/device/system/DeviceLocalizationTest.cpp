@@ -211,6 +211,18 @@ TEST_F(DeviceLocalizationTest, AFormatThatCannotBeFilledComesBackWithALine) {
                   start + R"("{0, date, short}": U_ILLEGAL_ARGUMENT_ERROR)"}));
 }
 
+TEST_F(DeviceLocalizationTest, AFaultOfAFormatThatIsUsedOftenIsLoggedOnce) {
+    for (int use = 0; use < 3; ++use) {
+        EXPECT_EQ(formatted("en", "{0} {1}", {Text("x")}), "{0} {1}");
+    }
+    EXPECT_EQ(formatted("en", "{0} {2}", {Text("x")}), "{0} {2}");
+
+    const std::string start = "Can't fill the format ";
+    EXPECT_EQ(log().lines(),
+              (std::vector<std::string>{start + R"("{0} {1}": there is no argument 1)",
+                                        start + R"("{0} {2}": there is no argument 2)"}));
+}
+
 // The last second of 2023 in Tokyo, where the device is.
 constexpr Date newYearsEve =
     std::chrono::sys_days(std::chrono::December / 31 / 2023) + std::chrono::seconds(53999);
