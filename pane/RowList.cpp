@@ -71,7 +71,7 @@ std::shared_ptr<Specifier> RSPNimbraDriveViewController::_masterSwitch() {
 /// The applications' group and its rows by name; empty where there are no rows.
 SpecifierArray RSPNimbraDriveViewController::_sortedAppSpecifiers(SpecifierArray rows) const {
     if (rows.empty()) {
-        return rows;
+        return {};
     }
     // The group has no name, and an absent name comes before every other: it stays at the head.
     rows.insert(rows.begin(), Specifier::groupSpecifierWithID("RSPUIApps"));
