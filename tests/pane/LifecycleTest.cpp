@@ -6,6 +6,13 @@ namespace nimbra::test {
 namespace {
 
 struct LifecycleTest : PaneFixture {
+    /// Makes the pane anew, with `center` to observe with.
+    void observeWith(NotificationCenter& center) {
+        PlatformServices services = platform.services();
+        services.notificationCenter = center;
+        pane = std::make_shared<PaneWithRows>(services);
+        pane->setSpecifier(entry);
+    }
     void post(const NotificationName& name) {
         platform.notificationCenter.postNotification({.name = name});
     }
@@ -227,10 +234,7 @@ TEST_F(LifecycleTest, ThePaneThatGoesLetsItsRowsGo) {
 
 TEST_F(LifecycleTest, TheTokensStayInTheirFieldsUntilThePaneGoes) {
     TokenCenter center;
-    PlatformServices services = platform.services();
-    services.notificationCenter = center;
-    pane = std::make_shared<PaneWithRows>(services);
-    pane->setSpecifier(entry);
+    observeWith(center);
 
     pane->viewDidAppear(true);
     pane->viewDidDisappear(true);
@@ -255,10 +259,7 @@ TEST_F(LifecycleTest, TheTokensStayInTheirFieldsUntilThePaneGoes) {
 
 TEST_F(LifecycleTest, RegistrationsBeginAndEndBeforeTheHintingDoes) {
     TokenCenter center;
-    PlatformServices services = platform.services();
-    services.notificationCenter = center;
-    pane = std::make_shared<PaneWithRows>(services);
-    pane->setSpecifier(entry);
+    observeWith(center);
     const auto hinting = [this] {
         return platform.workQueues.queueLabelled("container-priority-hinting");
     };
