@@ -20,6 +20,7 @@
 #include <string_view>
 #include <utility>
 #include <variant>
+#include <vector>
 
 namespace nimbra {
 
@@ -122,13 +123,11 @@ void RSPNimbraDriveProgressFooterView::createConstraints() {
     const std::map<std::string, View*> views{{"_statusLabel", _statusLabel.get()},
                                              {"_progressBar", _progressBar.get()}};
     const auto add = [&](std::string_view format, std::map<std::string, double> metrics) {
-        auto constraints = LayoutConstraint::constraintsWithVisualFormat(
-            format, {.metrics = std::move(metrics), .views = views});
         // The formats stand here and nowhere else: one that cannot be read is a fault of this file,
         // which its tests find, and nothing that whoever reads a log could mend.
-        if (constraints) {
-            addConstraints(std::move(*constraints));
-        }
+        addConstraints(LayoutConstraint::constraintsWithVisualFormat(
+                           format, {.metrics = std::move(metrics), .views = views})
+                           .value_or(std::vector<LayoutConstraint>()));
     };
     add("H:|-[_statusLabel]-|", {});
     add("H:|-(progressMargin)-[_progressBar]-(progressMargin)-|", {{"progressMargin", 50.0}});
