@@ -234,7 +234,8 @@ function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo,
         if (returnsMore(from, to) && !deducesReturn(opening)) {
             change(begin[from], finish(to), "return {};", "nothing returned")
         }
-        if (kind ~ /call|block/ && lastKind ~ /call|block/ && !setOneObject(lastFrom, from)) {
+        if (kind ~ /call|block/ && lastKind ~ /call|block/ && 
+            !areApart(lastFrom, lastTo, from, to)) {
             change(begin[lastFrom], finish(to),
                 text(begin[from], finish(to)) text(finish(lastTo) + 1, begin[from] - 1) \
                 text(begin[lastFrom], finish(lastTo)), "exchanged with the next statement")
@@ -258,19 +259,42 @@ function deducesReturn(opening) {
     return token[opening] == "]"
 }
 
-function setOneObject(first, second,    here, there) {
-    here = setter(first)
-    there = setter(second)
-    if (!here || !there || token[here] == token[there]) return 0
-    return text(begin[first], begin[here] - 1) == text(begin[second], begin[there] - 1)
+# Whether the order of two statements is nobody's business: each only sets a property or makes an
+# object, and they are not about one and the same.
+function areApart(from, to, second, end,    here, there) {
+    if (makes(from)) return !mentions(second, end, token[from])
+    if (makes(second)) return !mentions(from, to, token[second])
+    here = setter(from, to)
+    there = setter(second, end)
+    if (!here || !there) return 0
+    if (text(begin[from], begin[here] - 1) == text(begin[second], begin[there] - 1)) {
+        return token[here] != token[there] ||
+            (token[here] ~ /ForKey$/ && token[to - 2] != token[end - 2])
+    }
+    return !mentions(second, end, token[from]) && !mentions(from, to, token[second])
 }
 
-# The name of the property that the statement sets of an object that has a name: `view->setText(...)`,
-# or `style.spacing = 8`; 0 where it does something else.
-function setter(i) {
-    for (; isWord(i) && token[i + 1] ~ /^(->|\.)$/; i += 2) {}
-    if (token[i - 1] !~ /^(->|\.)$/) return 0
-    return token[i] ~ /^set[A-Z]/ && token[i + 1] == "(" || token[i + 1] == "=" ? i : 0
+# Whether the statement makes an object, and nothing else.
+function makes(i) {
+    return token[i + 1] == "=" &&
+        (token[i + 2] == "std" && token[i + 4] == "make_shared" ||
+            token[i + 2] ~ /^[A-Z]/ && token[i + 3] == "::")
+}
+
+function mentions(from, to, word) {
+    for (; from <= to; ++from) if (token[from] == word) return 1
+    return 0
+}
+
+# The name of the property that the statement sets: `view->setText(...)`, `style.spacing = 8`, or, of
+# this object and to what is not asked of anybody, `_syncing = true`; 0 where it does something else.
+function setter(from, to,    i) {
+    for (i = from; isWord(i); i += 2) {
+        if (token[i + 1] == "(" && token[i + 2] == ")") i += 2
+        if (token[i + 1] !~ /^(->|\.)$/) break
+    }
+    if (token[i + 1] == "=") return i > from || !mentions(from, to, "(") ? i : 0
+    return i > from && token[i] ~ /^set[A-Z]/ && token[i + 1] == "(" ? i : 0
 }
 
 function statementEnd(from, closing,    i) {
@@ -371,20 +395,29 @@ function unitForms(u,    i, result, plain) {
     return result == "" ? plain : result "{\n#line 1 \"source\"\n" plain "\n}\n"
 }
 
-# The same change of the same line once more has a number, so that each has a name of its own.
+# The same change of lines that read the same has a number from the second on, so that each has a
+# name of its own, wherever in the source it stands.
 
-function printChanges(    i, j, lines, at, nth) {
+function printChanges(    i, j, nth) {
+    linesOf()
+    for (i = 1; i <= changes; ++i) {
+        nth = 1
+        for (j = 1; j <= changes; ++j) {
+            nth += changeWhat[j] == changeWhat[i] && changeFrom[j] < changeFrom[i] &&
+                lineText[changeLine[j]] == lineText[changeLine[i]]
+        }
+        print i "\t" changeLine[i] "\t" changeWhat[i] (nth > 1 ? ", number " nth : "") "\t" \
+            lineText[changeLine[i]] "\t" (changeUnit[i] ? "together" : "alone")
+    }
+}
+
+# Which line each change begins in, and what each line reads without its indentation.
+function linesOf(    i, line, lines, at) {
     lines = split(source, lineText, "\n")
     at = 1
-    for (i = 1; i <= lines; ++i) {
-        lineBegin[i] = at
-        at += length(lineText[i]) + 1
-    }
-    for (i = 1; i <= changes; ++i) {
-        for (j = 1; j < lines && lineBegin[j + 1] <= changeFrom[i]; ++j) {}
-        sub(/^ +/, "", lineText[j])
-        nth = ++seen[j, changeWhat[i]]
-        print i "\t" j "\t" changeWhat[i] (nth > 1 ? ", number " nth : "") "\t" lineText[j] "\t" \
-            (changeUnit[i] ? "together" : "alone")
+    for (line = 1; line <= lines; ++line) {
+        for (i = 1; i <= changes; ++i) if (changeFrom[i] >= at) changeLine[i] = line
+        at += length(lineText[line]) + 1
+        sub(/^ +/, "", lineText[line])
     }
 }
