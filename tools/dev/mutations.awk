@@ -234,7 +234,7 @@ function changeStatements(opening,    closing, from, to, kind, lastFrom, lastTo,
         if (returnsMore(from, to) && !deducesReturn(opening)) {
             change(begin[from], finish(to), "return {};", "nothing returned")
         }
-        if (kind ~ /call|block/ && lastKind ~ /call|block/ && 
+        if (kind ~ /call|block/ && lastKind ~ /call|block/ &&
             !areApart(lastFrom, lastTo, from, to)) {
             change(begin[lastFrom], finish(to),
                 text(begin[from], finish(to)) text(finish(lastTo) + 1, begin[from] - 1) \
