@@ -19,18 +19,22 @@ namespace {
 
 constexpr mode_t readableByEverybody = 0755;
 
-/// `path` as an absolute one, without a slash at its end. There is none for an empty path, nor in a
-/// working directory that has been removed.
+/// `path` as an absolute one that ends in a name, without a slash or a "." behind it. A ".." stays,
+/// as it may stand behind a link. There is none for an empty path, nor in a working directory that
+/// has been removed.
 std::expected<std::filesystem::path, Error> absoluteName(const std::filesystem::path& path) {
     if (path.empty()) {
         return std::unexpected(deviceError("the name of a directory is empty"));
     }
     std::error_code failure;
-    const auto name = std::filesystem::absolute(path, failure).lexically_normal();
+    auto name = std::filesystem::absolute(path, failure);
     if (failure) {
         return std::unexpected(fileError(path, "cannot be made", failure.value()));
     }
-    return name.has_filename() ? name : name.parent_path();
+    while (name.has_relative_path() && (!name.has_filename() || name.filename() == ".")) {
+        name = name.parent_path();
+    }
+    return name;
 }
 
 /// Flushes the entries of `root` and of all directories below it.

@@ -16,6 +16,31 @@ TEST(Init, MakesTheSampleDevice) {
     EXPECT_EQ(program.run({"--root", device.string(), "get", "Nimbra Drive"}).output, "on\n");
 }
 
+TEST(Init, MakesTheDeviceWhereAPathLeadsThroughALink) {
+    const Program program;
+    std::filesystem::create_directories(program.path("here/below"));
+    std::filesystem::create_directory_symlink("here/below", program.path("link"));
+    const auto device = program.path("link") / "../device/.";
+
+    const auto result = program.run({"init", device.string()});
+
+    EXPECT_EQ(result.status, 0) << result.messages;
+    EXPECT_TRUE(std::filesystem::exists(program.path("here/device/var")));
+    EXPECT_FALSE(std::filesystem::exists(program.path("device")));
+    EXPECT_EQ(program.run({"--root", device.string(), "get", "Nimbra Drive"}).output, "on\n");
+}
+
+TEST(Init, MakesTheDirectoriesAboveTheDevice) {
+    const Program program;
+    const auto device = program.path("new") / "../beside/./device/";
+
+    const auto result = program.run({"init", device.string()});
+
+    EXPECT_EQ(result.status, 0) << result.messages;
+    EXPECT_TRUE(std::filesystem::exists(program.path("beside/device/var")));
+    EXPECT_EQ(program.run({"--root", device.string(), "get", "Nimbra Drive"}).output, "on\n");
+}
+
 TEST(Init, MakesTheDeviceThatAFileDescribes) {
     const Program program;
     const auto description = program.write(
