@@ -2,6 +2,10 @@
 
 #include "device/system/LanguageChain.h"
 
+#include <cstddef>
+#include <span>
+#include <string_view>
+
 namespace nimbra::host {
 
 std::string problemOfLanguage(const std::string& tag) {
@@ -11,6 +15,18 @@ std::string problemOfLanguage(const std::string& tag) {
 
 std::string problemOfPath(const std::string& path) {
     return path.empty() ? "is empty" : "";
+}
+
+std::string problemOfWords(int count, char** words) {
+    for (const std::string_view word : std::span(words, static_cast<std::size_t>(count))) {
+        if (word == "--") {
+            break;
+        }
+        if (word.starts_with("--") && word.find('=') == word.size() - 1) {
+            return std::string(word.substr(0, word.size() - 1)) + ": is empty";
+        }
+    }
+    return "";
 }
 
 } // namespace nimbra::host

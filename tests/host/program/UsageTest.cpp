@@ -54,6 +54,24 @@ TEST(Usage, AnEmptyPathIsNamed) {
               "settingsctl: --bundle: is empty (see settingsctl --help)\n");
 }
 
+TEST(Usage, AnOptionWithoutAValueBehindItsSignTakesNotTheNextWord) {
+    const Program program;
+
+    for (const std::string option : {"--root", "--bundle", "--locale", "--account"}) {
+        const auto result = program.run({option + '=', "tap", "list"});
+        EXPECT_EQ(result.status, 2);
+        EXPECT_EQ(result.messages,
+                  "settingsctl: " + option + ": is empty (see settingsctl --help)\n");
+        EXPECT_FALSE(std::filesystem::exists("tap"));
+    }
+    EXPECT_EQ(program.run({"init", "--from=", "device"}).messages,
+              "settingsctl: --from: is empty (see settingsctl --help)\n");
+    // Behind "--" everything is a name.
+    EXPECT_EQ(program.run({"--root", program.makePlainDevice("device"), "get", "--", "--root="})
+                  .messages.find("is empty"),
+              std::string::npos);
+}
+
 TEST(Usage, HelpNamesEveryCommand) {
     const Program program;
 
