@@ -6,7 +6,9 @@
 #include "host/core/BundleSearch.h"
 
 #include <cstdlib>
+#include <pwd.h>
 #include <system_error>
+#include <unistd.h>
 #include <utility>
 
 namespace nimbra::host {
@@ -21,6 +23,16 @@ std::filesystem::path directoryInEnvironment(const char* name) {
     return path.is_absolute() ? path : std::filesystem::path();
 }
 
+/// The user's own directory: what the environment says, or else the system's list of users.
+std::filesystem::path homeDirectory() {
+    if (auto home = directoryInEnvironment("HOME"); !home.empty()) {
+        return home;
+    }
+    // Nothing else in these programs asks for users, on any thread.
+    const passwd* const user = ::getpwuid(::getuid());
+    return user != nullptr ? user->pw_dir : "/";
+}
+
 bool isThere(const std::filesystem::path& path) {
     std::error_code ignored;
     return std::filesystem::symlink_status(path, ignored).type() !=
@@ -33,7 +45,7 @@ std::filesystem::path stateDirectory() {
     if (const auto state = directoryInEnvironment("XDG_STATE_HOME"); !state.empty()) {
         return state / "nimbra";
     }
-    return directoryInEnvironment("HOME") / ".local/state/nimbra";
+    return homeDirectory() / ".local/state/nimbra";
 }
 
 std::filesystem::path defaultDeviceDirectory() {

@@ -8,7 +8,9 @@
 #include <filesystem>
 #include <gtest/gtest.h>
 #include <optional>
+#include <pwd.h>
 #include <string>
+#include <unistd.h>
 
 namespace nimbra::host {
 namespace {
@@ -25,6 +27,19 @@ TEST(DeviceLocation, TheStateStandsWhereTheEnvironmentSays) {
 
     state.set(std::nullopt);
     EXPECT_EQ(defaultDeviceDirectory(), "/users/somebody/.local/state/nimbra/device");
+}
+
+TEST(DeviceLocation, WithoutAHomeInTheEnvironmentTheSystemKnowsTheUsers) {
+    const test::EnvironmentVariable state("XDG_STATE_HOME", std::nullopt);
+    const std::filesystem::path known = ::getpwuid(::getuid())->pw_dir;
+    ASSERT_TRUE(known.is_absolute());
+
+    for (const std::optional<std::string>& value :
+         {std::optional<std::string>(), std::optional<std::string>(""),
+          std::optional<std::string>("here")}) {
+        const test::EnvironmentVariable home("HOME", value);
+        EXPECT_EQ(stateDirectory(), known / ".local/state/nimbra") << value.value_or("(none)");
+    }
 }
 
 TEST(DeviceLocation, TheSampleDeviceIsMadeWhereNothingIs) {
