@@ -229,10 +229,6 @@ ProgressPublisher& DevicePlatform::progressPublisher() {
     return _parts->progressPublisher;
 }
 
-const DevicePreferences& DevicePlatform::preferences() const {
-    return _parts->preferences;
-}
-
 DeviceSettings& DevicePlatform::settings() {
     return _parts->settings;
 }

@@ -20,7 +20,6 @@ namespace nimbra::device {
 class DeviceAccountStore;
 class DeviceBundles;
 class DeviceFileManager;
-class DevicePreferences;
 class DevicePrivacyConsentStore;
 class DeviceProcesses;
 class DeviceSettings;
@@ -72,7 +71,6 @@ public:
     [[nodiscard]] DeviceProcesses& processes();
     [[nodiscard]] const DaemonConnection& daemonConnection() const;
     [[nodiscard]] ProgressPublisher& progressPublisher();
-    [[nodiscard]] const DevicePreferences& preferences() const;
     [[nodiscard]] DeviceSettings& settings();
     [[nodiscard]] DeviceWorkQueues& workQueues();
     [[nodiscard]] ClassRegistry& classes();

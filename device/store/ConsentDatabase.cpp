@@ -111,12 +111,11 @@ std::expected<void, Error> make(const std::filesystem::path& path) {
 ConsentDatabase::ConsentDatabase(std::unique_ptr<Database> database)
     : _database(std::move(database)) {}
 
-std::expected<ConsentDatabase, Error> ConsentDatabase::create(const std::filesystem::path& path,
-                                                              std::chrono::milliseconds patience) {
+std::expected<ConsentDatabase, Error> ConsentDatabase::create(const std::filesystem::path& path) {
     if (const auto made = make(path); !made) {
         return std::unexpected(made.error());
     }
-    auto database = schema.open(path, patience);
+    auto database = schema.open(path, Database::patience);
     if (!database) {
         return std::unexpected(database.error());
     }

@@ -31,8 +31,7 @@ public:
     /// Makes a new database without records at `path`; where another process has made one
     /// meanwhile, that one is opened. What happens on the way leaves a whole database or none.
     [[nodiscard]] static std::expected<ConsentDatabase, Error>
-    create(const std::filesystem::path& path,
-           std::chrono::milliseconds patience = Database::patience);
+    create(const std::filesystem::path& path);
 
     /// Opens the database at `path`; nothing where nothing stands there, as on a device that an
     /// earlier version made. A file that is no such database, is damaged or was made by a later

@@ -27,9 +27,9 @@ struct Schema {
 
     /// Opens the database at `path`, which an earlier version may have made. A file that is no
     /// such database, is damaged or was made by a later version is an error, and stays untouched.
+    /// Reading and writing wait as long as `patience` for another program that is using the file.
     [[nodiscard]] std::expected<std::unique_ptr<Database>, Error>
-    open(const std::filesystem::path& path,
-         std::chrono::milliseconds patience = Database::patience) const;
+    open(const std::filesystem::path& path, std::chrono::milliseconds patience) const;
 
     /// The same only to look at it: nothing is written, and one of an earlier version stays so.
     [[nodiscard]] std::expected<std::unique_ptr<Database>, Error>
