@@ -36,7 +36,7 @@ device::DeviceDescription BenchDevice::describe(std::size_t applications) {
 
 void BenchDevice::reopen() {
     _platform.reset();
-    _platform = valueOf(device::DevicePlatform::open(root(), _loop));
+    _platform = valueOf(device::DevicePlatform::open(root(), _loop, {}));
 }
 
 void BenchDevice::loadBundle() {

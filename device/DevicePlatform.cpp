@@ -67,10 +67,11 @@ DevicePlatform::Databases::open(const DevicePaths& paths) {
 /// The services, each behind those that it uses. The threads end before the first of them goes.
 struct DevicePlatform::Parts {
     Parts(const DevicePaths& paths, DeviceSettings deviceSettings, Databases databases,
-          WorkQueue& mainQueue, std::shared_ptr<TimeSource> timeSource)
-        : systemLog(paths, DeviceSystemLog::usualDestination()),
+          WorkQueue& mainQueue, Options options)
+        : systemLog(paths, options.keepsLogToItself ? DeviceSystemLog::Destination::fileAlone
+                                                    : DeviceSystemLog::usualDestination()),
           settings(std::move(deviceSettings)), preferences(paths, systemLog),
-          workQueues(mainQueue, std::move(timeSource)), clock(workQueues.timeSource()),
+          workQueues(mainQueue, std::move(options.timeSource)), clock(workQueues.timeSource()),
           distributedNotificationCenter(paths, systemLog),
           accountStore(std::move(databases.accounts), workQueues, systemLog),
           deviceListRequests(DeviceListFile(paths, systemLog), workQueues),
@@ -134,8 +135,7 @@ std::expected<void, Error> checkState(const DevicePaths& paths) {
 } // namespace
 
 std::expected<std::unique_ptr<DevicePlatform>, Error>
-DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue,
-                     std::shared_ptr<TimeSource> timeSource) {
+DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue, Options options) {
     const DevicePaths paths(root);
     if (const auto checked = checkState(paths); !checked) {
         return std::unexpected(checked.error());
@@ -152,7 +152,7 @@ DevicePlatform::open(const std::filesystem::path& root, WorkQueue& mainQueue,
         return std::unexpected(databases.error());
     }
     return std::unique_ptr<DevicePlatform>(new DevicePlatform(std::make_unique<Parts>(
-        paths, std::move(*settings), std::move(*databases), mainQueue, std::move(timeSource))));
+        paths, std::move(*settings), std::move(*databases), mainQueue, std::move(options))));
 }
 
 DevicePlatform::DevicePlatform(std::unique_ptr<Parts> parts) : _parts(std::move(parts)) {}

@@ -31,13 +31,19 @@ class TimeSource;
 /// Main queue only; the services say for themselves where they may be used.
 class DevicePlatform {
 public:
+    struct Options {
+        /// What the clock and the timers run by; null for the machine's own time.
+        std::shared_ptr<TimeSource> timeSource;
+        /// Whether the log stays on the device: neither the machine's journal nor standard error
+        /// is told anything.
+        bool keepsLogToItself = false;
+    };
+
     /// The platform of the device in `root`, whose main queue is `mainQueue` (not owned, outlives
     /// the platform). A directory that lacks something or holds something unreadable is an error
-    /// that names the file and the place; nothing in it is changed. The clock and the timers run by
-    /// `timeSource`, by the machine's own time where none is given.
+    /// that names the file and the place; nothing in it is changed.
     [[nodiscard]] static std::expected<std::unique_ptr<DevicePlatform>, Error>
-    open(const std::filesystem::path& root, WorkQueue& mainQueue,
-         std::shared_ptr<TimeSource> timeSource = nullptr);
+    open(const std::filesystem::path& root, WorkQueue& mainQueue, Options options);
 
     DevicePlatform(const DevicePlatform&) = delete;
     DevicePlatform& operator=(const DevicePlatform&) = delete;

@@ -153,7 +153,7 @@ void DeviceSystemLog::write(LogLevel level, const std::string& message) {
         return;
     }
     const std::string line = std::string(nameOf(level)) + ": " + oneLine(message);
-    if (level == LogLevel::error) {
+    if (level == LogLevel::error && _destination != Destination::fileAlone) {
         writeToStandardError(line);
     }
     _file->write(_paths, level, line);

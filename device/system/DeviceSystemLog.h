@@ -18,7 +18,12 @@ namespace nimbra::device {
 /// is "debug".
 class DeviceSystemLog final : public SystemLog {
 public:
-    enum class Destination { journal, file };
+    enum class Destination {
+        journal,
+        file,
+        /// The file, and errors nowhere else.
+        fileAlone
+    };
 
     /// The journal where there is one, else the file.
     [[nodiscard]] static Destination usualDestination();
@@ -27,7 +32,8 @@ public:
     ~DeviceSystemLog() override;
 
     [[nodiscard]] bool isEnabled(LogLevel level) const override;
-    /// What is not enabled is dropped. A line that cannot be written is told to standard error.
+    /// What is not enabled is dropped. A line that cannot be written is told to standard error; a
+    /// file that cannot be made is told once, and only the errors show from then on.
     void write(LogLevel level, const std::string& message) override;
 
     /// What the journal is told of a line: its fields, each "NAME=value".

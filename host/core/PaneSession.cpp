@@ -19,8 +19,10 @@ namespace nimbra::host {
 
 std::expected<std::unique_ptr<PaneSession>, Error> PaneSession::start(Configuration configuration) {
     std::unique_ptr<PaneSession> session(new PaneSession(std::move(configuration)));
-    auto device = device::DevicePlatform::open(session->_configuration.root, session->_loop,
-                                               session->_configuration.timeSource);
+    auto device = device::DevicePlatform::open(
+        session->_configuration.root, session->_loop,
+        {.timeSource = session->_configuration.timeSource,
+         .keepsLogToItself = session->_configuration.keepsLogToItself});
     if (!device) {
         return std::unexpected(device.error());
     }

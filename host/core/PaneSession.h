@@ -55,6 +55,8 @@ public:
         Trace* trace = nullptr;
         /// What the device takes its time from; null for the machine's time.
         std::shared_ptr<device::TimeSource> timeSource;
+        /// Whether the device's log stays in its own file, as that of a device that is soon gone.
+        bool keepsLogToItself = false;
         /// How large what the host draws comes out; null for a host without a screen. Not owned,
         /// outlives the session.
         ViewMetrics* viewMetrics = nullptr;

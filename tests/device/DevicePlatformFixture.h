@@ -23,7 +23,7 @@ protected:
 
     /// The platform of the device that stands at `root`.
     [[nodiscard]] std::unique_ptr<device::DevicePlatform> openPlatform() {
-        auto platform = device::DevicePlatform::open(root(), _mainQueue);
+        auto platform = device::DevicePlatform::open(root(), _mainQueue, {});
         EXPECT_TRUE(platform) << platform.error();
         return std::move(*platform);
     }

@@ -50,7 +50,7 @@ protected:
     /// Expects that opening fails with `message` about `name` and leaves every byte as it was.
     void expectRefusal(const std::string& name, const std::string& message) {
         const auto before = test::treeOf(root());
-        const auto platform = DevicePlatform::open(root(), mainQueue());
+        const auto platform = DevicePlatform::open(root(), mainQueue(), {});
         ASSERT_FALSE(platform);
         EXPECT_EQ(platform.error().description, state(name).string() + ": " + message);
         EXPECT_EQ(test::treeOf(root()), before);
@@ -85,7 +85,7 @@ TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
     description.consent = {{.service = kPRVServiceTidewater.string(), .bundle = "com/a"}};
     const auto place = root() / "other";
     ASSERT_TRUE(createDeviceDirectory(place, description));
-    const auto platform = DevicePlatform::open(place, mainQueue());
+    const auto platform = DevicePlatform::open(place, mainQueue(), {});
     ASSERT_TRUE(platform) << platform.error();
 
     const PlatformServices services = (*platform)->servicesFor(host());
@@ -109,7 +109,7 @@ TEST_F(DevicePlatformTest, ApplicationsAndConsentAreThoseOfTheDescription) {
 TEST_F(DevicePlatformTest, TheClockAndTheTimersRunByTheTimeThatIsGiven) {
     const Date start(std::chrono::hours(400'000));
     const auto time = std::make_shared<StandingTime>(start);
-    const auto platform = DevicePlatform::open(root(), mainQueue(), time);
+    const auto platform = DevicePlatform::open(root(), mainQueue(), {.timeSource = time});
     ASSERT_TRUE(platform) << platform.error();
     Date fired;
     const PlatformServices services = (*platform)->servicesFor(host());
@@ -294,7 +294,7 @@ TEST_F(DevicePlatformTest, ADamagedConsentDatabaseIsReportedAndLeftAsItWas) {
 }
 
 TEST_F(DevicePlatformTest, ADirectoryThatIsNoDeviceIsReported) {
-    const auto missing = DevicePlatform::open(root() / "none", mainQueue());
+    const auto missing = DevicePlatform::open(root() / "none", mainQueue(), {});
 
     ASSERT_FALSE(missing);
     EXPECT_EQ(missing.error().description,
@@ -306,7 +306,7 @@ TEST_F(DevicePlatformTest, ADirectoryThatIsNoDeviceIsReported) {
 TEST_F(DevicePlatformTest, AStateThatCannotBeSeenIsReportedWithTheReason) {
     std::filesystem::create_symlink("round", root() / "round");
 
-    const auto platform = DevicePlatform::open(root() / "round", mainQueue());
+    const auto platform = DevicePlatform::open(root() / "round", mainQueue(), {});
 
     ASSERT_FALSE(platform);
     EXPECT_EQ(platform.error().description,

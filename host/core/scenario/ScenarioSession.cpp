@@ -75,6 +75,7 @@ std::expected<void, Error> ScenarioSession::start(const Configuration& configura
                                        .locale = configuration.locale,
                                        .trace = &trace,
                                        .timeSource = _time,
+                                       .keepsLogToItself = true,
                                        .viewMetrics = configuration.viewMetrics});
     if (!session) {
         return std::unexpected(std::move(session.error()));

@@ -90,9 +90,10 @@ TEST(PlayScreen, WithoutAnAccountTheUpgradeFailsAndSaysSo) {
                              R"("accounts": [])");
 
     EXPECT_EQ(result.status, 0);
-    EXPECT_EQ(result.messages, "nimbra-settings: error: Can't save account: there is no account to "
-                               "be saved\n");
+    EXPECT_EQ(result.messages, "");
     EXPECT_NE(result.output.find(R"("op":"request","account":null})"), std::string::npos);
+    EXPECT_NE(result.output.find(R"("description":"there is no account to be saved")"),
+              std::string::npos);
     EXPECT_NE(result.output.find(R"("what":"accountAlert","animated":true,)"
                                  R"("title":"Upgrade Failed")"),
               std::string::npos);

@@ -1,3 +1,4 @@
+#include "tests/device/TestFiles.h"
 #include "tests/host/program/Program.h"
 
 #include <array>
@@ -101,17 +102,23 @@ TEST(Play, ALockedSwitchCannotBeSet) {
 TEST(Play, AFailedSaveCallsTheDatabaseByItsPathOnTheDevice) {
     const Program program;
 
-    const auto result = program.run({"play", "-"}, R"({"steps": [
-        {"do": "open"}, {"do": "change", "device": {"accounts": []}},
-        {"do": "set", "row": "Nimbra Drive", "value": true}]})");
+    const auto kept = program.path("kept");
 
-    EXPECT_EQ(result.status, 0);
+    const auto result = program.run({"play", "--keep", kept.string(), "-"}, R"({"steps": [
+        {"do": "open"}, {"do": "change", "device": {"accounts": []}},
+        {"do": "set", "row": "Nimbra Drive", "value": true}, {"do": "get", "row": "Foo"}]})");
+
+    EXPECT_EQ(result.status, 1);
     EXPECT_NE(result.output.find(
                   R"("description":"/var/lib/nimbra/accounts.db: holds no such account any more")"),
               std::string::npos)
         << result.output;
-    EXPECT_EQ(result.messages, "nimbra-settings: error: Can't save account primary: "
-                               "/var/lib/nimbra/accounts.db: holds no such account any more\n");
+    EXPECT_EQ(result.messages,
+              "settingsctl: step 3 (get): no row \"Foo\" (rows: \"Nimbra Drive\")\n")
+        << "one line, whatever the device has to say";
+    EXPECT_TRUE(contentOf(kept / "var/log/nimbra/settings.log")
+                    .ends_with("error: Can't save account primary: "
+                               "/var/lib/nimbra/accounts.db: holds no such account any more\n"));
 }
 
 TEST(Play, AStepThatNeedsAPaneFailsWithoutOne) {
