@@ -40,7 +40,7 @@ bool TracingAccount::isEnabledForDataclass(const Dataclass& dataclass) const {
 }
 
 void TracingAccount::setEnabledForDataclass(bool enabled, const Dataclass& dataclass) {
-    traceFlag("setEnabled:forDataclass:", enabled, dataclass);
+    trace("setEnabled:forDataclass:", dataclass.string(), enabled);
     _account->setEnabledForDataclass(enabled, dataclass);
 }
 
@@ -49,9 +49,7 @@ bool TracingAccount::vt_isUsingStratafile() const {
 }
 
 void TracingAccount::vt_setUsesStratafile(bool usesStratafile) {
-    _trace.write("account", {{"op", "vt_setUsesStratafile:"},
-                             {"account", identifier().string()},
-                             {"value", usesStratafile}});
+    trace("vt_setUsesStratafile:", nullptr, usesStratafile);
     _account->vt_setUsesStratafile(usesStratafile);
 }
 
@@ -60,20 +58,20 @@ bool TracingAccount::vt_useCellularForDataclass(const Dataclass& dataclass) cons
 }
 
 void TracingAccount::vt_setUseCellularForDataclass(bool useCellular, const Dataclass& dataclass) {
-    traceFlag("vt_setUseCellular:forDataclass:", useCellular, dataclass);
+    trace("vt_setUseCellular:forDataclass:", dataclass.string(), useCellular);
     _account->vt_setUseCellularForDataclass(useCellular, dataclass);
 }
 
 void TracingAccount::reload() {
-    _trace.write("account", {{"op", "reload"}, {"account", identifier().string()}});
+    trace("reload", nullptr, nullptr);
     _account->reload();
 }
 
-void TracingAccount::traceFlag(const char* operation, bool value,
-                               const Dataclass& dataclass) const {
+void TracingAccount::trace(const char* operation, const nlohmann::ordered_json& dataclass,
+                           const nlohmann::ordered_json& value) const {
     _trace.write("account", {{"op", operation},
                              {"account", identifier().string()},
-                             {"dataclass", dataclass.string()},
+                             {"dataclass", dataclass},
                              {"value", value}});
 }
 

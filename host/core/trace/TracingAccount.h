@@ -35,7 +35,8 @@ public:
     void reload() override;
 
 private:
-    void traceFlag(const char* operation, bool value, const Dataclass& dataclass) const;
+    void trace(const char* operation, const nlohmann::ordered_json& dataclass,
+               const nlohmann::ordered_json& value) const;
 
     std::shared_ptr<Account> _account;
     Trace& _trace;

@@ -106,7 +106,7 @@ TEST_F(Tracers, TellThatAnAccountIsMarkedAndHowItIsSaved) {
     const std::string operation = R"("op":"saveAccount:withDataclassActions:doVerify:completion:")";
     EXPECT_EQ(takeLines(),
               (Lines{R"({"event":"account","op":"vt_setUsesStratafile:","account":"primary",)"
-                     R"("value":true})",
+                     R"("dataclass":null,"value":true})",
                      R"({"event":"save","phase":"start","account":"primary",)" + operation + "}",
                      R"({"event":"save","phase":"end","account":"primary",)" + operation +
                          R"(,"success":true,"error":null})"}));

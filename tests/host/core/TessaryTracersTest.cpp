@@ -61,7 +61,7 @@ TEST_F(Tracers, TraceTheAccountOfTheDatabaseButNotThatItIsAskedFor) {
 
     database->vt_setUsesStratafile(true);
     EXPECT_EQ(takeLines(), (Lines{R"({"event":"account","op":"vt_setUsesStratafile:",)"
-                                  R"("account":"database","value":true})"}));
+                                  R"("account":"database","dataclass":null,"value":true})"}));
     EXPECT_EQ(database->vt_tessaryAccount(), nullptr);
 }
 
