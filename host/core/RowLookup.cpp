@@ -104,6 +104,10 @@ RowRefusal ambiguous(const SpecifierArray& matches, std::string_view name) {
                      : " (name one by its identifier: " + firstOf(std::move(identifiers)) + ')')};
 }
 
+RowRefusal notAButton(const Specifier& row) {
+    return {Reason::notAButton, quoted(row) + " is " + withArticle(row) + ", not a button"};
+}
+
 RowRefusal locked(const Specifier& row) {
     return {Reason::locked, quoted(row) + " is locked"};
 }
@@ -147,8 +151,7 @@ std::optional<RowRefusal> refusalToRead(const Specifier& row) {
 
 std::optional<RowRefusal> refusalToTap(const Specifier& row) {
     if (row.cellType() != ButtonCell && row.cellType() != LinkListCell) {
-        return RowRefusal{Reason::notAButton,
-                          quoted(row) + " is " + withArticle(row) + ", not a button"};
+        return notAButton(row);
     }
     if (!row.isEnabled()) {
         return locked(row);
@@ -184,6 +187,9 @@ std::expected<void, RowRefusal> turnSwitch(Specifier& row, bool isOn) {
 }
 
 std::expected<void, RowRefusal> pressButton(Specifier& row) {
+    if (row.cellType() != ButtonCell) {
+        return std::unexpected(notAButton(row));
+    }
     if (auto refusal = refusalToTap(row)) {
         return std::unexpected(std::move(*refusal));
     }

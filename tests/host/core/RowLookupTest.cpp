@@ -129,6 +129,8 @@ TEST(RowLookup, SaysWhyARowCannotBeTapped) {
     EXPECT_EQ(pressButton(*button).error().reason, Reason::locked);
     EXPECT_EQ(presses, 1) << "what is refused is not done";
     EXPECT_EQ(refusalToTap(*row(nullptr, "a"))->reason, Reason::notAButton);
+    EXPECT_EQ(pressButton(*row(nullptr, "a", LinkListCell)).error().reason, Reason::notAButton)
+        << "a link can be tapped, which opens its page";
 }
 
 TEST(RowLookup, ALinkCanBeTappedUnlessItIsLocked) {
