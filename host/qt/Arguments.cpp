@@ -96,9 +96,7 @@ private:
         _app.add_option("--screenshot", _arguments.screenshot,
                         "Put a picture of the window here once nothing moves, and end")
             ->type_name("FILE.png")
-            ->check([](const std::string& place) {
-                return place.empty() ? std::string("the name of a file expected") : std::string();
-            });
+            ->check(host::problemOfPath);
         _app.add_option_function<std::string>(
                 "--size",
                 [this](const std::string& word) {

@@ -3,6 +3,7 @@
 #include "host/core/PaneSession.h"
 
 #include <QBuffer>
+#include <QFileInfo>
 #include <QQuickWindow>
 #include <QSaveFile>
 #include <QString>
@@ -19,15 +20,22 @@ Screenshot::Screenshot(QQuickWindow& window, host::PaneSession& session)
     _timer.start();
 }
 
-bool Screenshot::save(const QImage& picture, const QString& place) {
+std::expected<void, std::string> Screenshot::save(const QImage& picture, const QString& place) {
     QBuffer png;
     if (!png.open(QIODevice::WriteOnly) || !picture.save(&png, "PNG")) {
-        return false;
+        return std::unexpected("no memory for the picture");
+    }
+    // The file takes the place of what stands there, also of a device.
+    if (const QFileInfo earlier(place); earlier.exists() && !earlier.isFile()) {
+        return std::unexpected("is not a plain file");
     }
     QSaveFile file(place);
     // What is still to be written when it commits may get lost without a word.
-    return file.open(QIODevice::WriteOnly) && file.write(png.data()) == png.size() &&
-           file.flush() && file.commit();
+    if (!file.open(QIODevice::WriteOnly) || file.write(png.data()) != png.size() || !file.flush() ||
+        !file.commit()) {
+        return std::unexpected(file.errorString().toStdString());
+    }
+    return {};
 }
 
 void Screenshot::look() {

@@ -3,7 +3,9 @@
 #include <QImage>
 #include <QObject>
 #include <QTimer>
+#include <expected>
 #include <functional>
+#include <string>
 
 class QQuickWindow;
 
@@ -21,9 +23,10 @@ public:
     /// Begins to look at `window`, which shows `session`; both outlive it.
     Screenshot(QQuickWindow& window, host::PaneSession& session);
 
-    /// Writes `picture` as PNG to the file `place`. Whether that succeeded; where it did not, what
-    /// stood there is left as it was.
-    [[nodiscard]] static bool save(const QImage& picture, const QString& place);
+    /// Writes `picture` as PNG to the file `place`. Where that fails, what stood there is left as
+    /// it was, and the reason is given.
+    [[nodiscard]] static std::expected<void, std::string> save(const QImage& picture,
+                                                               const QString& place);
 
 Q_SIGNALS:
     /// Once: the window was the same over some time in which nothing was left to do.

@@ -94,9 +94,9 @@ int runProgram(int count, char** words) {
         screenshot.emplace(window, (*host)->session());
         QObject::connect(&*screenshot, &Screenshot::taken, [&](const QImage& picture) {
             const std::string place = arguments->screenshot->string();
-            QGuiApplication::exit(Screenshot::save(picture, QString::fromStdString(place))
-                                      ? 0
-                                      : complain(place + ": cannot be written", exitRefused));
+            const auto saved = Screenshot::save(picture, QString::fromStdString(place));
+            QGuiApplication::exit(
+                saved ? 0 : complain(place + ": cannot be written: " + saved.error(), exitRefused));
         });
         QObject::connect(&*screenshot, &Screenshot::gaveUp, [&] {
             QGuiApplication::exit(complain("the window does not come to rest", exitRefused));

@@ -15,6 +15,7 @@
 #include <climits>
 #include <csignal>
 #include <sys/inotify.h>
+#include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
@@ -134,7 +135,8 @@ TEST_F(Program, APictureThatCannotBeWrittenIsOneLineAndNoFile) {
 
     EXPECT_EQ(result.status, 1);
     EXPECT_EQ(result.output, "");
-    EXPECT_EQ(result.messages, "settingshost: " + picture.string() + ": cannot be written\n");
+    EXPECT_EQ(result.messages, "settingshost: " + picture.string() +
+                                   ": cannot be written: No such file or directory\n");
     EXPECT_FALSE(std::filesystem::exists(picture.parent_path()));
 }
 
@@ -148,7 +150,8 @@ TEST_F(Program, APictureOnAFullDiskIsNoneAndLeavesTheEarlierOne) {
 
     {
         const test::FullDisk full;
-        EXPECT_FALSE(Screenshot::save(picture, name));
+        EXPECT_EQ(Screenshot::save(picture, name).error(), "File too large")
+            << "which is how the disk is full here";
         EXPECT_FALSE(Screenshot::save(picture, name + QStringLiteral(".new")));
     }
 
@@ -157,15 +160,31 @@ TEST_F(Program, APictureOnAFullDiskIsNoneAndLeavesTheEarlierOne) {
     EXPECT_FALSE(std::filesystem::exists(place.string() + ".new"));
 }
 
+TEST_F(Program, APictureTakesThePlaceOfNothingButAPlainFile) {
+    QImage picture(1, 1, QImage::Format_RGB32);
+    picture.fill(Qt::white);
+    const auto pipe = place("pipe.png");
+    ASSERT_EQ(::mkfifo(pipe.c_str(), 0600), 0);
+    std::filesystem::create_directory(place("folder.png"));
+    std::filesystem::create_symlink("pipe.png", place("link.png"));
+
+    for (const std::string name : {"pipe.png", "folder.png", "link.png"}) {
+        EXPECT_EQ(Screenshot::save(picture, QString::fromStdString(place(name).string())).error(),
+                  "is not a plain file")
+            << name;
+    }
+
+    EXPECT_TRUE(std::filesystem::is_fifo(pipe));
+    EXPECT_TRUE(std::filesystem::is_symlink(place("link.png")));
+}
+
 TEST_F(Program, APictureWithoutANameIsABadOption) {
     makeUsedDevice();
 
     const auto result = run({"--root", root().string(), "--screenshot", ""});
 
     EXPECT_EQ(result.status, 2);
-    EXPECT_EQ(
-        result.messages,
-        "settingshost: --screenshot: the name of a file expected (see settingshost --help)\n");
+    EXPECT_EQ(result.messages, "settingshost: --screenshot: is empty (see settingshost --help)\n");
 }
 
 TEST_F(Program, APathThatIsEmptyIsABadOption) {
