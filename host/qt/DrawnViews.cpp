@@ -36,9 +36,16 @@ int DrawnViews::rowCount(const QModelIndex& parent) const {
 }
 
 QHash<int, QByteArray> DrawnViews::roleNames() const {
-    return {{KindRole, "kind"},           {FrameRole, "frame"},       {TextRole, "text"},
-            {PlainTextRole, "plainText"}, {FontRole, "textFont"},     {OpacityRole, "viewOpacity"},
-            {IsEnabledRole, "isEnabled"}, {ProgressRole, "progress"}, {IsTurningRole, "isTurning"},
+    return {{KindRole, "kind"},
+            {FrameRole, "frame"},
+            {TextRole, "text"},
+            {PlainTextRole, "plainText"},
+            {FontRole, "textFont"},
+            {OpacityRole, "viewOpacity"},
+            {IsEnabledRole, "isEnabled"},
+            {ProgressRole, "progress"},
+            {IsProgressAnimatedRole, "isProgressAnimated"},
+            {IsTurningRole, "isTurning"},
             {SourceRole, "source"}};
 }
 
@@ -113,7 +120,9 @@ QHash<int, QVariant> DrawnViews::valuesOf(const View& view) const {
                 {IsEnabledRole, button->isEnabled() && button->isUserInteractionEnabled()}};
     }
     if (const auto* bar = dynamic_cast<const ProgressView*>(&view)) {
-        return {{KindRole, QStringLiteral("bar")}, {ProgressRole, bar->progress()}};
+        return {{KindRole, QStringLiteral("bar")},
+                {ProgressRole, bar->progress()},
+                {IsProgressAnimatedRole, bar->isProgressAnimated()}};
     }
     if (const auto* spinner = dynamic_cast<const ActivityIndicatorView*>(&view)) {
         return {{KindRole, QStringLiteral("spinner")}, {IsTurningRole, spinner->isAnimating()}};

@@ -36,6 +36,8 @@ public:
         IsEnabledRole,
         /// Of a bar, from 0 to 1.
         ProgressRole,
+        /// Whether the bar moves there, rather than jumps.
+        IsProgressAnimatedRole,
         IsTurningRole,
         /// The URL of a picture.
         SourceRole,

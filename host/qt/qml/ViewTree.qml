@@ -156,7 +156,7 @@ Item {
                         color: Theme.accent
 
                         Behavior on width {
-                            enabled: Theme.calm > 0
+                            enabled: Theme.calm > 0 && view.isProgressAnimated === true
                             NumberAnimation {
                                 duration: Theme.calm
                             }
