@@ -1,10 +1,10 @@
 #include "tools/mrctl/NamedValues.h"
 
 #include "tools/mrctl/Characters.h"
+#include "tools/mrctl/PlainValues.h"
 #include "tools/mrctl/SecretNames.h"
 
 #include <algorithm>
-#include <array>
 #include <optional>
 #include <string>
 
@@ -47,29 +47,6 @@ std::size_t sizeOfFirstWord(std::string_view text, std::size_t begin) {
            begin;
 }
 
-/// Whether the value at `begin` tells nothing: `null`, `true` and the like.
-bool isPlainValue(std::string_view text, std::size_t begin) {
-    constexpr std::array<std::string_view, 8> words{"null", "true", "false", "nil",
-                                                    "none", "yes",  "no",    "(null)"};
-    const std::size_t end = endOfRun(text, begin, isAlphanumeric);
-    return std::ranges::find(words, lowerCase(text.substr(begin, end - begin))) != words.end();
-}
-
-/// Whether the value at `begin` is the number of an error, which is short.
-bool isErrorNumber(std::string_view text, std::size_t begin) {
-    constexpr std::size_t mostDigits = 3;
-    const std::size_t end = endOfRun(text, begin, isDigit);
-    return end > begin && end - begin <= mostDigits &&
-           (end == text.size() || !isAlphanumeric(text[end]));
-}
-
-/// Whether the value at `begin` is the identifier of an application or a notification.
-bool isIdentifier(std::string_view text, std::size_t begin) {
-    const std::string_view value = text.substr(begin);
-    return std::ranges::any_of(std::array{"com.", "org.", "net.", "io.", "dev."},
-                               [value](const char* start) { return value.starts_with(start); });
-}
-
 void addRest(std::string_view text, std::size_t begin, SecretKind kind, bool isSigned,
              Found& found) {
     if (begin >= text.size()) {
@@ -77,8 +54,8 @@ void addRest(std::string_view text, std::size_t begin, SecretKind kind, bool isS
     }
     const std::size_t size = sizeOfFirstWord(text, begin);
     const std::string_view word = text.substr(begin, size);
-    // What only a blank parts from a name may be any word.
-    const bool isSearched = isSigned || std::ranges::any_of(word, isDigit);
+    // What only a blank parts from a name may be any word, and "none" stands everywhere.
+    const bool isSearched = (isSigned && !isPlainWord(word)) || std::ranges::any_of(word, isDigit);
     found.push_back({.begin = begin,
                      .size = text.size() - begin,
                      .kind = kind,
@@ -108,6 +85,27 @@ std::optional<std::size_t> valueBehind(std::string_view text, std::size_t begin,
     return endOfRun(text, sign, isBeforeValue);
 }
 
+/// Where the value at `begin` begins to tell something, whose name is all of `name`, a part of
+/// `text`; the text's end where it does not.
+std::size_t startOfSecret(std::string_view text, std::string_view name, SecretKind kind,
+                          std::size_t begin) {
+    const auto end = static_cast<std::size_t>(name.data() - text.data()) + name.size();
+    const bool isHarmless = isPlainValue(text, end, begin) ||
+                            (lastWordOf(name) == "code" && isErrorNumber(text, begin));
+    if (isHarmless) {
+        return text.size();
+    }
+    const std::size_t behind = kind == SecretKind::user ? endOfIdentifier(text, begin) : begin;
+    if (behind == begin) {
+        return begin;
+    }
+    return isEndOfValue(text, end, begin, behind)
+               ? text.size()
+               : endOfRun(text, behind, [](char character) {
+                     return !isAlphanumeric(character) && !isBeyondAscii(character);
+                 });
+}
+
 /// The digits of a code that a sentence names: "your code is 482913".
 void findCodes(std::string_view text, std::size_t end, Found& found) {
     constexpr std::size_t leastDigits = 4;
@@ -132,12 +130,10 @@ void findSigned(std::string_view text, Found& found) {
         const std::string_view name = text.substr(begin, end - begin);
         if (const auto kind = kindOfValueNamed(name)) {
             const auto value = valueBehind(text, begin, end);
-            const bool isHarmless =
-                value && (isPlainValue(text, *value) ||
-                          (kind == SecretKind::user && isIdentifier(text, *value)) ||
-                          (lastWordOf(name) == "code" && isErrorNumber(text, *value)));
-            if (value && *value < text.size() && !isHarmless) {
-                addRest(text, *value, *kind, true, found);
+            const std::size_t secret = value ? startOfSecret(text, name, *kind, *value) : nowhere;
+            if (secret < text.size()) {
+                // What follows an identifier may be any word.
+                addRest(text, secret, *kind, secret == *value, found);
                 return;
             }
             if (*kind == SecretKind::secret) {
@@ -167,7 +163,7 @@ void findPasswords(std::string_view text, Found& found) {
             value = endOfRun(text, value, [](char character) {
                 return !isAlphanumeric(character) && !isBeyondAscii(character);
             });
-            if (value < text.size() && !isPlainValue(text, value)) {
+            if (value < text.size() && !isPlainValue(text, end, value)) {
                 addRest(text, value, SecretKind::secret, isSigned, found);
                 break;
             }

@@ -12,6 +12,8 @@
 namespace nimbra::mrctl {
 namespace {
 
+using Texts = std::vector<std::string>;
+
 constexpr auto root = "/srv/phone";
 
 /// A path in a home directory.
@@ -68,6 +70,43 @@ TEST(SecretPatternsTest, EverythingBehindTheNameOfASecretGoes) {
     EXPECT_EQ(marked("x?token=abc&n=5"), "x?token=<secret>");
     EXPECT_EQ(marked("password: null"), "password: null");
     EXPECT_EQ(marked("token=null user=ann"), "token=null user=<user>");
+}
+
+TEST(SecretPatternsTest, AValueThatBeginsWithAPlainWordIsStillASecret) {
+    for (const std::string& text :
+         Texts{"password: No dogs allowed 99", "password: no-hunter2", "password=yes!we-can",
+               "client_secret=no_way_jose", "secret=nil:9f8e", "token: null/Zx81",
+               "user: none Bob Miller", "email: none, ask Bob Miller",
+               "login with password no hunter", "password: no way: jose",
+               "user: com.example, Bob Miller", "username = io.Bob Miller",
+               R"({"tokens": [null, "hunter2"]})", R"({"tokens": [null, {"value": "hunter2"}]})",
+               "<user>none</user> Bob", "user=none</Bob Miller>"}) {
+        const std::string found = marked(text);
+        for (const std::string part : {"o dogs", "-hunter2", "yes", "_way", "9f8e", "Zx81", "Bob",
+                                       "Miller", "hunter", "jose"}) {
+            EXPECT_FALSE(found.contains(part)) << text << ": " << found;
+        }
+    }
+    EXPECT_EQ(marked("user: com.example.notes, Bob Miller"), "user: com.example.notes, <user>");
+    EXPECT_EQ(marked("user: com.example.notes. Bob Miller"), "user: com.example.notes. <user>");
+}
+
+TEST(SecretPatternsTest, AValueThatIsAPlainWordOrAnIdentifierStays) {
+    for (const std::string& text :
+         Texts{"token: (null), count: 5", R"({"token": null, "count": 5})", R"({"token": null},)",
+               R"({\"token\":null,\"count\":5})", R"({"a": {"tokens": [null]}, "b": 2})",
+               "<token>null</token><n>5</n>", "password: None.", "x?token=null&n=5",
+               "user=com.example.notes n=5", R"({"user": "com.example.notes", "n": 5})",
+               "notification name: com.example.changed.", "name: com.example.AppChanged"}) {
+        EXPECT_EQ(marked(text), text);
+    }
+    EXPECT_EQ(marked("password=no; user=none; token=x"), "password=no; user=none; token=<secret>");
+}
+
+TEST(SecretPatternsTest, APlainWordIsSearchedForNowhere) {
+    const auto found = findSecrets("email: none, ask Bob Miller", root);
+    ASSERT_EQ(found.size(), 1U);
+    EXPECT_EQ(found.front().searched, 0U);
 }
 
 TEST(SecretPatternsTest, NoValueIsLeftInAnyNotationOfItsName) {
