@@ -106,6 +106,23 @@ std::size_t startOfSecret(std::string_view text, std::string_view name, SecretKi
                  });
 }
 
+/// The end of the code that begins at `begin`, in one piece or with blanks between groups of as
+/// many digits each.
+std::size_t endOfCode(std::string_view text, std::size_t begin) {
+    const auto isPart = [](char character) { return isDigit(character) || character == '-'; };
+    std::size_t end = endOfRun(text, begin, isPart);
+    const std::size_t size = end - begin;
+    while (end < text.size() && text[end] == ' ') {
+        const std::size_t next = endOfRun(text, end + 1, isPart);
+        const bool goesOn = next < text.size() && isAlphanumeric(text[next]);
+        if (next - end - 1 != size || size < 2 || goesOn) {
+            break;
+        }
+        end = next;
+    }
+    return end;
+}
+
 /// The digits of a code that a sentence names: "your code is 482913".
 void findCodes(std::string_view text, std::size_t end, Found& found) {
     constexpr std::size_t leastDigits = 4;
@@ -113,8 +130,7 @@ void findCodes(std::string_view text, std::size_t end, Found& found) {
     if (text.substr(begin).starts_with("is ")) {
         begin = endOfRun(text, begin + 2, isBlank);
     }
-    const std::size_t behind = endOfRun(
-        text, begin, [](char character) { return isDigit(character) || character == '-'; });
+    const std::size_t behind = endOfCode(text, begin);
     if (begin > end && behind - begin >= leastDigits) {
         found.push_back({.begin = begin, .size = behind - begin, .kind = SecretKind::secret});
     }

@@ -121,7 +121,12 @@ std::size_t endOfIdentifier(std::string_view text, std::size_t begin) {
 bool isErrorNumber(std::string_view text, std::size_t begin) {
     constexpr std::size_t mostDigits = 3;
     const std::size_t end = endOfRun(text, begin, isDigit);
-    return end > begin && end - begin <= mostDigits &&
+    // "482-913" is one number.
+    const std::size_t next = endOfRun(text, end, [](char character) {
+        return isBlank(character) || std::string_view("-./").contains(character);
+    });
+    const bool goesOn = next < text.size() && isDigit(text[next]);
+    return end > begin && end - begin <= mostDigits && !goesOn &&
            (end == text.size() || !isAlphanumeric(text[end]));
 }
 

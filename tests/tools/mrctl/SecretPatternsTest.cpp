@@ -178,6 +178,20 @@ TEST(SecretPatternsTest, WaysToLogInAreFollowedBySecrets) {
     EXPECT_EQ(marked("code is 482913."), "code is <secret>.");
 }
 
+TEST(SecretPatternsTest, CodesInGroupsAreFound) {
+    EXPECT_EQ(marked("code: 482-913"), "code: <secret>");
+    EXPECT_EQ(marked("verification code: 482-913 x"), "verification code: <secret>");
+    EXPECT_EQ(marked("code: 482 913"), "code: <secret>");
+    EXPECT_EQ(marked("code=48 29 13"), "code=<secret>");
+    EXPECT_EQ(marked("your code is 482 913."), "your code is <secret>.");
+    EXPECT_EQ(marked("your code is 482-913."), "your code is <secret>.");
+    for (const std::string& text :
+         Texts{"error code: 17, 3 retries", "code: 17 (x)", "code: 482.", "the code is 17 2024",
+               "the exit code is 12 34kB", "the code 404 again"}) {
+        EXPECT_EQ(marked(text), text);
+    }
+}
+
 TEST(SecretPatternsTest, TokensAreFound) {
     EXPECT_EQ(marked("key 0123456789abcdef."), "key <secret>.");
     EXPECT_EQ(marked("6f9619ff-8b86-d011-b42d-00c04fc964ff"), "<secret>");
