@@ -1,6 +1,8 @@
 #include "tools/mrctl/TokenPatterns.h"
 
 #include "tools/mrctl/Characters.h"
+#include "tools/mrctl/NetworkAddresses.h"
+#include "tools/mrctl/Pieces.h"
 
 #include <algorithm>
 #include <array>
@@ -11,7 +13,6 @@ namespace nimbra::mrctl {
 namespace {
 
 using Found = std::vector<FoundSecret>;
-using Pieces = std::vector<std::string_view>;
 
 /// Fewer characters are no token.
 constexpr std::size_t leastToken = 12;
@@ -86,18 +87,6 @@ bool isCode(std::string_view piece) {
                (withoutEnd.size() >= leastCode && isCodeOfLetters(withoutEnd));
     }
     return isCodeOfLetters(piece);
-}
-
-Pieces piecesOf(std::string_view run) {
-    Pieces pieces;
-    for (std::size_t begin = 0; begin < run.size();) {
-        const std::size_t end = endOfRun(run, begin, isAlphanumeric);
-        if (end > begin) {
-            pieces.push_back(run.substr(begin, end - begin));
-        }
-        begin = end + 1;
-    }
-    return pieces;
 }
 
 /// "2024-03-05", whatever follows.
@@ -202,40 +191,6 @@ void findPrefixed(std::string_view text, Found& found) {
             }
             at = text.find(start, end);
         }
-    }
-}
-
-/// "3c:22:fb:9e:01:ab" and "2001:db8::1", but no time.
-void findNetworkAddresses(std::string_view text, Found& found) {
-    constexpr std::ptrdiff_t leastColons = 4;
-    constexpr std::size_t octets = 4;
-    const auto isPart = [](char character) {
-        return isHexadecimal(character) || character == ':' || character == '.' || character == '-';
-    };
-    for (std::size_t begin = 0; begin < text.size();) {
-        const std::size_t end = endOfRun(text, begin, isPart);
-        const std::string_view run = text.substr(begin, end - begin);
-        const bool isApart = (begin == 0 || !isAlphanumeric(text[begin - 1])) &&
-                             (end == text.size() || !isAlphanumeric(text[end]));
-        const std::string_view host = run.substr(0, run.find(':'));
-        const Pieces parts = piecesOf(host);
-        const bool isQuad =
-            parts.size() == octets && std::ranges::count(host, '.') == 3 &&
-            std::ranges::all_of(
-                parts,
-                [](auto part) { return part.size() <= 3 && std::ranges::all_of(part, isDigit); }) &&
-            // "1.2.3.4" is a version.
-            parts.front().size() > 1;
-        const Pieces pairs = piecesOf(run);
-        const bool isCard =
-            pairs.size() == 6 &&
-            std::ranges::all_of(pairs, [](auto pair) { return pair.size() == 2; }) &&
-            std::ranges::count(run, '-') == 5;
-        if (isApart && (std::ranges::count(run, ':') >= leastColons || isQuad || isCard) &&
-            std::ranges::any_of(run, isHexadecimal)) {
-            found.push_back({.begin = begin, .size = run.size(), .kind = SecretKind::secret});
-        }
-        begin = std::max(end, begin + 1);
     }
 }
 

@@ -207,6 +207,27 @@ TEST(SecretPatternsTest, TokensAreFound) {
     }
 }
 
+TEST(SecretPatternsTest, AddressesOfTheNetworkAreFoundHoweverShort) {
+    for (const std::string& address :
+         Texts{"2001:db8::1", "fe80::1", "fe80::1%eth0", "2a02:8108::1", "::ffff:10.1.2.3", "::1",
+               "2001:db8::", "fdab:cafe::beef", "fe80::abcd:ef", "8.8.8.8:53", "10.1.2.3:8080"}) {
+        for (const std::string sign : {"", ".", ": refused", "-", ", 5"}) {
+            EXPECT_EQ(marked("peer " + address + sign), "peer <secret>" + sign) << address;
+        }
+        EXPECT_EQ(marked("(" + address + ")"), "(<secret>)") << address;
+    }
+    EXPECT_EQ(marked("to [2001:db8::1]:443"), "to [<secret>]:443");
+    EXPECT_EQ(marked("net 2001:db8::1/32"), "net <secret>/32");
+    EXPECT_EQ(marked("peer:fe80::1 eth0:2a02:8108::1"), "peer:<secret> eth0:<secret>");
+    for (const std::string& text :
+         Texts{"a::b", "std::abs", "dead::beef", "ad::Face::add", "in a::b: 12", "14:07:09",
+               "::", "at 14:07:09: x", "setEnabled:forDataclass:", "add:be:face:dead:", "x::1a",
+               "version 1.2.3.4: new", "1.2.3.4", "ratio 1:2", "a.cc::12", ":1::2", "1:::2",
+               "12345::1", "1::2-3"}) {
+        EXPECT_EQ(marked(text), text);
+    }
+}
+
 /// Few of many random tokens may look like words.
 TEST(SecretPatternsTest, RandomTokensAreFound) {
     std::mt19937 random(7); // NOLINT(cert-msc51-cpp): the same tokens each time
