@@ -1,6 +1,7 @@
 #include "tools/mrctl/TokenPatterns.h"
 
 #include "tools/mrctl/Characters.h"
+#include "tools/mrctl/GroupedNumbers.h"
 #include "tools/mrctl/NetworkAddresses.h"
 #include "tools/mrctl/Pieces.h"
 
@@ -191,62 +192,6 @@ void findPrefixed(std::string_view text, Found& found) {
             }
             at = text.find(start, end);
         }
-    }
-}
-
-constexpr std::size_t digitGroup = 4;
-
-bool beginsTelephone(char character) {
-    return character == '+' || character == '(';
-}
-
-/// Where the number that may begin at `begin` ends, behind its last digit; `begin` for none.
-std::size_t endOfGroupedNumber(std::string_view text, std::size_t begin) {
-    const char first = text[begin];
-    const bool isPhone = beginsTelephone(first);
-    std::size_t end = begin;
-    if (!isUpper(first)) {
-        end = endOfRun(text, begin, [isPhone](char character) {
-            return isDigit(character) || std::string_view(" -").contains(character) ||
-                   (isPhone && std::string_view("+()/.").contains(character));
-        });
-    } else if (text.size() > begin + digitGroup && isUpper(text[begin + 1]) &&
-               isDigit(text[begin + 2]) && isDigit(text[begin + 3])) {
-        // Two letters of a country, then groups.
-        end = endOfRun(text, begin + 2,
-                       [](char character) { return isDigit(character) || character == ' '; });
-    }
-    while (end > begin && !isDigit(text[end - 1])) {
-        --end;
-    }
-    return end;
-}
-
-/// Whether all groups but the last are of four characters, and that is no longer.
-bool areFours(const Pieces& groups) {
-    return groups.size() >= 3 &&
-           std::ranges::all_of(groups.begin(), groups.end() - 1,
-                               [](auto part) { return part.size() == digitGroup; }) &&
-           groups.back().size() <= digitGroup;
-}
-
-/// Numbers that are written in groups: of telephones, cards and accounts.
-void findGroupedNumbers(std::string_view text, Found& found) {
-    constexpr std::size_t leastDigits = 8;
-    for (std::size_t begin = 0; begin < text.size(); ++begin) {
-        const char first = text[begin];
-        const bool isApart = begin == 0 || !isAlphanumeric(text[begin - 1]);
-        const bool mayBegin = isApart && (beginsTelephone(first) || isAlphanumeric(first));
-        const std::size_t end = mayBegin ? endOfGroupedNumber(text, begin) : begin;
-        if (end == begin) {
-            continue;
-        }
-        const std::string_view run = text.substr(begin, end - begin);
-        const auto digits = static_cast<std::size_t>(std::ranges::count_if(run, isDigit));
-        if (beginsTelephone(first) ? digits >= leastDigits : areFours(piecesOf(run))) {
-            found.push_back({.begin = begin, .size = run.size(), .kind = SecretKind::secret});
-        }
-        begin = end - 1;
     }
 }
 

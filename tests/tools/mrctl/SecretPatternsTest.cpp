@@ -228,6 +228,41 @@ TEST(SecretPatternsTest, AddressesOfTheNetworkAreFoundHoweverShort) {
     }
 }
 
+TEST(SecretPatternsTest, NumbersOfTelephonesAreFound) {
+    for (const std::string& number :
+         Texts{"0170 1234567", "0170-1234567", "030 12345678", "030/1234567", "030 / 1234567",
+               "0049 170 1234567", "01 23 45 67 89", "01-23-45-67-89", "0170/123 45 67",
+               "555-123-4567", "555 123-4567", "1-555-123-4567", "1 555-123-4567"}) {
+        EXPECT_EQ(marked("call " + number + ", now"), "call <secret>, now");
+        EXPECT_EQ(marked("12:30 to:" + number + "."), "12:30 to:<secret>.");
+        EXPECT_EQ(marked("2024-03-05 14:07:09 " + number), "2024-03-05 14:07:09 <secret>");
+        EXPECT_EQ(marked(number + " 2024-03-05 14:07"), "<secret> 2024-03-05 14:07");
+    }
+    EXPECT_EQ(marked("of +1 (555) 123-4567 and 0170 1234567"), "of <secret> and <secret>");
+    for (const std::string& text : Texts{"2024-03-05 14:07:09",
+                                         "03-05-2024 14:07:09",
+                                         "05/03/2024 14:07",
+                                         "05/03/24 14:07:09",
+                                         "05 03 2024 14:07:09",
+                                         "14:07:09 20240305",
+                                         "0.123 456789",
+                                         "0 of 12 files",
+                                         "0 1234567 bytes",
+                                         "version 01.02-3456789",
+                                         "objects/01/23456789",
+                                         "00:00:01",
+                                         "part-01-2345678",
+                                         "0170 1234567kB",
+                                         "0170 123.4567",
+                                         "555-123-4567-89",
+                                         "555/123-4567",
+                                         "100 200 3000",
+                                         "0170 123",
+                                         "01.23 45678901"}) {
+        EXPECT_EQ(marked(text), text);
+    }
+}
+
 /// Few of many random tokens may look like words.
 TEST(SecretPatternsTest, RandomTokensAreFound) {
     std::mt19937 random(7); // NOLINT(cert-msc51-cpp): the same tokens each time
