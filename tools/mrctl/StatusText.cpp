@@ -3,6 +3,7 @@
 #include "device/DeviceError.h"
 #include "platform/accounts/Dataclass.h"
 
+#include <algorithm>
 #include <cmath>
 
 namespace nimbra::mrctl {
@@ -60,14 +61,21 @@ std::string lastSyncText(const DeviceDescription& documents) {
     return text + '\n';
 }
 
+/// Not rounded up: only what is complete shows as complete.
+std::string percentage(double fraction) {
+    constexpr double hundred = 100;
+    // 0.29 times 100 is a little less than 29.
+    constexpr double tolerance = 1e-4;
+    const double most = fraction < 1 ? hundred - 1 : hundred;
+    const double whole = std::floor((fraction * hundred) + tolerance);
+    return std::to_string(static_cast<int>(std::min(whole, most))) + " %";
+}
+
 std::string progressText(const DeviceContents& contents) {
-    constexpr double percent = 100;
     std::string text = heading("Under way", contents.progress.empty());
     for (const auto& [name, values] : contents.progress) {
         text += "  " + name + ": ";
-        text += values.indeterminate
-                    ? std::string("for some time")
-                    : std::to_string(std::lround(values.fraction * percent)) + " %";
+        text += values.indeterminate ? "for some time" : percentage(values.fraction);
         for (const Text& words : {values.description, values.additional}) {
             text += words.string().empty() ? "" : ", " + oneLine(words.string());
         }

@@ -1,6 +1,7 @@
 #include "tests/tools/mrctl/Diagnosis.h"
 
 #include <gtest/gtest.h>
+#include <utility>
 
 namespace nimbra::test {
 namespace {
@@ -40,6 +41,24 @@ TEST(MrctlStatusTest, TheTextTellsWhatTheServiceKnows) {
                              "Last sync: 2024-03-05T13:00:00Z (Last synced at one)\n"
                              "Under way:\n"
                              "  up: 40 %, Uploading Tax.pdf\n");
+}
+
+TEST(MrctlStatusTest, OnlyASyncThatIsCompleteShowsAsComplete) {
+    const Diagnosis diagnosis;
+    diagnosis.make(synced());
+    for (const auto& [fraction, words] : {std::pair{"0", "0 %"},
+                                          {"0.29", "29 %"},
+                                          {"0.999", "99 %"},
+                                          {"0.9999999", "99 %"},
+                                          {"1", "100 %"}}) {
+        diagnosis.write("/run/nimbra/progress/up.json",
+                        std::string(R"({"fraction": )") + fraction + '}');
+
+        const ProgramResult result = diagnosis.run({"status"});
+
+        EXPECT_TRUE(result.output.ends_with(std::string("\n  up: ") + words + '\n'))
+            << fraction << ": " << result.output;
+    }
 }
 
 TEST(MrctlStatusTest, ADeviceThatKnowsNothingSaysSo) {
