@@ -4,7 +4,10 @@
 
 #include <CLI/CLI.hpp>
 #include <iostream>
+#include <ranges>
+#include <span>
 #include <sstream>
+#include <string_view>
 
 namespace nimbra::mrctl {
 
@@ -31,6 +34,29 @@ void addStatus(CLI::App& app, Arguments& arguments) {
     CLI::App* const command = app.add_subcommand("status", "Print what the document service knows");
     command->callback([&arguments] { arguments.command = Command::status; });
     command->add_flag("--json", arguments.asJson, "Print an object, for a program");
+}
+
+/// The first option among `words`, which begin with the program's name, that has nothing behind its
+/// sign, "--root=": the word behind it would be taken for its value. Empty where there is none;
+/// what stands behind "--" is no option.
+std::string optionWithoutValue(std::span<char* const> words) {
+    constexpr std::size_t leastSize = 4;
+    for (const std::string_view word : words | std::views::drop(1)) {
+        if (word == "--") {
+            break;
+        }
+        if (word.size() >= leastSize && word.starts_with("--") &&
+            word.find('=') == word.size() - 1) {
+            return std::string(word.substr(0, word.size() - 1));
+        }
+    }
+    return {};
+}
+
+/// Says that the command line makes no sense, and why; the exit status.
+int refused(const std::string& why) {
+    std::cerr << "mrctl: " + device::oneLine(why) + " (see mrctl --help)\n";
+    return exitBadArguments;
 }
 
 /// Prints the help or the version that `wish` asks for; the exit status.
@@ -61,14 +87,18 @@ std::expected<Arguments, int> Arguments::parse(int count, char** words) {
         ->check(problemOfPath);
     addDiagnose(app, arguments);
     addStatus(app, arguments);
+    const std::string option =
+        optionWithoutValue(std::span(words, static_cast<std::size_t>(count)));
+    if (!option.empty()) {
+        return std::unexpected(refused(option + ": is empty"));
+    }
     try {
         app.parse(count, words);
     } catch (const CLI::ParseError& error) {
         if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
             return std::unexpected(printed(app, error));
         }
-        std::cerr << "mrctl: " + device::oneLine(error.what()) + " (see mrctl --help)\n";
-        return std::unexpected(exitBadArguments);
+        return std::unexpected(refused(error.what()));
     }
     return arguments;
 }

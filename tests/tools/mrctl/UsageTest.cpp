@@ -35,6 +35,29 @@ TEST(MrctlUsageTest, BadArgumentsAreOneLineAndStatusTwo) {
     }
 }
 
+TEST(MrctlUsageTest, AnOptionWithNothingBehindItsSignIsEmpty) {
+    for (const auto& line :
+         {Strings{"--root=", "status"}, {"status", "--root="}, {"--root=", "--version"}}) {
+        const ProgramResult result = run(line);
+        EXPECT_EQ(result.status, 2);
+        EXPECT_EQ(result.output, "");
+        EXPECT_EQ(result.messages, "mrctl: --root: is empty (see mrctl --help)\n");
+    }
+}
+
+TEST(MrctlUsageTest, BehindTwoHyphensIsNoOption) {
+    const Diagnosis diagnosis;
+    diagnosis.make({});
+
+    const ProgramResult result = runProgram(
+        {"sh", "-c", "cd \"$1\" && exec \"$0\" --root \"$2\" diagnose -- --root=", NIMBRA_MRCTL,
+         diagnosis.place().string(), diagnosis.root().string()},
+        {"PATH=/usr/bin:/bin"});
+
+    EXPECT_EQ(result.status, 0) << result.messages;
+    EXPECT_EQ(diagnosis.namesInPlace(), Strings{"--root="});
+}
+
 TEST(MrctlUsageTest, HelpAndVersionGoToStandardOutput) {
     EXPECT_EQ(run({"--version"}).output, "mrctl " NIMBRA_VERSION "\n");
     for (const auto& line : {std::vector<std::string>{"--help"}, {"diagnose", "--help"}}) {
