@@ -3,11 +3,13 @@
 #include "device/DeviceError.h"
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <iostream>
 #include <ranges>
 #include <span>
 #include <sstream>
 #include <string_view>
+#include <vector>
 
 namespace nimbra::mrctl {
 
@@ -59,6 +61,19 @@ int refused(const std::string& why) {
     return exitBadArguments;
 }
 
+/// What is wrong: with the first word that stands in the place of a command, if there is one.
+std::string problemOf(const CLI::App& app, const CLI::ParseError& error) {
+    const std::vector<std::string> words = app.remaining();
+    const auto unknown = std::ranges::find_if(words, [](const auto& word) { return word != "--"; });
+    const bool lacksCommand =
+        error.get_exit_code() == static_cast<int>(CLI::ExitCodes::RequiredError) &&
+        app.get_subcommands().empty();
+    if (!lacksCommand || unknown == words.end()) {
+        return error.what();
+    }
+    return *unknown + (unknown->starts_with('-') ? ": no such option" : ": no such command");
+}
+
 /// Prints the help or the version that `wish` asks for; the exit status.
 int printed(const CLI::App& app, const CLI::ParseError& wish) {
     std::ostringstream text;
@@ -98,7 +113,7 @@ std::expected<Arguments, int> Arguments::parse(int count, char** words) {
         if (error.get_exit_code() == static_cast<int>(CLI::ExitCodes::Success)) {
             return std::unexpected(printed(app, error));
         }
-        return std::unexpected(refused(error.what()));
+        return std::unexpected(refused(problemOf(app, error)));
     }
     return arguments;
 }

@@ -35,6 +35,15 @@ TEST(MrctlUsageTest, BadArgumentsAreOneLineAndStatusTwo) {
     }
 }
 
+TEST(MrctlUsageTest, AWordThatIsNoCommandIsNamed) {
+    EXPECT_EQ(run({"frob"}).messages, "mrctl: frob: no such command (see mrctl --help)\n");
+    EXPECT_EQ(run({"--root", "/", "frob", "x"}).messages,
+              "mrctl: frob: no such command (see mrctl --help)\n");
+    EXPECT_EQ(run({"--frob"}).messages, "mrctl: --frob: no such option (see mrctl --help)\n");
+    EXPECT_EQ(run({}).messages, "mrctl: A subcommand is required (see mrctl --help)\n");
+    EXPECT_TRUE(run({"diagnose"}).messages.contains("PATH")) << run({"diagnose"}).messages;
+}
+
 TEST(MrctlUsageTest, AnOptionWithNothingBehindItsSignIsEmpty) {
     for (const auto& line :
          {Strings{"--root=", "status"}, {"status", "--root="}, {"--root=", "--version"}}) {
