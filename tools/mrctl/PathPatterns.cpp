@@ -36,15 +36,47 @@ std::string_view closingOf(std::string_view before) {
     return {};
 }
 
+/// `text` without the domain and the code of an error at its end: " (PlatformErrorDomain 5)".
+std::string_view withoutCode(std::string_view text) {
+    const std::size_t open = text.rfind(" (");
+    if (open == nowhere) {
+        return text;
+    }
+    const std::size_t domain = endOfRun(text, open + 2, isLetter);
+    const std::size_t code = domain + (text.substr(domain, 1) == " " ? 1 : 0);
+    const std::size_t end = endOfRun(text, code, isDigit);
+    const bool isCode = domain > open + 2 && code > domain && end > code && text.substr(end) == ")";
+    return isCode ? text.substr(0, open) : text;
+}
+
 /// Whether the system says `text` of an error.
 bool isSystemMessage(std::string_view text) {
     constexpr int lastError = 133;
+    text = withoutCode(text);
     for (int number = 1; number <= lastError; ++number) {
         if (std::generic_category().message(number) == text) {
             return true;
         }
     }
     return false;
+}
+
+/// Where the place of an error in a file that is no JSON begins, ": line 1, column 14: not JSON: ",
+/// from `begin` on.
+std::size_t startOfPlace(std::string_view text, std::size_t begin) {
+    constexpr std::string_view line = ": line ";
+    constexpr std::string_view column = ", column ";
+    for (std::size_t at = text.find(line, begin); at != nowhere; at = text.find(line, at + 1)) {
+        const std::size_t behindLine = endOfRun(text, at + line.size(), isDigit);
+        if (!text.substr(behindLine).starts_with(column)) {
+            continue;
+        }
+        const std::size_t behind = endOfRun(text, behindLine + column.size(), isDigit);
+        if (text.substr(behind).starts_with(": not JSON: ")) {
+            return at;
+        }
+    }
+    return nowhere;
 }
 
 /// Where the path that begins at `begin` ends at the latest.
@@ -65,6 +97,7 @@ std::size_t endOfPath(std::string_view text, std::size_t begin) {
          {": expected ", ": cannot be ", ": is a ", ": is not ", ": is larger "}) {
         end = std::min(end, text.find(words, begin));
     }
+    end = std::min(end, startOfPlace(text, begin));
     while (end > begin &&
            (std::string_view(".,;:!?)]}\\'\"").contains(text[end - 1]) || isBlank(text[end - 1]))) {
         --end;
@@ -127,6 +160,22 @@ bool isEverywhere(std::string_view path) {
     return path.starts_with(settings) || path.starts_with(processes);
 }
 
+/// Whether `path` is the folder for what a diagnosis makes, or one above it: in a home, but in the
+/// same one on every device.
+bool isDiagnosticFolder(std::string_view path) {
+    constexpr std::string_view home = "/var/mobile";
+    constexpr std::string_view folder =
+        "/var/mobile/Library/Logs/CrashReporter/DiagnosticLogs/Stratafile";
+    return isIn(path, home) && (isIn(folder, path));
+}
+
+/// Whether nothing at `end` goes on with the path that ends there: neither a blank nor a letter.
+bool isEndOfPath(std::string_view text, std::size_t end) {
+    const std::string_view rest = text.substr(end);
+    return rest.empty() || rest == "." || rest.starts_with(": ") || isQuote(rest[0]) ||
+           std::string_view(")]>").contains(rest[0]);
+}
+
 /// The end of the path that begins at `begin` where it says nothing of its user: before ": ", a
 /// quotation mark or a blank, without the end of a sentence; `begin` where it does say something.
 std::size_t endOfPublicPath(std::string_view text, std::size_t begin, std::size_t skipped) {
@@ -139,10 +188,12 @@ std::size_t endOfPublicPath(std::string_view text, std::size_t begin, std::size_
     while (end > begin && text[end - 1] == '.') {
         --end;
     }
-    return isEverywhere(
-               text.substr(begin + skipped, std::max(end, begin + skipped) - begin - skipped))
-               ? end
-               : begin;
+    const std::string_view path =
+        text.substr(begin + skipped, std::max(end, begin + skipped) - begin - skipped);
+    // In a home, a blank may be one of a name.
+    const bool isPublic =
+        isEverywhere(path) || (isDiagnosticFolder(path) && isEndOfPath(text, end));
+    return isPublic ? end : begin;
 }
 
 bool canStartName(char character) {
@@ -166,8 +217,9 @@ std::size_t startOfPath(std::string_view text, std::size_t slash) {
 
 /// The beginning of the first place in `text` that only homes have, whatever stands before it.
 std::size_t startOfHome(std::string_view text) {
-    constexpr std::array<std::string_view, 6> signs{"\\Users\\", "\\home\\",      "$HOME",
-                                                    "${HOME}",   "%USERPROFILE%", "/var/mobile"};
+    constexpr std::array<std::string_view, 5> signs{"\\Users\\", "\\home\\", "$HOME", "${HOME}",
+                                                    "%USERPROFILE%"};
+    constexpr std::string_view home = "/var/mobile";
     constexpr std::array<std::string_view, 7> folders{"home", "Users",   "root",    "media",
                                                       "mnt",  "Volumes", "run/user"};
     constexpr std::size_t longestHost = 64;
@@ -175,6 +227,11 @@ std::size_t startOfHome(std::string_view text) {
     for (const std::string_view sign : signs) {
         first = std::min(first, text.find(sign));
     }
+    std::size_t mobile = text.find(home);
+    while (mobile != nowhere && endOfPublicPath(text, mobile, 0) > mobile) {
+        mobile = text.find(home, mobile + 1);
+    }
+    first = std::min(first, mobile);
     for (const std::string_view folder : folders) {
         first = std::min(first, text.find('/' + std::string(folder) + '/'));
     }
