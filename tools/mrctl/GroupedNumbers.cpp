@@ -16,6 +16,10 @@ bool beginsTelephone(char character) {
     return character == '+' || character == '(';
 }
 
+bool isOfTelephone(char character) {
+    return isDigit(character) || std::string_view(" -+()/.").contains(character);
+}
+
 /// Where the number that may begin at `begin` ends, behind its last digit; `begin` for none.
 std::size_t endOfGroupedNumber(std::string_view text, std::size_t begin) {
     const char first = text[begin];
@@ -23,8 +27,8 @@ std::size_t endOfGroupedNumber(std::string_view text, std::size_t begin) {
     std::size_t end = begin;
     if (!isUpper(first)) {
         end = endOfRun(text, begin, [isPhone](char character) {
-            return isDigit(character) || std::string_view(" -").contains(character) ||
-                   (isPhone && std::string_view("+()/.").contains(character));
+            return isPhone ? isOfTelephone(character)
+                           : isDigit(character) || std::string_view(" -").contains(character);
         });
     } else if (text.size() > begin + digitGroup && isUpper(text[begin + 1]) &&
                isDigit(text[begin + 2]) && isDigit(text[begin + 3])) {
@@ -55,6 +59,9 @@ void findSignedNumbers(std::string_view text, std::vector<FoundSecret>& found) {
         const bool mayBegin = isApart && (beginsTelephone(first) || isAlphanumeric(first));
         const std::size_t end = mayBegin ? endOfGroupedNumber(text, begin) : begin;
         if (end == begin) {
+            // Signs without a digit are not looked at from each of them on.
+            begin = mayBegin && beginsTelephone(first) ? endOfRun(text, begin, isOfTelephone) - 1
+                                                       : begin;
             continue;
         }
         const std::string_view run = text.substr(begin, end - begin);
