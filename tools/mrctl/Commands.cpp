@@ -32,6 +32,10 @@ std::expected<std::filesystem::path, Error> canonicalRoot(const std::filesystem:
 }
 
 std::expected<void, Error> diagnose(const Arguments& arguments, const DevicePaths& paths) {
+    // An archive of a directory that is no device would tell nothing, and look as if it did.
+    if (auto checked = device::checkStateFolder(paths); !checked) {
+        return checked;
+    }
     const std::filesystem::path archive = arguments.path;
     const auto contents = DeviceContents::read(paths, !arguments.withoutLog);
     return ArchiveFile::write(archive, Report::of(contents, paths.root(), archive.filename()));

@@ -77,16 +77,22 @@ TEST(MrctlUsageTest, HelpAndVersionGoToStandardOutput) {
     }
 }
 
-TEST(MrctlUsageTest, ADirectoryThatIsNoDeviceHasNoStatus) {
+TEST(MrctlUsageTest, ADirectoryThatIsNoDeviceHasNoStatusAndNoArchive) {
     const TemporaryDirectory directory;
+    const std::string archive = directory.path().string() + "/archive.tar.gz";
     for (const std::string& root :
          Strings{directory.path().string(), directory.path().string() + "/no"}) {
-        const ProgramResult result = run({"--root", root, "status"});
-        EXPECT_EQ(result.status, 1);
-        EXPECT_EQ(result.output, "");
-        EXPECT_TRUE(result.messages.starts_with("mrctl: " + root + ": ")) << result.messages;
-        EXPECT_EQ(std::ranges::count(result.messages, '\n'), 1);
+        for (const Strings& command : {Strings{"status"}, Strings{"diagnose", archive}}) {
+            Strings arguments{"--root", root};
+            arguments.insert(arguments.end(), command.begin(), command.end());
+            const ProgramResult result = run(arguments);
+            EXPECT_EQ(result.status, 1);
+            EXPECT_EQ(result.output, "");
+            EXPECT_TRUE(result.messages.starts_with("mrctl: " + root + ": ")) << result.messages;
+            EXPECT_EQ(std::ranges::count(result.messages, '\n'), 1);
+        }
     }
+    EXPECT_FALSE(std::filesystem::exists(archive));
 }
 
 } // namespace
