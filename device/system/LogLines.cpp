@@ -73,7 +73,7 @@ std::expected<std::string, Error> endOf(const std::filesystem::path& path) {
     const std::size_t end = content.find('\n');
     content.erase(0, end == std::string::npos ? end : end + 1);
     const off_t leftOut = status.st_size - static_cast<off_t>(content.size());
-    return "(" + std::to_string(leftOut) + " bytes are left out here)\n" + content;
+    return "(left out here: " + std::to_string(leftOut) + " bytes)\n" + content;
 }
 
 std::vector<std::string> linesOf(std::string_view content) {

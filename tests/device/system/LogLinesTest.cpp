@@ -65,14 +65,14 @@ TEST_F(LogLinesTest, OfALargeFileWholeLinesAreRead) {
     EXPECT_GT(end.size(), 8'000'000U);
     EXPECT_TRUE(content.ends_with('\n' + end));
     EXPECT_EQ(lines.front(),
-              "(" + std::to_string(content.size() - end.size()) + " bytes are left out here)");
+              "(left out here: " + std::to_string(content.size() - end.size()) + " bytes)");
 }
 
 TEST_F(LogLinesTest, AHoleBetweenTwoFilesIsTold) {
     write("settings.1.log", "earlier\n");
     write("settings.log", std::string(9'000'000, 'x') + "\nlast\n");
 
-    EXPECT_EQ(newest(100), (Lines{"earlier", "(9000001 bytes are left out here)", "last"}));
+    EXPECT_EQ(newest(100), (Lines{"earlier", "(left out here: 9000001 bytes)", "last"}));
     EXPECT_EQ(newest(1), Lines{"last"});
 }
 
@@ -80,8 +80,8 @@ TEST_F(LogLinesTest, ALineThatIsTooLongIsLeftOutAndTold) {
     for (const std::string end : {"", "\n"}) {
         write("settings.log", std::string(9'000'000, 'x') + end);
 
-        EXPECT_EQ(newest(100), Lines{"(" + std::to_string(9'000'000 + end.size()) +
-                                     " bytes are left out here)"});
+        EXPECT_EQ(newest(100),
+                  Lines{"(left out here: " + std::to_string(9'000'000 + end.size()) + " bytes)"});
     }
 }
 
