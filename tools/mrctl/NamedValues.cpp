@@ -89,8 +89,8 @@ std::optional<std::size_t> valueBehind(std::string_view text, std::size_t begin,
 /// `text`; the text's end where it does not.
 std::size_t startOfSecret(std::string_view text, std::string_view name, SecretKind kind,
                           std::size_t begin) {
-    const auto end = static_cast<std::size_t>(name.data() - text.data()) + name.size();
-    const bool isHarmless = isPlainValue(text, end, begin) ||
+    const auto behindName = static_cast<std::size_t>(name.data() - text.data()) + name.size();
+    const bool isHarmless = isPlainValue(text, behindName, begin) ||
                             (lastWordOf(name) == "code" && isErrorNumber(text, begin));
     if (isHarmless) {
         return text.size();
@@ -99,7 +99,7 @@ std::size_t startOfSecret(std::string_view text, std::string_view name, SecretKi
     if (behind == begin) {
         return begin;
     }
-    return isEndOfValue(text, end, begin, behind)
+    return isEndOfValue(text, behindName, begin, behind)
                ? text.size()
                : endOfRun(text, behind, [](char character) {
                      return !isAlphanumeric(character) && !isBeyondAscii(character);

@@ -80,26 +80,32 @@ std::string_view withoutSigns(std::string_view run) {
     return run;
 }
 
+/// What of `run` stands behind the word that it begins in: "peer:fe80::1".
+std::string_view behindWord(std::string_view run) {
+    const std::size_t colon = run.find(':');
+    return colon == std::string_view::npos || run.substr(colon).starts_with("::")
+               ? std::string_view()
+               : run.substr(colon + 1);
+}
+
+/// Whether `run` is an address in any form that needs no "::".
+bool isWhole(std::string_view run) {
+    constexpr std::ptrdiff_t manyColons = 4;
+    const bool hasManyColons = std::ranges::count(run, ':') >= manyColons &&
+                               (std::ranges::any_of(run, isDigit) || !run.contains("::"));
+    return hasManyColons || isHostWithDots(run) || isCard(run);
+}
+
 } // namespace
 
 void findNetworkAddresses(std::string_view text, std::vector<FoundSecret>& found) {
-    constexpr std::ptrdiff_t manyColons = 4;
     for (std::size_t begin = 0; begin < text.size();) {
         const std::size_t end = endOfRun(text, begin, isOfAddress);
-        std::string_view run = text.substr(begin, end - begin);
         const bool isInWord = begin > 0 && isAlphanumeric(text[begin - 1]);
-        if (isInWord) {
-            // The address begins behind the word: "peer:fe80::1".
-            run = run.substr(std::min(run.find(':'), run.size()));
-            run = run.starts_with("::") ? std::string_view() : run.substr(run.empty() ? 0 : 1);
-        }
-        run = withoutSigns(run);
         const bool isApart = end == text.size() || !isAlphanumeric(text[end]);
-        const bool hasManyColons = std::ranges::count(run, ':') >= manyColons &&
-                                   (std::ranges::any_of(run, isDigit) || !run.contains("::"));
-        const bool isAddress = isShortened(run) ||
-                               (!isInWord && (hasManyColons || isHostWithDots(run) || isCard(run)));
-        if (isApart && isAddress) {
+        const std::string_view all = text.substr(begin, end - begin);
+        const std::string_view run = withoutSigns(isInWord ? behindWord(all) : all);
+        if (isApart && (isShortened(run) || (!isInWord && isWhole(run)))) {
             const auto start = static_cast<std::size_t>(run.data() - text.data());
             std::size_t behind = start + run.size();
             // The zone may hold the address of a network card.

@@ -160,13 +160,13 @@ bool isEverywhere(std::string_view path) {
     return path.starts_with(settings) || path.starts_with(processes);
 }
 
-/// Whether `path` is the folder for what a diagnosis makes, or one above it: in a home, but in the
-/// same one on every device.
-bool isDiagnosticFolder(std::string_view path) {
+/// Whether `candidate` is the folder for what a diagnosis makes, or one above it: in a home, but in
+/// the same one on every device.
+bool isDiagnosticFolder(std::string_view candidate) {
     constexpr std::string_view home = "/var/mobile";
     constexpr std::string_view folder =
         "/var/mobile/Library/Logs/CrashReporter/DiagnosticLogs/Stratafile";
-    return isIn(path, home) && (isIn(folder, path));
+    return isIn(candidate, home) && isIn(folder, candidate);
 }
 
 /// Whether nothing at `end` goes on with the path that ends there: neither a blank nor a letter.
