@@ -1,17 +1,20 @@
 #include "device/bundles/BundleCode.h"
 
 #include "device/DeviceError.h"
+#include "device/bundles/ObjectFile.h"
 
-#include <cerrno>
 #include <dlfcn.h>
 #include <exception>
 #include <string>
 #include <string_view>
 #include <system_error>
+#include <utility>
 
 namespace nimbra::device {
 
 namespace {
+
+constexpr const char* cannotBeLoaded = "the bundle's shared object cannot be loaded";
 
 /// What the linker says of the object at `path`, which it may name once more.
 std::string linkerError(const std::filesystem::path& path) {
@@ -25,18 +28,16 @@ std::string linkerError(const std::filesystem::path& path) {
 
 /// The function under which the shared object at `path` registers its classes.
 std::expected<BundleEntryPoint*, Error> entryPoint(const std::filesystem::path& path) {
-    std::error_code failure;
-    if (!std::filesystem::exists(path, failure)) {
-        return std::unexpected(fileError(path, "the bundle's shared object cannot be loaded",
-                                         failure ? failure.value() : ENOENT));
+    if (auto checked = checkObjectFile(path, cannotBeLoaded); !checked) {
+        return std::unexpected(std::move(checked.error()));
     }
+    std::error_code failure;
     // The linker keeps the path as it is given, for whoever asks later where a class comes from.
     const std::filesystem::path absolute = std::filesystem::absolute(path, failure);
     void* const object = ::dlopen(absolute.c_str(), RTLD_NOW | RTLD_LOCAL);
     if (object == nullptr) {
         return std::unexpected(
-            deviceError(path.string() +
-                        ": the bundle's shared object cannot be loaded: " + linkerError(absolute)));
+            deviceError(path.string() + ": " + cannotBeLoaded + ": " + linkerError(absolute)));
     }
     void* const symbol = ::dlsym(object, kBundleEntryPoint);
     if (symbol == nullptr) {

@@ -2,13 +2,63 @@
 #include "tests/device/bundles/TestBundles.h"
 #include "tests/support/TestPlatform.h"
 
+#include <algorithm>
+#include <cstdint>
+#include <cstring>
+#include <functional>
+#include <limits>
+#include <link.h>
+#include <sys/stat.h>
 #include <typeinfo>
+#include <vector>
 
 namespace nimbra::device {
 namespace {
 
+/// What the linker is told of the parts of a shared object, to be read and changed.
+class ObjectHeaders {
+public:
+    explicit ObjectHeaders(std::string bytes) : _bytes(std::move(bytes)) {
+        std::memcpy(&header, _bytes.data(), sizeof(header));
+        _place = header.e_phoff;
+        _segments.resize(header.e_phnum);
+        std::memcpy(_segments.data(), &_bytes[_place], sizeof(ElfW(Phdr)) * _segments.size());
+    }
+
+    ElfW(Ehdr) header {};
+
+    [[nodiscard]] ElfW(Phdr) & lastLoaded() {
+        return *std::ranges::max_element(_segments, {}, [](const auto& segment) {
+            return segment.p_type == PT_LOAD ? segment.p_offset + segment.p_filesz : 0;
+        });
+    }
+    /// Where the last segment that is loaded ends.
+    [[nodiscard]] std::uint64_t end() { return lastLoaded().p_offset + lastLoaded().p_filesz; }
+
+    /// The whole object, with what has been changed.
+    [[nodiscard]] std::string bytes() const {
+        std::string changed = _bytes;
+        std::memcpy(&changed[_place], _segments.data(), sizeof(ElfW(Phdr)) * _segments.size());
+        std::memcpy(changed.data(), &header, sizeof(header));
+        return changed;
+    }
+
+private:
+    std::string _bytes;
+    std::uint64_t _place;
+    std::vector<ElfW(Phdr)> _segments;
+};
+
 class DeviceBundlesTest : public BundlesFixture {
 protected:
+    [[nodiscard]] static std::string testObject() {
+        return test::contentOf(std::filesystem::path(NIMBRA_TEST_OBJECTS) / "test-object-first.so");
+    }
+    [[nodiscard]] std::string cannotBeLoaded(const std::string& why) const {
+        return (folder() / "A.so").string() +
+               ": the bundle's shared object cannot be loaded: " + why;
+    }
+
     /// An object of the class that the shared object of `bundle` has registered.
     [[nodiscard]] std::shared_ptr<SettingsListController> objectOf(const DeviceBundle& bundle) {
         return bundle.principalClass().create(_platform.services());
@@ -205,6 +255,67 @@ TEST_F(DeviceBundlesTest, AFileThatIsNoSharedObjectIsReported) {
                                     ": the bundle's shared object cannot be loaded: "))
         << failure;
     EXPECT_EQ(failure.find('\n'), std::string::npos);
+}
+
+TEST_F(DeviceBundlesTest, ASharedObjectThatIsCutOffIsReported) {
+    const std::uint64_t needed = ObjectHeaders(testObject()).end();
+    ASSERT_GT(needed, 4096U);
+    const std::uint64_t within[] = {sizeof(ElfW(Ehdr)), 1000, 4096, needed / 2, needed - 1};
+
+    for (const std::uint64_t length : within) {
+        makeBundle(folder());
+        std::filesystem::resize_file(folder() / "A.so", length);
+
+        EXPECT_EQ(failureOf(folder()), cannotBeLoaded("is cut off")) << length;
+    }
+}
+
+TEST_F(DeviceBundlesTest, ASharedObjectNeedsNothingBehindItsLastSegment) {
+    makeBundle(folder());
+    std::filesystem::resize_file(folder() / "A.so", ObjectHeaders(testObject()).end());
+
+    EXPECT_EQ(load()->principalClass().name, "FirstController");
+}
+
+TEST_F(DeviceBundlesTest, ASharedObjectWhosePlacesPassEveryEndIsReported) {
+    const auto failureWith = [this](const std::function<void(ObjectHeaders&)>& change) {
+        makeBundle(folder());
+        ObjectHeaders headers(testObject());
+        change(headers);
+        test::writeTestFile(folder() / "A.so", headers.bytes());
+        return failureOf(folder());
+    };
+    // Added to what follows from there, each comes out small.
+    constexpr auto far = std::numeric_limits<std::uint64_t>::max() - 15;
+
+    EXPECT_EQ(failureWith([](auto& headers) { headers.header.e_phoff = far; }),
+              cannotBeLoaded("is cut off"));
+    EXPECT_EQ(failureWith([](auto& headers) { headers.lastLoaded().p_offset = far; }),
+              cannotBeLoaded("is cut off"));
+    EXPECT_EQ(failureWith([](auto& headers) { headers.lastLoaded().p_filesz = far; }),
+              cannotBeLoaded("is cut off"));
+    EXPECT_EQ(failureWith([](auto& headers) { headers.header.e_phnum = 0xffff; }),
+              cannotBeLoaded("is cut off"));
+}
+
+TEST_F(DeviceBundlesTest, WhatHasTooLittleForAHeaderIsReported) {
+    for (const std::uint64_t length : {0U, 4U, 40U, 63U}) {
+        makeBundle(folder());
+        std::filesystem::resize_file(folder() / "A.so", length);
+
+        EXPECT_TRUE(failureOf(folder()).starts_with(cannotBeLoaded(""))) << length;
+    }
+}
+
+TEST_F(DeviceBundlesTest, APipeOrAFolderInThePlaceOfASharedObjectIsReported) {
+    makeBundle(folder());
+    std::filesystem::remove(folder() / "A.so");
+    ASSERT_EQ(::mkfifo((folder() / "A.so").c_str(), 0644), 0);
+    EXPECT_EQ(failureOf(folder()), cannotBeLoaded("is not a plain file"));
+
+    std::filesystem::remove(folder() / "A.so");
+    std::filesystem::create_directory(folder() / "A.so");
+    EXPECT_EQ(failureOf(folder()), cannotBeLoaded("is a directory"));
 }
 
 TEST_F(DeviceBundlesTest, ASharedObjectWithoutItsEntryPointIsReported) {

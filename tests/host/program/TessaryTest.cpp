@@ -127,6 +127,12 @@ TEST_F(Tessary, WithAnObjectThatIsNoneTheRowLeadsNowhere) {
     expectNoPage("TessarySettings.so: the bundle's shared object cannot be loaded: ");
 }
 
+TEST_F(Tessary, WithAnObjectThatIsCutOffTheRowLeadsNowhere) {
+    std::filesystem::resize_file(bundle() / "TessarySettings.so", 4096);
+
+    expectNoPage("TessarySettings.so: the bundle's shared object cannot be loaded: is cut off");
+}
+
 TEST_F(Tessary, WithoutTheEntryPointTheRowLeadsNowhere) {
     std::filesystem::copy_file(NIMBRA_EMPTY_OBJECT, bundle() / "Empty.so");
     write("manifest.json", R"({"identifier": "i", "executable": "Empty.so"})");
