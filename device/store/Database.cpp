@@ -16,6 +16,29 @@ namespace nimbra::device {
 
 namespace {
 
+constexpr const char* libraryDomain = "SQLite";
+
+/// What the system has refused.
+const char* inputOutputError(int extendedCode) {
+    switch (extendedCode) {
+    case SQLITE_IOERR_READ:
+    case SQLITE_IOERR_SHORT_READ:
+    case SQLITE_IOERR_FSTAT:
+        return "the disk cannot be read";
+    case SQLITE_IOERR_WRITE:
+    case SQLITE_IOERR_FSYNC:
+    case SQLITE_IOERR_DIR_FSYNC:
+    case SQLITE_IOERR_TRUNCATE:
+        return "the disk cannot be written";
+    case SQLITE_IOERR_SHMOPEN:
+    case SQLITE_IOERR_SHMSIZE:
+        // The library does not tell one from the other here.
+        return "the disk is full or cannot be written";
+    default:
+        return "the disk cannot be read or written";
+    }
+}
+
 /// What went wrong, in words for whoever uses the device rather than the library.
 std::string inWords(const SQLite::Exception& exception) {
     switch (exception.getErrorCode()) {
@@ -26,13 +49,15 @@ std::string inWords(const SQLite::Exception& exception) {
         return "it can only be read";
     case SQLITE_FULL:
         return "the disk is full";
+    case SQLITE_IOERR:
+        return inputOutputError(exception.getExtendedErrorCode());
     default:
         return exception.what();
     }
 }
 
 Error databaseError(const std::filesystem::path& path, const SQLite::Exception& exception) {
-    return {.domain = "SQLite",
+    return {.domain = libraryDomain,
             .code = exception.getErrorCode(),
             .description = oneLine(path.string() + ": " + inWords(exception))};
 }
@@ -47,6 +72,21 @@ bool hasPendingChanges(const std::filesystem::path& path) {
     std::error_code absent;
     const auto size = std::filesystem::file_size(withSuffix(path, "-wal"), absent);
     return !absent && size > 0;
+}
+
+/// Whether all that counts stands in the file itself: no changes that are still to be moved into
+/// it, and none in it that are still to be undone.
+bool isComplete(const std::filesystem::path& path) {
+    std::error_code absent;
+    const auto undoing = std::filesystem::file_size(withSuffix(path, "-journal"), absent);
+    return !hasPendingChanges(path) && (absent || undoing == 0);
+}
+
+/// Whether an error with this code may be no more than that files beside the database cannot be
+/// made, for want of permission or of room.
+bool isForWantOfFilesBeside(int code) {
+    return code == SQLITE_CANTOPEN || code == SQLITE_READONLY || code == SQLITE_IOERR ||
+           code == SQLITE_FULL;
 }
 
 /// Whether the file at `path` can be read, and all that stands there and beside it for the database
@@ -78,7 +118,7 @@ std::expected<void, Error> checkFiles(const std::filesystem::path& path) {
     return std::unexpected(fileError(path, "cannot be read", failure ? failure.value() : EISDIR));
 }
 
-/// Opens a database in a directory in which nothing can be written, as it stands. Locks and
+/// Opens a database in a directory in which nothing can be made, as it stands. Locks and
 /// pending changes need files beside it.
 SQLite::Database openAsItStands(const std::filesystem::path& path) {
     return {"file:" + percentEncoded(path.string(), "/") + "?immutable=1",
@@ -92,8 +132,7 @@ SQLite::Database openExisting(const std::filesystem::path& path, int busyTimeout
         static_cast<void>(database.execAndGet("PRAGMA schema_version"));
         return database;
     } catch (const SQLite::Exception& exception) {
-        const int code = exception.getErrorCode();
-        if ((code != SQLITE_CANTOPEN && code != SQLITE_READONLY) || hasPendingChanges(path)) {
+        if (!isForWantOfFilesBeside(exception.getErrorCode()) || !isComplete(path)) {
             throw;
         }
         return openAsItStands(path);
@@ -252,6 +291,11 @@ std::expected<std::int64_t, Error> Database::version() {
         return std::unexpected(read.error());
     }
     return version;
+}
+
+bool Database::tellsOfContent(const Error& error) {
+    return error.domain != libraryDomain || error.code == SQLITE_NOTADB ||
+           error.code == SQLITE_CORRUPT || error.code == SQLITE_ERROR;
 }
 
 void Database::leaveAsFound() {

@@ -44,8 +44,9 @@ public:
     static constexpr std::chrono::milliseconds patience{5000};
 
     /// Opens the file at `path`; with `create` it is made where it does not exist. Where the file
-    /// can only be read, reading works and writing fails. With `reading` nothing can be written,
-    /// and neither the file nor the changes that stand beside it are touched.
+    /// can only be read, or the disk has no room for the files beside it, reading works and writing
+    /// fails. With `reading` nothing can be written, and neither the file nor the changes that
+    /// stand beside it are touched.
     [[nodiscard]] static std::expected<std::unique_ptr<Database>, Error>
     open(const std::filesystem::path& path, Access access,
          std::chrono::milliseconds patience = Database::patience);
@@ -70,6 +71,10 @@ public:
 
     /// The version of its form, which whoever made it has set; 0 where nobody has.
     [[nodiscard]] std::expected<std::int64_t, Error> version();
+
+    /// Whether `error`, which an operation here has given, says that the file is no database, a
+    /// damaged one or one of another form; others say what kept it from being read or written.
+    [[nodiscard]] static bool tellsOfContent(const Error& error);
 
     /// Leaves the files as they were found when the connection ends: changes that another process
     /// left beside the database are not moved into it.

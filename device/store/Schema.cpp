@@ -74,9 +74,9 @@ std::expected<void, Error> migrate(const Schema& schema, Database& database) {
 }
 
 /// `error` of the database at `path`, told as the reason why it is none of the schema's kind. Of a
-/// file that cannot be read nobody knows that.
+/// file that cannot be read, or not now, nobody knows that.
 Error notOfKind(const Schema& schema, const std::filesystem::path& path, const Error& error) {
-    if (error.domain == "POSIX") {
+    if (error.domain == "POSIX" || !Database::tellsOfContent(error)) {
         return error;
     }
     const std::string start = path.string() + ": ";
