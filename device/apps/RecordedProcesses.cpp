@@ -57,7 +57,7 @@ std::expected<RecordFile, Error> recordFileOf(const DevicePaths& paths,
     const std::string name = applicationFileName(application.string(), ".pid");
     const auto directory = paths.resolve(kRunningApplicationsDirectory);
     if (!directory) {
-        return std::unexpected(directory.error());
+        return std::unexpected(paths.asTheDeviceSaysIt(directory.error()));
     }
     return RecordFile(*directory / name, std::string(kRunningApplicationsDirectory) + '/' + name);
 }

@@ -46,11 +46,15 @@ std::expected<Size, Error> sizeInPixels(const std::filesystem::path& path) {
 
 } // namespace
 
-BundleImages BundleImages::read(const std::filesystem::path& folder, SystemLog& log) {
+BundleImages BundleImages::read(const std::filesystem::path& folder, const std::string& name,
+                                SystemLog& log) {
+    const auto report = [&](const Error& error) {
+        log.write(LogLevel::error, withPath(error, folder, name).description);
+    };
     BundleImages images;
     const auto files = entriesOfDirectory(folder);
     if (!files) {
-        log.write(LogLevel::error, files.error().description);
+        report(files.error());
         return images;
     }
     std::map<std::string, int> pixelsAPoint;
@@ -61,14 +65,14 @@ BundleImages BundleImages::read(const std::filesystem::path& folder, SystemLog& 
         }
         const auto size = sizeInPixels(file);
         if (!size) {
-            log.write(LogLevel::error, size.error().description);
+            report(size.error());
             continue;
         }
-        const auto [name, pixels] = imageNameOf(file.stem().string());
-        if (int& most = pixelsAPoint[name]; pixels > most) {
+        const auto [image, pixels] = imageNameOf(file.stem().string());
+        if (int& most = pixelsAPoint[image]; pixels > most) {
             most = pixels;
-            images._images[name] = std::make_shared<const Image>(
-                Image{.name = name,
+            images._images[image] = std::make_shared<const Image>(
+                Image{.name = image,
                       .size = {.width = size->width / pixels, .height = size->height / pixels}});
         }
     }

@@ -16,6 +16,20 @@
 
 namespace nimbra::device {
 
+namespace {
+
+/// What the log calls the bundle at `path`, which without links is `folder`: the path that it has
+/// on the device, where it is of the device.
+std::string nameInLog(const DevicePaths& paths, const std::filesystem::path& path,
+                      const std::filesystem::path& folder) {
+    std::error_code failure;
+    const auto below = folder.lexically_relative(std::filesystem::canonical(paths.root(), failure));
+    const bool isOnDevice = !failure && !below.empty() && *below.begin() != "..";
+    return isOnDevice ? '/' + below.string() : path.string();
+}
+
+} // namespace
+
 DeviceBundles::DeviceBundles(DevicePaths paths, const DeviceSettings& settings,
                              ClassRegistry& classes, SystemLog& log)
     : _paths(std::move(paths)), _settings(settings), _classes(classes), _log(log) {}
@@ -113,7 +127,7 @@ DeviceBundles::load(const std::filesystem::path& path, FirstClass firstClass) {
         .identifier = std::move(manifest->identifier),
         .developmentLanguage = std::move(manifest->developmentLanguage),
         .tables = std::move(*tables),
-        .images = BundleImages::read(path, _log),
+        .images = BundleImages::read(path, nameInLog(_paths, path, folder), _log),
         .principalClass = _classes.classNamed(manifest->principalClass.value_or("")),
         .settings = &_settings});
     const std::scoped_lock lock(_mutex);

@@ -32,18 +32,27 @@ std::expected<std::optional<Date>, Error> dateIn(const DeviceDescription& descri
     return *date ? parseInstant(**date) : std::nullopt;
 }
 
+/// The daemon's file; an error calls it as the device does.
+std::expected<DeviceDescription, Error> documentsOf(const DevicePaths& paths) {
+    auto description = readDescriptionFile(paths, documentsFile);
+    if (!description) {
+        return std::unexpected(paths.asTheDeviceSaysIt(std::move(description.error())));
+    }
+    return description;
+}
+
 } // namespace
 
 DeviceLastSync::DeviceLastSync(DevicePaths paths, DeviceSettings settings, const Clock& clock)
     : _paths(std::move(paths)), _settings(std::move(settings)), _clock(clock) {}
 
 std::expected<std::optional<Date>, Error> DeviceLastSync::MRGetLastSyncDateWithError() const {
-    const auto description = readDescriptionFile(_paths, documentsFile);
+    const auto description = documentsOf(_paths);
     return description ? dateIn(*description) : std::unexpected(description.error());
 }
 
 std::expected<Text, Error> DeviceLastSync::MRGetLocalizedLastSyncWithError() const {
-    const auto description = readDescriptionFile(_paths, documentsFile);
+    const auto description = documentsOf(_paths);
     if (!description) {
         return std::unexpected(description.error());
     }

@@ -13,7 +13,7 @@ DocumentsFile::DocumentsFile(DevicePaths paths, SystemLog& log)
 std::optional<DeviceDescription> DocumentsFile::read() const {
     auto description = readDescriptionFile(_paths, documentsFile);
     if (!description) {
-        _log.write(LogLevel::error, description.error().description);
+        _log.write(LogLevel::error, _paths.asTheDeviceSaysIt(description.error()).description);
         return std::nullopt;
     }
     return std::move(*description);

@@ -20,20 +20,24 @@ std::string PriorityHints::directory() {
 std::expected<void, Error> PriorityHints::add(const std::string& container) const {
     const auto folder = makeFolder(_paths, directory());
     if (!folder) {
-        return std::unexpected(folder.error());
+        return std::unexpected(_paths.asTheDeviceSaysIt(folder.error()));
     }
     const std::filesystem::path hint = *folder / percentEncoded(container);
     constexpr mode_t readableByEverybody = 0644;
     const int file = ::open(hint.c_str(), O_WRONLY | O_CREAT | O_CLOEXEC, readableByEverybody);
     if (file < 0) {
-        return std::unexpected(fileError(hint, "cannot be made", errno));
+        return std::unexpected(_paths.asTheDeviceSaysIt(fileError(hint, "cannot be made", errno)));
     }
     ::close(file);
     return {};
 }
 
 std::expected<void, Error> PriorityHints::removeAll() const {
-    return removeFolder(_paths, directory());
+    auto removed = removeFolder(_paths, directory());
+    if (!removed) {
+        return std::unexpected(_paths.asTheDeviceSaysIt(std::move(removed.error())));
+    }
+    return removed;
 }
 
 } // namespace nimbra::device

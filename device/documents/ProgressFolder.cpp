@@ -50,7 +50,7 @@ ProgressFolder::~ProgressFolder() {
 
 void ProgressFolder::start() {
     if (const auto watched = makeAndWatch(); !watched) {
-        _log.write(LogLevel::error, watched.error().description);
+        report(watched.error());
         return;
     }
     const auto names = namesInFolder();
@@ -98,8 +98,7 @@ void ProgressFolder::run() {
             if (errno == EINTR) {
                 continue;
             }
-            _log.write(LogLevel::error,
-                       fileError(_directory, "cannot be watched", errno).description);
+            report(fileError(_directory, "cannot be watched", errno));
             return;
         }
         if (files[1].revents != 0 || !readEvents()) {
@@ -116,7 +115,7 @@ bool ProgressFolder::readEvents() {
         if (errno == EINTR || errno == EAGAIN) {
             return true;
         }
-        _log.write(LogLevel::error, fileError(_directory, "cannot be watched", errno).description);
+        report(fileError(_directory, "cannot be watched", errno));
         return false;
     }
     std::string_view events(buffer.data(), static_cast<std::size_t>(count));
@@ -129,8 +128,8 @@ bool ProgressFolder::readEvents() {
         events.remove_prefix(sizeof event + event.len);
         if ((event.mask & (IN_DELETE_SELF | IN_MOVE_SELF)) != 0) {
             allGone();
-            _log.write(LogLevel::error,
-                       _directory.string() + ": has gone, and progress is not taken from it now");
+            report(deviceError(_directory.string() +
+                               ": has gone, and progress is not taken from it now"));
             return false;
         }
         if ((event.mask & IN_Q_OVERFLOW) != 0) {
@@ -149,7 +148,7 @@ bool ProgressFolder::readEvents() {
 std::optional<std::set<std::string>> ProgressFolder::namesInFolder() {
     const auto files = entriesOfDirectory(_directory);
     if (!files) {
-        _log.write(LogLevel::error, files.error().description);
+        report(files.error());
         return std::nullopt;
     }
     std::set<std::string> names;
@@ -214,13 +213,17 @@ void ProgressFolder::reportBadFile(const std::string& name, const Error& error) 
     std::string& reported = _reported[name];
     if (reported != error.description) {
         reported = error.description;
-        _log.write(LogLevel::error, reported);
+        report(error);
     }
+}
+
+void ProgressFolder::report(const Error& error) {
+    _log.write(LogLevel::error, _paths.asTheDeviceSaysIt(error).description);
 }
 
 void ProgressFolder::check(const std::expected<void, Error>& outcome) {
     if (!outcome) {
-        _log.write(LogLevel::error, outcome.error().description);
+        report(outcome.error());
     }
 }
 

@@ -59,6 +59,7 @@ private:
     void fileGone(const std::string& name);
     void allGone();
     void reportBadFile(const std::string& name, const Error& error);
+    void report(const Error& error);
     void check(const std::expected<void, Error>& outcome);
 
     DevicePaths _paths;

@@ -59,4 +59,13 @@ DevicePaths::resolve(std::string_view devicePath) const {
     return _root / below;
 }
 
+Error DevicePaths::asTheDeviceSaysIt(Error error) const {
+    // Descriptions have it in this form.
+    const std::string start = oneLine((_root / "").string());
+    if (!start.empty() && error.description.starts_with(start)) {
+        error.description.erase(0, start.size() - 1);
+    }
+    return error;
+}
+
 } // namespace nimbra::device

@@ -46,6 +46,11 @@ public:
     [[nodiscard]] std::expected<std::filesystem::path, Error>
     resolve(std::string_view devicePath) const;
 
+    /// `error`, where its description begins with a place below the root, with the place as the
+    /// device itself names it: where the root stands on this machine concerns no page and no log of
+    /// the device.
+    [[nodiscard]] Error asTheDeviceSaysIt(Error error) const;
+
 private:
     std::filesystem::path _root;
 };

@@ -50,8 +50,8 @@ std::optional<AccountRecord> DeviceAccountStore::record(const AccountIdentifier&
     auto found = _database.account(identifier);
     lock.unlock();
     if (!found) {
-        _log.write(LogLevel::error,
-                   "Can't read account " + identifier.string() + ": " + found.error().description);
+        _log.write(LogLevel::error, "Can't read account " + identifier.string() + ": " +
+                                        asTheDeviceSaysIt(std::move(found.error())).description);
         return std::nullopt;
     }
     return std::move(*found);

@@ -93,7 +93,9 @@ std::expected<void, Error> DevicePrivacyConsentStore::write(const PrivacyService
 }
 
 void DevicePrivacyConsentStore::report(const std::string& what, const Error& error) const {
-    _log.write(LogLevel::error, what + ": " + withPath(error, _path, kConsentDatabase).description);
+    const Error named =
+        withPath(withPath(error, _path, kConsentDatabase), _path.parent_path(), kStateDirectory);
+    _log.write(LogLevel::error, what + ": " + named.description);
 }
 
 } // namespace nimbra::device

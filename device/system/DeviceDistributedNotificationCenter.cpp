@@ -78,7 +78,7 @@ private:
 
 DeviceDistributedNotificationCenter::DeviceDistributedNotificationCenter(
     const DevicePaths& paths, SystemLog& log, std::chrono::milliseconds patience)
-    : _folder(paths), _log(log), _patience(patience) {}
+    : _paths(paths), _folder(paths), _log(log), _patience(patience) {}
 
 DeviceDistributedNotificationCenter::~DeviceDistributedNotificationCenter() {
     finish();
@@ -124,7 +124,7 @@ void DeviceDistributedNotificationCenter::postNotification(const Notification& n
         own = _receiver ? _receiver->socketName() : std::string();
     }
     for (const Error& problem : _folder.send(message, own, _patience)) {
-        _log.write(LogLevel::error, problem.description);
+        _log.write(LogLevel::error, _paths.asTheDeviceSaysIt(problem).description);
     }
 }
 
@@ -142,7 +142,7 @@ void DeviceDistributedNotificationCenter::finish() {
 void DeviceDistributedNotificationCenter::startReceiver() {
     auto socket = _folder.bind();
     if (!socket) {
-        _log.write(LogLevel::error, socket.error().description);
+        _log.write(LogLevel::error, _paths.asTheDeviceSaysIt(socket.error()).description);
         return;
     }
     Descriptor ending(::eventfd(0, EFD_CLOEXEC | EFD_NONBLOCK));

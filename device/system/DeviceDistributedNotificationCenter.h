@@ -51,6 +51,7 @@ private:
     void startReceiver();
     void deliver(std::string_view message, const std::shared_ptr<void>& held);
 
+    const DevicePaths _paths;
     const NotificationFolder _folder;
     SystemLog& _log;
     const std::chrono::milliseconds _patience;

@@ -58,7 +58,7 @@ DevicePreferences::appIntegerValueForKeyInDomain(const std::string& key,
     }
     const auto reader = path ? readDomain(*path) : std::unexpected(path.error());
     if (!reader) {
-        _log.write(LogLevel::error, reader.error().description);
+        _log.write(LogLevel::error, _paths.asTheDeviceSaysIt(reader.error()).description);
         return std::nullopt;
     }
     const nlohmann::ordered_json& value = reader->member(key).value();

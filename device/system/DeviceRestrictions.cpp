@@ -44,7 +44,7 @@ const DeviceRestrictions::Restrictions* DeviceRestrictions::current() const {
     }
     const auto path = _paths.resolve(kRestrictionsFile);
     if (!path) {
-        fail(std::nullopt, path.error().description);
+        fail(std::nullopt, path.error());
     } else if (!isUnchanged(*path)) {
         read(*path);
     }
@@ -63,12 +63,12 @@ void DeviceRestrictions::read(const std::filesystem::path& path) const {
     const auto stamp = stampOfPlainFile(path);
     const auto file = PlainFile::read(path, kMostBytesOfFile, path.string());
     if (!file) {
-        fail(stamp, file.error().description);
+        fail(stamp, file.error());
         return;
     }
     auto description = readDescription(file->content, path.string(), restrictionsFile);
     if (!description) {
-        fail(file->version.stamp(), description.error().description);
+        fail(file->version.stamp(), description.error());
         return;
     }
     _restrictions = std::make_unique<const Restrictions>(Restrictions{
@@ -78,8 +78,8 @@ void DeviceRestrictions::read(const std::filesystem::path& path) const {
     _problem.clear();
 }
 
-void DeviceRestrictions::fail(const std::optional<FileStamp>& stamp,
-                              const std::string& problem) const {
+void DeviceRestrictions::fail(const std::optional<FileStamp>& stamp, Error error) const {
+    const std::string problem = _paths.asTheDeviceSaysIt(std::move(error)).description;
     if (problem != _problem || stamp != _version.stamp()) {
         _log.write(LogLevel::error, "Can't read the restrictions: " + problem);
     }

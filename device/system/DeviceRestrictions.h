@@ -36,7 +36,7 @@ private:
     /// What holds now; null where the file cannot be read. The mutex is held.
     [[nodiscard]] const Restrictions* current() const;
     void read(const std::filesystem::path& path) const;
-    void fail(const std::optional<FileStamp>& stamp, const std::string& problem) const;
+    void fail(const std::optional<FileStamp>& stamp, Error error) const;
 
     DevicePaths _paths;
     /// The file's path on this machine as it is written, the device's links not followed.

@@ -24,7 +24,7 @@ protected:
     }
     /// The size of the image `name` of the bundle as its folder is now; none for no image.
     [[nodiscard]] std::optional<Size> sizeOf(const std::string& name) {
-        const auto found = BundleImages::read(folder(), log()).imageNamed(name);
+        const auto found = BundleImages::read(folder(), "A.bundle", log()).imageNamed(name);
         if (!found) {
             return std::nullopt;
         }
@@ -35,9 +35,9 @@ protected:
     void expectLeftOut(const std::string& content, const std::string& reason) {
         writeTestFile(image("A.png"), content);
         test::RecordingLog told;
-        EXPECT_EQ(BundleImages::read(folder(), told).imageNamed("A"), nullptr);
-        EXPECT_EQ(told.lines(), std::vector<std::string>{image("A.png").string() +
-                                                         ": expected a PNG image: " + reason});
+        EXPECT_EQ(BundleImages::read(folder(), "/A.bundle", told).imageNamed("A"), nullptr);
+        EXPECT_EQ(told.lines(),
+                  std::vector<std::string>{"/A.bundle/A.png: expected a PNG image: " + reason});
     }
 };
 

@@ -47,8 +47,9 @@ TEST_F(DeviceFileManagerTest, AFileThatCannotBeReadMeansNobodyAndOneLine) {
     EXPECT_EQ(fileManager().tidewaterIdentityToken(), Text());
 
     EXPECT_EQ(log().lines(),
-              std::vector<std::string>{path().string() + ": /identity: expected a string that is "
-                                                         "not empty, or null, found 7"});
+              std::vector<std::string>{
+                  "/var/lib/nimbra/documents.json: /identity: expected a string that is "
+                  "not empty, or null, found 7"});
 }
 
 } // namespace

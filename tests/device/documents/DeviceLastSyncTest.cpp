@@ -95,7 +95,7 @@ TEST_F(DeviceLastSyncTest, ASentenceThatIsLeftOutIsComposedFromTheDate) {
 
 TEST_F(DeviceLastSyncTest, AFileThatCannotBeReadIsAnErrorOfBoth) {
     const std::string message =
-        state("documents.json").string() + ": cannot be read: No such file or directory";
+        "/var/lib/nimbra/documents.json: cannot be read: No such file or directory";
 
     ASSERT_FALSE(date());
     EXPECT_EQ(date().error().description, message);

@@ -169,19 +169,20 @@ TEST_F(ProgressFolderTest, WhatStandsThereAlreadyIsPublished) {
 TEST_F(ProgressFolderTest, AFileThatIsNoProgressIsToldOfAndChangesNothing) {
     folder().start();
     write("a.json", R"({"fraction": 2})");
-    expectLogged({path("a.json").string() + ": /fraction: expected a number from 0 to 1, found 2"});
+    expectLogged(
+        {"/run/nimbra/progress/a.json: /fraction: expected a number from 0 to 1, found 2"});
 
     write("a.json", R"({"description": "one"})");
     expectShown({"published one"});
 
     write("a.json", "{\"description\":\n1}");
-    expectLogged({path("a.json").string() + ": /description: expected a string or null, found 1"});
+    expectLogged({"/run/nimbra/progress/a.json: /description: expected a string or null, found 1"});
     write("a.json", R"({"description": "one", "fraction": 1})");
     expectShown({"fractionCompleted 100%"});
 }
 
 TEST_F(ProgressFolderTest, TheSameMistakeOfAFileIsToldOfOnce) {
-    const std::string start = path("a.json").string() + ": /: expected an object, found ";
+    const std::string start = "/run/nimbra/progress/a.json: /: expected an object, found ";
     folder().start();
     write("a.json", "1");
     expectLogged({start + "1"});
@@ -198,10 +199,10 @@ TEST_F(ProgressFolderTest, WhatIsNotAPlainFileOrTooLargeIsToldOf) {
     folder().start();
     std::filesystem::create_directory(path("folder"));
     std::filesystem::rename(path("folder"), path("folder.json"));
-    expectLogged({path("folder.json").string() + ": is a directory"});
+    expectLogged({"/run/nimbra/progress/folder.json: is a directory"});
 
     write("large.json", std::string(kMostBytesOfProgressFile + 1, ' '));
-    expectLogged({path("large.json").string() + ": is larger than 65536 bytes"});
+    expectLogged({"/run/nimbra/progress/large.json: is larger than 65536 bytes"});
 }
 
 TEST_F(ProgressFolderTest, TheFolderIsMadeForItsOwnerAlone) {
@@ -217,7 +218,7 @@ TEST_F(ProgressFolderTest, AFolderThatCannotBeMadeIsToldOf) {
 
     folder().start();
 
-    expectLogged({place().string() + ": cannot be made: Not a directory"});
+    expectLogged({"/run/nimbra/progress: cannot be made: Not a directory"});
 }
 
 TEST_F(ProgressFolderTest, AFileInTheFoldersPlaceIsToldOf) {
@@ -225,7 +226,7 @@ TEST_F(ProgressFolderTest, AFileInTheFoldersPlaceIsToldOf) {
 
     folder().start();
 
-    expectLogged({place().string() + ": cannot be made: Not a directory"});
+    expectLogged({"/run/nimbra/progress: cannot be made: Not a directory"});
 }
 
 TEST_F(ProgressFolderTest, AFolderThatCannotBeWatchedIsToldOf) {
@@ -240,7 +241,7 @@ TEST_F(ProgressFolderTest, AFolderThatCannotBeWatchedIsToldOf) {
     }
     std::filesystem::permissions(place(), std::filesystem::perms::owner_all);
 
-    expectLogged({place().string() + ": cannot be watched: Permission denied"});
+    expectLogged({"/run/nimbra/progress: cannot be watched: Permission denied"});
 }
 
 TEST_F(ProgressFolderTest, WhenTheFolderGoesItsProgressEnds) {
@@ -251,7 +252,7 @@ TEST_F(ProgressFolderTest, WhenTheFolderGoesItsProgressEnds) {
     std::filesystem::rename(place(), place().parent_path() / "elsewhere");
 
     expectShown({"unpublished one"});
-    expectLogged({place().string() + ": has gone, and progress is not taken from it now"});
+    expectLogged({"/run/nimbra/progress: has gone, and progress is not taken from it now"});
 }
 
 TEST_F(ProgressFolderTest, TheWatchingEndsAlsoWhereItNeverBegan) {

@@ -55,5 +55,25 @@ TEST_F(DevicePathsTest, LinksThatLeadRoundInACircleAreAnError) {
         << failure;
 }
 
+TEST_F(DevicePathsTest, AnErrorAboutAPlaceBelowTheRootCallsItAsTheDeviceDoes) {
+    const auto said = [](const std::filesystem::path& root, const std::string& description) {
+        const Error error{.domain = "d", .code = 3, .description = description};
+        const Error named = DevicePaths(root).asTheDeviceSaysIt(error);
+        EXPECT_EQ(named.domain, "d");
+        EXPECT_EQ(named.code, 3);
+        return named.description;
+    };
+
+    EXPECT_EQ(said("/a/b", "/a/b/var/x: is bad"), "/var/x: is bad");
+    EXPECT_EQ(said("/a/b/", "/a/b/var/x: is bad"), "/var/x: is bad");
+    EXPECT_EQ(said("b", "b/var/x: is bad"), "/var/x: is bad");
+    EXPECT_EQ(said("b\n", "b /var/x: is bad"), "/var/x: is bad");
+    // What begins otherwise, or only with the same letters, is something else.
+    EXPECT_EQ(said("/a/b", "/a/bc/x: is bad"), "/a/bc/x: is bad");
+    EXPECT_EQ(said("/a/b", "/x: not /a/b/x"), "/x: not /a/b/x");
+    EXPECT_EQ(said("/a/b", "/a/b: is bad"), "/a/b: is bad");
+    EXPECT_EQ(said("/", "/var/x: is bad"), "/var/x: is bad");
+}
+
 } // namespace
 } // namespace nimbra::device

@@ -75,8 +75,9 @@ TEST_F(DeviceAccountStoreTest, AnAccountThatCannotBeReadIsNullWithOneLine) {
 
     EXPECT_EQ(store().accountWithIdentifier(AccountIdentifier("a")), nullptr);
 
-    EXPECT_EQ(log().lines(), std::vector<std::string>{"Can't read account a: " + path().string() +
-                                                      ": no such table: account_dataclasses"});
+    EXPECT_EQ(log().lines(),
+              std::vector<std::string>{"Can't read account a: /var/lib/nimbra/accounts.db"
+                                       ": no such table: account_dataclasses"});
 }
 
 TEST_F(DeviceAccountStoreTest, AListThatCannotBeReadIsAnError) {

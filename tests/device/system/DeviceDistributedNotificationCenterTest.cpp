@@ -220,8 +220,10 @@ TEST_F(DeviceDistributedNotificationCenterTest, AProcessThatDoesNotKeepUpMissesA
     queue().pump();
     ::close(silent);
 
-    EXPECT_EQ(logged(), Calls{(folder() / "1.1").string() +
-                              ": cannot be notified: Resource temporarily unavailable"});
+    EXPECT_EQ(
+        logged(),
+        Calls{
+            "/run/nimbra/notifications/1.1: cannot be notified: Resource temporarily unavailable"});
     EXPECT_EQ(calls().size(), static_cast<std::size_t>(posted));
 }
 
@@ -298,7 +300,7 @@ TEST_F(DeviceDistributedNotificationCenterTest, WithoutAFolderAProcessHearsItsOw
     const auto center = makeCenter();
     const auto first = center->addObserverForName(name(), recording("first"));
     const auto second = center->addObserverForName(name(), recording("second"));
-    EXPECT_EQ(logged(), Calls{folder().string() + ": cannot be made: Not a directory"});
+    EXPECT_EQ(logged(), Calls{"/run/nimbra/notifications: cannot be made: Not a directory"});
 
     center->postNotification({.name = name()});
     queue().pump();

@@ -55,21 +55,22 @@ TEST_F(DevicePreferencesTest, AFileThatCannotBeReadMeansNothingAndOneLine) {
     EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("key", "domain"), std::nullopt);
 
     EXPECT_EQ(log().lines(),
-              std::vector<std::string>{(directory() / "domain.json").string() +
+              std::vector<std::string>{"/var/lib/nimbra/preferences/domain.json"
                                        ": /: expected an object of keys and values, found [1]"});
 }
 
 TEST_F(DevicePreferencesTest, APipeIsNotWaitedFor) {
     std::filesystem::create_directories(directory());
     ASSERT_EQ(::mkfifo((directory() / "domain.json").c_str(), 0644), 0);
-    const std::string message = (directory() / "domain.json").string() + ": is not a plain file";
+    const std::string problem = ": is not a plain file";
 
     EXPECT_EQ(preferences().appIntegerValueForKeyInDomain("key", "domain"), std::nullopt);
     const auto checked = checkPreferences(paths());
 
-    EXPECT_EQ(log().lines(), std::vector<std::string>{message});
+    EXPECT_EQ(log().lines(),
+              std::vector<std::string>{"/var/lib/nimbra/preferences/domain.json" + problem});
     ASSERT_FALSE(checked);
-    EXPECT_EQ(checked.error().description, message);
+    EXPECT_EQ(checked.error().description, (directory() / "domain.json").string() + problem);
 }
 
 TEST_F(DevicePreferencesTest, ACheckFollowsALinkAsTheDeviceWould) {
