@@ -120,6 +120,15 @@ TEST(BrokenBundle, OneWithoutItsSharedObjectIsReported) {
     expectOneLine(copy.list(), (copy.bundle / "NimbraDriveSettings.so").string());
 }
 
+TEST(BrokenBundle, OneWhoseSharedObjectIsCutOffIsReported) {
+    const BundleCopy copy;
+    const auto object = copy.bundle / "NimbraDriveSettings.so";
+    std::filesystem::resize_file(object, std::filesystem::file_size(object) / 8);
+
+    expectOneLine(copy.list(), object.string() + ": the bundle's shared object cannot be loaded: "
+                                                 "is cut off");
+}
+
 TEST(BrokenBundle, OneWhoseSharedObjectLacksItsEntryPointIsReported) {
     const BundleCopy copy;
     std::filesystem::copy(NIMBRA_EMPTY_OBJECT, copy.bundle / "NimbraDriveSettings.so",
