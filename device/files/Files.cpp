@@ -71,23 +71,33 @@ std::expected<void, Error> writeNewFile(const std::filesystem::path& path, std::
     return {};
 }
 
-} // namespace
-
-std::expected<std::string, Error> readFile(const std::filesystem::path& path) {
-    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+std::expected<std::string, Error> readToEnd(int descriptor, const std::filesystem::path& name) {
     std::string content;
     std::array<char, 65536> buffer{};
-    while (file.isOpen()) {
-        const ssize_t count = ::read(file.number(), buffer.data(), buffer.size());
+    while (content.size() <= kMostBytesOfInput) {
+        const ssize_t count = ::read(descriptor, buffer.data(), buffer.size());
         if (count > 0) {
             content.append(buffer.data(), static_cast<std::size_t>(count));
         } else if (count == 0) {
             return content;
         } else if (errno != EINTR) {
-            break;
+            return std::unexpected(fileError(name, "cannot be read", errno));
         }
     }
-    return std::unexpected(fileError(path, "cannot be read", errno));
+    return std::unexpected(deviceError(name.string() + ": is larger than " +
+                                       std::to_string(kMostBytesOfInput) + " bytes"));
+}
+
+} // namespace
+
+std::expected<std::string, Error> readFile(const std::filesystem::path& path) {
+    const Descriptor file(::open(path.c_str(), O_RDONLY | O_CLOEXEC));
+    return file.isOpen() ? readToEnd(file.number(), path)
+                         : std::unexpected(fileError(path, "cannot be read", errno));
+}
+
+std::expected<std::string, Error> readStandardInput() {
+    return readToEnd(STDIN_FILENO, "standard input");
 }
 
 std::expected<void, Error> writeFileAtomically(const std::filesystem::path& path,

@@ -2,6 +2,7 @@
 
 #include "platform/values/Error.h"
 
+#include <cstddef>
 #include <expected>
 #include <filesystem>
 #include <map>
@@ -13,9 +14,15 @@
 
 namespace nimbra::device {
 
-/// Everything in the file at `path`, which may also be a pipe: for what the user names. What stands
-/// on a device is read with `readPlainFile`.
+/// Nothing that somebody describes comes anywhere near it; a device that never ends passes it.
+inline constexpr std::size_t kMostBytesOfInput = 64'000'000;
+
+/// Everything in the file at `path`, which may also be a pipe: for what the user names. One with
+/// more than `kMostBytesOfInput` is an error. What stands on a device is read with `readPlainFile`.
 [[nodiscard]] std::expected<std::string, Error> readFile(const std::filesystem::path& path);
+
+/// The same for standard input, read up to its end; messages call it "standard input".
+[[nodiscard]] std::expected<std::string, Error> readStandardInput();
 
 /// Makes `content` the whole content of the file at `path`, whose directory exists: it is written
 /// under a temporary name, flushed and renamed, so that a reader, and a machine that stops, see

@@ -7,8 +7,6 @@
 #include "host/core/PaneSession.h"
 #include "host/core/scenario/ScenarioReader.h"
 
-#include <iostream>
-#include <iterator>
 #include <utility>
 
 namespace nimbra::host {
@@ -16,15 +14,12 @@ namespace nimbra::host {
 namespace {
 
 std::expected<Scenario, Error> readScenarioFrom(const std::string& file) {
-    if (file == "-") {
-        const std::string text(std::istreambuf_iterator<char>(std::cin), {});
-        return readScenario(text, "standard input");
-    }
-    const auto text = device::readFile(file);
+    const bool isStandardInput = file == "-";
+    const auto text = isStandardInput ? device::readStandardInput() : device::readFile(file);
     if (!text) {
         return std::unexpected(text.error());
     }
-    return readScenario(*text, file);
+    return readScenario(*text, isStandardInput ? "standard input" : file);
 }
 
 } // namespace

@@ -22,6 +22,25 @@ TEST(FilesTest, AWrittenFileIsReadBackByteByByte) {
     EXPECT_EQ(test::treeOf(directory.path()).size(), 1U);
 }
 
+TEST(FilesTest, WhatHasNoEndIsNotReadForEver) {
+    const test::TemporaryDirectory directory;
+    const auto path = directory.path() / "file";
+    test::writeTestFile(path, "");
+    std::filesystem::resize_file(path, kMostBytesOfInput);
+    const auto greatest = readFile(path);
+    std::filesystem::resize_file(path, kMostBytesOfInput + 1);
+
+    const auto larger = readFile(path);
+    const auto endless = readFile("/dev/zero");
+
+    ASSERT_TRUE(greatest) << greatest.error();
+    EXPECT_EQ(greatest->size(), kMostBytesOfInput);
+    ASSERT_FALSE(larger);
+    EXPECT_EQ(larger.error().description, path.string() + ": is larger than 64000000 bytes");
+    ASSERT_FALSE(endless);
+    EXPECT_EQ(endless.error().description, "/dev/zero: is larger than 64000000 bytes");
+}
+
 TEST(FilesTest, WritingReplacesTheContentAndKeepsThePermissions) {
     const test::TemporaryDirectory directory;
     const auto path = directory.path() / "file";

@@ -87,6 +87,21 @@ TEST(Init, RefusesADescriptionWithItsPlaceAndMakesNothing) {
     EXPECT_FALSE(std::filesystem::exists(program.path("device")));
 }
 
+TEST(Init, RefusesADescriptionThatIsTooLarge) {
+    const Program program;
+    const auto large = program.write("large.json", "");
+    std::filesystem::resize_file(large, 64'000'001);
+
+    for (const std::string& file : {large.string(), std::string("/dev/zero")}) {
+        const auto result = program.run({"init", program.path("device").string(), "--from", file});
+
+        EXPECT_EQ(result.status, 2);
+        EXPECT_EQ(result.output, "");
+        EXPECT_EQ(result.messages, "settingsctl: " + file + ": is larger than 64000000 bytes\n");
+        EXPECT_FALSE(std::filesystem::exists(program.path("device")));
+    }
+}
+
 TEST(Init, SaysThatTheWorkingDirectoryIsGone) {
     const Program program;
     program.write("gone/file", "");

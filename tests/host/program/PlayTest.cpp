@@ -46,6 +46,47 @@ TEST(Play, CallsBrokenStandardInputByItsName) {
     EXPECT_TRUE(result.messages.starts_with("settingsctl: standard input: /steps: "));
 }
 
+TEST(Play, RefusesAScenarioThatIsTooLargeInOneLine) {
+    const Program program;
+    const auto large = program.write("large.json", "");
+    std::filesystem::resize_file(large, 64'000'001);
+    const auto expectRefused = [](const ProgramResult& result, const std::string& name) {
+        EXPECT_EQ(result.status, 2);
+        EXPECT_EQ(result.output, "");
+        EXPECT_EQ(result.messages, "settingsctl: " + name + ": is larger than 64000000 bytes\n");
+    };
+
+    expectRefused(program.run({"play", large.string()}), large.string());
+    expectRefused(program.run({"play", "/dev/zero"}), "/dev/zero");
+    expectRefused(
+        program.runOther({"sh", "-c", "exec \"$1\" play - < /dev/zero", "sh", NIMBRA_SETTINGSCTL}),
+        "standard input");
+    EXPECT_TRUE(program.leftNothingBehind());
+}
+
+TEST(Play, ReadsAScenarioOfTheGreatestSize) {
+    const Program program;
+    const auto large = program.write("large.json", "");
+    std::filesystem::resize_file(large, 64'000'000);
+
+    const auto result = program.run({"play", large.string()});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_TRUE(result.messages.starts_with("settingsctl: " + large.string() + ": line 1"))
+        << result.messages;
+}
+
+TEST(Play, SaysThatStandardInputIsClosed) {
+    const Program program;
+
+    const auto result =
+        program.runOther({"sh", "-c", "exec \"$1\" play - <&-", "sh", NIMBRA_SETTINGSCTL});
+
+    EXPECT_EQ(result.status, 2);
+    EXPECT_EQ(result.messages,
+              "settingsctl: standard input: cannot be read: Bad file descriptor\n");
+}
+
 TEST(Play, KeepsTheDeviceWhereItIsTold) {
     const Program program;
     const std::string device = program.path("kept").string();
