@@ -1,6 +1,7 @@
 #include "host/cli/DeviceCreation.h"
 
 #include "device/DeviceDirectory.h"
+#include "host/cli/TextLayout.h"
 #include "host/core/BundleSearch.h"
 #include "host/core/DeviceLocation.h"
 
@@ -23,7 +24,7 @@ std::expected<void, Failure> provideDevice(const std::filesystem::path& root,
         return badInput(made.error());
     }
     if (*made) {
-        messages << "settingsctl: made the sample device in " << root.string() << '\n';
+        messages << "settingsctl: made the sample device in " << printable(root.string()) << '\n';
     }
     return {};
 }
@@ -44,7 +45,9 @@ std::expected<void, Failure> initializeDevice(const std::filesystem::path& root,
         messages << "settingsctl: note: /apps: \"running\" has no effect here, applications run "
                     "only while a scenario plays\n";
     }
-    out << "Made the device \"" << given->description.name << "\" in " << root.string() << ".\n";
+    out << printable("Made the device \"" + given->description.name + "\" in " + root.string() +
+                     ".")
+        << '\n';
     return {};
 }
 

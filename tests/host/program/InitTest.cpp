@@ -56,6 +56,30 @@ TEST(Init, MakesTheDeviceThatAFileDescribes) {
               std::string::npos);
 }
 
+TEST(Init, SaysItInOneLineWhateverTheNameAndThePathHold) {
+    const Program program;
+    const auto description =
+        program.write("phone.json", R"({"name": "a\u001b[31mb\nc\u007f d\r"})");
+    const auto device = program.path("x\x1b]0;y\nz");
+
+    const auto result = program.run({"init", device.string(), "--from", description.string()});
+
+    EXPECT_EQ(result.status, 0) << result.messages;
+    EXPECT_EQ(result.output,
+              "Made the device \"a [31mb c  d \" in " + program.path("x ]0;y z").string() + ".\n");
+    EXPECT_TRUE(std::filesystem::exists(device / "var"));
+}
+
+TEST(Init, SaysInOneLineWhereASampleDeviceWasMade) {
+    const Program program;
+
+    const auto result = program.run({"--root", program.path("x\x1b\ny").string(), "list"});
+
+    EXPECT_EQ(result.status, 0) << result.messages;
+    EXPECT_EQ(result.messages,
+              "settingsctl: made the sample device in " + program.path("x  y").string() + '\n');
+}
+
 TEST(Init, SaysOnceThatNoApplicationRunsOnIt) {
     const Program program;
     const auto description = program.write("phone.json", R"({"apps": [
