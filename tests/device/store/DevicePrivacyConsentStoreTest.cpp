@@ -178,6 +178,23 @@ TEST_F(DevicePrivacyConsentStoreTest, RecordsThatCannotBeReadAreAbsentWithOneLin
                              "/var/lib/nimbra/consent.db: no such table: consent"});
 }
 
+TEST_F(DevicePrivacyConsentStoreTest, AFolderThatCannotBeFlushedIsCalledAsTheDeviceDoes) {
+    using std::filesystem::perms;
+    const auto other = directory() / "other";
+    std::filesystem::create_directory(other);
+    const auto store = openStore();
+    std::filesystem::permissions(directory(), perms(0333));
+    {
+        // Root may read everything, so the test is somebody else for a while.
+        const test::ReadOnly readOnly(other);
+        EXPECT_FALSE(set(*store, "a", true));
+    }
+    std::filesystem::permissions(directory(), perms(0700));
+
+    EXPECT_EQ(lines(), Lines{"Can't set the consent for kPRVServiceTidewater of a: "
+                             "/var/lib/nimbra: cannot be flushed: Permission denied"});
+}
+
 TEST_F(DevicePrivacyConsentStoreTest, ADatabaseThatCameDamagedIsReportedAndLeftAsItWas) {
     const auto store = openStore();
     test::writeTestFile(path(), std::string(5000, 'x'));
