@@ -208,7 +208,9 @@ FocusScope {
 
             anchors.right: parent.right
             anchors.rightMargin: Theme.gap + row.markSpace
-            y: row.isStacked ? titleLabel.y + row.titleHeight + 4 : (parent.height - height) / 2
+            // By its middle: its height, which depends on its width, has the card's depend on it.
+            anchors.verticalCenter: parent.verticalCenter
+            anchors.verticalCenterOffset: row.isStacked ? (row.labelsHeight - row.valueHeight) / 2 : 0
             width: row.isStacked ? row.room : row.valueWidth
             active: row.value !== "" && !row.isSwitch
             sourceComponent: Text {
