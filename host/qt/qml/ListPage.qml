@@ -144,14 +144,27 @@ FocusScope {
             positionViewAtIndex(row, place);
             forceLayout();
             positionViewAtIndex(row, place);
+            keepCardInSight(row);
+        }
+        // Moves no further than it must. What explains a row is a part of it and may be higher than
+        // the list: what must be seen is the card, from its top on where it is higher as well.
+        function keepCardInSight(row) {
+            const item = itemAtIndex(row);
+            if (item === null)
+                return;
+            const top = item.y + (item.isGroup ? 0 : item.cardTop);
+            const bottom = item.y + (item.isGroup ? item.height : item.cardBottom);
+            contentY = Math.min(top, Math.max(bottom - height, contentY));
         }
         function focusRow(row, reason) {
             if (row < 0)
                 return false;
             currentIndex = row;
             bringTo(row, ListView.Contain);
-            if (nextRow(row, -1) < 0)
+            if (nextRow(row, -1) < 0) {
                 positionViewAtBeginning();
+                keepCardInSight(row);
+            }
             if (currentItem)
                 currentItem.forceActiveFocus(reason);
             return true;
