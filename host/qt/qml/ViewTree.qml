@@ -74,6 +74,7 @@ Item {
             required property real viewOpacity
             required property var isEnabled
             required property var progress
+            required property var isProgressAnimated
             required property var isTurning
             required property var source
 

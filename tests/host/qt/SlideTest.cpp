@@ -1,4 +1,6 @@
 #include "host/core/PaneSession.h"
+#include "host/core/scenario/ScenarioPlayer.h"
+#include "tests/device/TestFiles.h"
 #include "tests/host/qt/WindowFixture.h"
 
 namespace nimbra::window {
@@ -27,6 +29,36 @@ protected:
     [[nodiscard]] qreal placeOf(const char* name) { return page(name)->mapToScene({}).x(); }
     [[nodiscard]] bool waitUntilRests(const char* name, qreal place) {
         return waitFor([&] { return page(name) != nullptr && placeOf(name) == place; });
+    }
+    /// Shows a window that slides, for the steps of a scenario.
+    void startSlidingScenario(const std::string& steps) {
+        test::writeTestFile(place("scenario.json"),
+                            R"({"device": {"accounts": [{
+                                  "identifier": "primary", "primary": true, "usesStratafile": true,
+                                  "enabled": ["kAccountDataclassTidewater"]}]},
+                                "steps": )" +
+                                steps + '}');
+        Arguments sliding = arguments();
+        sliding.root.reset();
+        sliding.scenario = place("scenario.json");
+        sliding.appearance.reducedMotion = false;
+        start(sliding);
+    }
+    /// The next of the steps, and what follows from it; no frame has been drawn since.
+    void performNext() {
+        const auto done = _host->player()->performNext();
+        ASSERT_TRUE(done) << done.error().reason;
+        _host->pump().run();
+    }
+    /// What share of its ground the bar of the sync covers; negative while there is no bar.
+    [[nodiscard]] qreal coveredShare() {
+        for (QAccessibleInterface* const found : accessibles()) {
+            if (found->role() == QAccessible::ProgressBar) {
+                const auto* const ground = qobject_cast<QQuickItem*>(found->object());
+                return ground->childItems().constFirst()->width() / ground->width();
+            }
+        }
+        return -1;
     }
     [[nodiscard]] bool waitUntilGone(const char* name) {
         return waitFor([&] { return page(name) == nullptr; });
@@ -168,6 +200,27 @@ TEST_F(Slide, AWindowMayCloseWhileAPageLeaves) {
     ASSERT_NE(page("panePage"), nullptr);
 
     _host.reset();
+}
+
+TEST_F(Slide, TheBarMovesToWhereTheSyncIs) {
+    // Given a bar that shows how far a sync is
+    startSlidingScenario(R"([{"do": "open"}, {"do": "appear"},
+        {"do": "publishProgress", "id": "sync", "fraction": 0.25},
+        {"do": "updateProgress", "id": "sync", "fraction": 0.75}])");
+    for (int step = 0; step < 3; ++step) {
+        ASSERT_NO_FATAL_FAILURE(performNext());
+        settle();
+    }
+    ASSERT_TRUE(waitUntilRests("panePage", 0));
+    key(Qt::Key_End);
+    ASSERT_TRUE(waitFor([this] { return coveredShare() == 0.25; }));
+
+    // When the sync goes on
+    ASSERT_NO_FATAL_FAILURE(performNext());
+
+    // Then the bar sets out from where it was
+    EXPECT_EQ(coveredShare(), 0.25);
+    EXPECT_TRUE(waitFor([this] { return coveredShare() == 0.75; }));
 }
 
 TEST_F(Slide, WhereMotionIsReducedAPageIsGoneAtOnce) {
