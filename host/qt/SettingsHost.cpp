@@ -98,9 +98,11 @@ std::expected<void, std::string> SettingsHost::start(const Arguments& arguments)
     makeModels(arguments);
     QString notice;
     if (!_scenario) {
-        notice = noticeOfDied();
-        _keepsToAccount = !notice.isEmpty();
-        if (arguments.row && !_keepsToAccount) {
+        // A picture is made for a script: the word about a crash waits for somebody who reads it.
+        if (!arguments.screenshot) {
+            notice = noticeOfDied();
+        }
+        if (arguments.row) {
             // Before there is a window: nothing slides then, and nothing below has to be made.
             _pane->open();
         }
@@ -234,9 +236,6 @@ std::expected<void, std::string> SettingsHost::loadWindow(const Arguments& argum
 }
 
 std::expected<void, std::string> SettingsHost::showRow(const std::string& name) {
-    if (_keepsToAccount) {
-        return {};
-    }
     _pane->open();
     if (!_pane->isOpen()) {
         return Problem("the page cannot be opened");

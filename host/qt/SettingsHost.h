@@ -58,9 +58,8 @@ public:
     /// Null where the window is not driven by a scenario.
     [[nodiscard]] host::ScenarioPlayer* player();
 
-    /// Shows the row that `name` stands for, in the pane, which is opened for it; nothing where the
-    /// last host died with a pane open, so that a crash does not become a loop. An error says which
-    /// row there is not.
+    /// Shows the row that `name` stands for, in the pane, which is opened for it. An error says
+    /// which row there is not.
     [[nodiscard]] std::expected<void, std::string> showRow(const std::string& name);
 
 private:
@@ -90,8 +89,6 @@ private:
     /// One of the two above.
     host::PaneSession* _session = nullptr;
     std::filesystem::path _bundle;
-    /// The last host died with a pane open: none opens without the user.
-    bool _keepsToAccount = false;
     std::optional<HostTexts> _texts;
     std::optional<SessionPump> _pump;
     std::optional<PaneModel> _pane;

@@ -127,6 +127,35 @@ TEST_F(Program, ItPutsAPictureOfTheSizeWhereItIsTold) {
     EXPECT_FALSE(isEven);
 }
 
+TEST_F(Program, APictureAfterACrashIsOfWhatWasAskedForAndLeavesTheWordAboutIt) {
+    // Given the picture of a row, and a crash after it
+    makeUsedDevice();
+    const auto takePicture = [this](const std::string& row, const std::string& name) {
+        return run({"--root", root().string(), "--row", row, "--motion", "reduced", "--screenshot",
+                    place(name).string()});
+    };
+    ASSERT_EQ(takePicture("Notes", "before.png").status, 0);
+    dieWithThePaneOpen();
+
+    // When the row is asked for again, and one that is not there
+    const auto result = takePicture("Notes", "after.png");
+    const auto refused = takePicture("No Such Row", "none.png");
+
+    // Then all is as before
+    EXPECT_EQ(result.status, 0) << result.messages;
+    EXPECT_EQ(result.messages, "");
+    const QImage before(QString::fromStdString(place("before.png").string()));
+    ASSERT_FALSE(before.isNull());
+    EXPECT_EQ(QImage(QString::fromStdString(place("after.png").string())), before);
+    EXPECT_EQ(refused.status, 1);
+    EXPECT_EQ(lineCount(refused.messages), 1) << refused.messages;
+    EXPECT_NE(refused.messages.find("No Such Row"), std::string::npos);
+    EXPECT_FALSE(std::filesystem::exists(place("none.png")));
+
+    // and the next window still tells of the crash
+    EXPECT_TRUE(OpenPanes(place("state") / "nimbra" / "settingshost").takeDied(root()).died);
+}
+
 TEST_F(Program, APictureThatCannotBeWrittenIsOneLineAndNoFile) {
     makeUsedDevice();
     const auto picture = place("none") / "picture.png";

@@ -8,7 +8,9 @@
 #include "host/core/BundleSearch.h"
 #include "host/core/DeviceLocation.h"
 #include "host/core/PaneSession.h"
+#include "host/qt/OpenPanes.h"
 #include "tests/device/TestFiles.h"
+#include "tests/support/ProgramRun.h"
 
 #include <QCoreApplication>
 #include <QQmlIncubationController>
@@ -17,8 +19,11 @@
 #include <QTimer>
 #include <algorithm>
 #include <chrono>
+#include <csignal>
 #include <iostream>
 #include <iterator>
+#include <sys/wait.h>
+#include <unistd.h>
 
 namespace nimbra::window {
 
@@ -113,6 +118,18 @@ void WindowTest::makeUsedDevice(const std::string& more) {
         "consent": [{"service": "kPRVServiceTidewater", "bundle": "notes", "granted": true},
                     {"service": "kPRVServiceTidewater", "bundle": "atlas", "granted": false}])" +
                more + '}');
+}
+
+void WindowTest::dieWithThePaneOpen() const {
+    const pid_t process = ::fork();
+    if (process == 0) {
+        OpenPanes panes(host::stateDirectory() / "settingshost");
+        const bool isOpen = panes.opened(root(), "Nimbra Drive").has_value();
+        static_cast<void>(::raise(isOpen ? SIGKILL : SIGTERM));
+    }
+    int status = 0;
+    ASSERT_EQ(::waitpid(process, &status, 0), process);
+    ASSERT_EQ(test::exitStatusOf(status), -SIGKILL);
 }
 
 Arguments WindowTest::arguments() const {

@@ -33,6 +33,8 @@ protected:
     void makeSampleDevice();
     /// A device whose page has the rows of an account that is in use, and `more` members.
     void makeUsedDevice(const std::string& more = {});
+    /// Another host of the device dies while it has the pane open.
+    void dieWithThePaneOpen() const;
 
     /// What a window on the device is started with; a test may change it.
     [[nodiscard]] Arguments arguments() const;
