@@ -94,7 +94,10 @@ FocusScope {
         anchors.left: input.left
         anchors.right: parent.right
         anchors.rightMargin: 10
-        anchors.verticalCenter: parent.verticalCenter
+        // By the field's height: its own stays that of the large text where it is made smaller.
+        anchors.top: parent.top
+        anchors.bottom: parent.bottom
+        verticalAlignment: Text.AlignVCenter
         horizontalAlignment: Text.AlignLeft
         visible: input.text === "" && input.preeditText === ""
         text: texts.text("search")

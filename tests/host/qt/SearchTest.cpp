@@ -149,6 +149,28 @@ TEST_F(Search, AFieldThatWasClearedStillSaysWhatIsSearchedFor) {
     EXPECT_EQ(field()->property("text").toString(), QString());
 }
 
+TEST_F(Search, WhatIsSearchedForStandsInTheMiddleAlsoWhereItIsShortened) {
+    makeSampleDevice();
+    Arguments large = arguments();
+    large.size = {320, 640};
+    large.appearance.textScale = 3;
+    openPane(large);
+
+    QQuickItem* const ground = named("search")->parentItem();
+    const QQuickItem* told = nullptr;
+    for (QQuickItem* const item : shownItems(ground)) {
+        if (item->property("text").toString() == QStringLiteral("Search apps")) {
+            told = item;
+        }
+    }
+
+    ASSERT_NE(told, nullptr);
+    EXPECT_TRUE(told->property("truncated").toBool());
+    const QRectF painted = told->mapRectToItem(ground, told->boundingRect());
+    EXPECT_LT(painted.height(), ground->height());
+    EXPECT_NEAR(painted.center().y(), ground->height() / 2, 1);
+}
+
 TEST_F(Search, RowsMayGoBeforeThoseBelowTheWindowHaveBeenMade) {
     // Given a page that has just been drawn for the first time
     makeSampleDevice();
