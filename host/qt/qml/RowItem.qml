@@ -44,7 +44,9 @@ FocusScope {
     // The value, side by side with the title where there is room, else below it.
     readonly property real valueWidth: valueLoader.item ? valueLoader.item.implicitWidth : 0
     readonly property real valueHeight: valueLoader.item ? valueLoader.item.height : 0
-    readonly property bool isStacked: valueWidth > 0 && titleLabel.implicitWidth + valueWidth + 12 > room
+    // The title is measured for a row without a value as well: asked for the first time when one has
+    // come, the measure would change while what depends on it is being set.
+    readonly property bool isStacked: titleLabel.implicitWidth + valueWidth + 12 > room && valueWidth > 0
     // The title with what tells it apart below it.
     readonly property real titleHeight: titleLabel.height + (distinctionLoader.active ? Math.ceil(distinctionLoader.implicitHeight) + 2 : 0)
     readonly property real labelsHeight: isStacked ? titleHeight + 4 + valueHeight : Math.max(titleHeight, valueHeight)
@@ -208,7 +210,8 @@ FocusScope {
 
             anchors.right: parent.right
             anchors.rightMargin: Theme.gap + row.markSpace
-            // By its middle: its height, which depends on its width, has the card's depend on it.
+            // By its middle: the card's height comes from this one's, and would set a place anew that
+            // is just being set.
             anchors.verticalCenter: parent.verticalCenter
             anchors.verticalCenterOffset: row.isStacked ? (row.labelsHeight - row.valueHeight) / 2 : 0
             width: row.isStacked ? row.room : row.valueWidth
