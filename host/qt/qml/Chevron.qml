@@ -9,25 +9,25 @@ Item {
     property color color: Theme.faint
     readonly property bool pointsLeft: back !== texts.rightToLeft
 
-    implicitWidth: 8
-    implicitHeight: 14
+    implicitWidth: 8 * Theme.symbol
+    implicitHeight: 14 * Theme.symbol
 
     Rectangle {
         x: (chevron.width - width) / 2
-        y: (chevron.height - height) / 2 - 2.9
-        width: 9
-        height: 2
-        radius: 1
+        y: (chevron.height - height) / 2 - 2.9 * Theme.symbol
+        width: 9 * Theme.symbol
+        height: 2 * Theme.symbol
+        radius: height / 2
         color: chevron.color
         antialiasing: true
         rotation: chevron.pointsLeft ? -45 : 45
     }
     Rectangle {
         x: (chevron.width - width) / 2
-        y: (chevron.height - height) / 2 + 2.9
-        width: 9
-        height: 2
-        radius: 1
+        y: (chevron.height - height) / 2 + 2.9 * Theme.symbol
+        width: 9 * Theme.symbol
+        height: 2 * Theme.symbol
+        radius: height / 2
         color: chevron.color
         antialiasing: true
         rotation: chevron.pointsLeft ? 45 : -45

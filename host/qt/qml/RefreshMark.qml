@@ -8,40 +8,40 @@ Item {
     property color color: Theme.accent
     property color ground: Theme.page
 
-    implicitWidth: 22
-    implicitHeight: 22
+    implicitWidth: 22 * Theme.symbol
+    implicitHeight: 22 * Theme.symbol
 
     Rectangle {
         anchors.fill: parent
-        anchors.margins: 2
+        anchors.margins: 2 * Theme.symbol
         radius: width / 2
         color: "transparent"
-        border.width: 2
+        border.width: 2 * Theme.symbol
         border.color: mark.color
     }
     Rectangle {
-        x: 12
+        x: 12 * Theme.symbol
         y: 0
-        width: 9
-        height: 9
+        width: 9 * Theme.symbol
+        height: 9 * Theme.symbol
         color: mark.ground
     }
     Rectangle {
-        x: 9.5
-        y: 0.2
-        width: 8
-        height: 2
-        radius: 1
+        x: 9.5 * Theme.symbol
+        y: 0.2 * Theme.symbol
+        width: 8 * Theme.symbol
+        height: 2 * Theme.symbol
+        radius: height / 2
         color: mark.color
         antialiasing: true
         rotation: 45
     }
     Rectangle {
-        x: 9.5
-        y: 4.8
-        width: 8
-        height: 2
-        radius: 1
+        x: 9.5 * Theme.symbol
+        y: 4.8 * Theme.symbol
+        width: 8 * Theme.symbol
+        height: 2 * Theme.symbol
+        radius: height / 2
         color: mark.color
         antialiasing: true
         rotation: -45

@@ -38,7 +38,7 @@ FocusScope {
     // What stands beside the title, from its leading edge: an icon; to its trailing edge: marks.
     readonly property real iconSpace: application !== "" ? icon.width + 12 : 0
     readonly property real lockSpace: isLocked ? 12 + 10 : 0
-    readonly property real markSpace: (isSwitch ? 52 + 12 : (kind === "link" ? 8 + 12 : 0)) + lockSpace
+    readonly property real markSpace: (isSwitch ? 52 + 12 : (kind === "link" ? 8 * Theme.symbol + 12 : 0)) + lockSpace
     readonly property real room: columnWidth - 2 * Theme.gap - iconSpace - markSpace
 
     // The value, side by side with the title where there is room, else below it.

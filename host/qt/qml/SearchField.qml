@@ -31,23 +31,23 @@ FocusScope {
         anchors.left: parent.left
         anchors.leftMargin: 14
         anchors.verticalCenter: parent.verticalCenter
-        width: 16
-        height: 16
+        width: 16 * Theme.symbol
+        height: 16 * Theme.symbol
 
         Rectangle {
-            width: 12
-            height: 12
-            radius: 6
+            width: 12 * Theme.symbol
+            height: 12 * Theme.symbol
+            radius: width / 2
             color: "transparent"
-            border.width: 2
+            border.width: 2 * Theme.symbol
             border.color: Theme.faint
         }
         Rectangle {
-            x: 9
-            y: 11.5
-            width: 7
-            height: 2
-            radius: 1
+            x: 9 * Theme.symbol
+            y: 11.5 * Theme.symbol
+            width: 7 * Theme.symbol
+            height: 2 * Theme.symbol
+            radius: height / 2
             color: Theme.faint
             rotation: 45
             antialiasing: true
@@ -130,9 +130,9 @@ FocusScope {
                 required property int index
 
                 anchors.centerIn: parent
-                width: 14
-                height: 2
-                radius: 1
+                width: 14 * Theme.symbol
+                height: 2 * Theme.symbol
+                radius: height / 2
                 color: Theme.faint
                 rotation: index === 0 ? 45 : -45
                 antialiasing: true
