@@ -45,9 +45,18 @@ bool isCard(std::string_view run) {
            std::ranges::count(run, '-') == 5;
 }
 
+/// Whether `group` is the first one of a network at home, or of one cable: "fdab", "fe80".
+bool beginsLocalNetwork(std::string_view group) {
+    constexpr std::size_t digits = 4;
+    const std::string start = lowerCase(group.substr(0, 3));
+    return group.size() == digits && (start.starts_with("fc") || start.starts_with("fd") ||
+                                      (start >= "fe8" && start <= "feb"));
+}
+
 /// "2001:db8::1" and the like, where groups of zeros are left out: there is "::" once. A group with
 /// a digit tells it from names of letters, and so do three groups, as no name has both ":" and "::"
-/// in it. "dead::beef" stays: no network has such addresses, and types are called so.
+/// in it. "dead::beef" stays: only local networks have addresses of letters, and types are called
+/// so.
 bool isShortened(std::string_view run) {
     constexpr std::size_t mostGroups = 7;
     constexpr std::size_t mostDigits = 4;
@@ -64,7 +73,8 @@ bool isShortened(std::string_view run) {
     const bool areGroups =
         groups.find_first_of(".-") == std::string_view::npos && pieces.size() <= mostGroups &&
         std::ranges::all_of(pieces, [](auto group) { return group.size() <= mostDigits; });
-    return areGroups && (std::ranges::any_of(run, isDigit) || pieces.size() > 2);
+    return areGroups && (std::ranges::any_of(run, isDigit) || pieces.size() > 2 ||
+                         beginsLocalNetwork(run.substr(0, gap)));
 }
 
 /// `run` without the signs of a sentence around it.
@@ -105,7 +115,7 @@ void findNetworkAddresses(std::string_view text, std::vector<FoundSecret>& found
         const bool isApart = end == text.size() || !isAlphanumeric(text[end]);
         const std::string_view all = text.substr(begin, end - begin);
         const std::string_view run = withoutSigns(isInWord ? behindWord(all) : all);
-        if (isApart && (isShortened(run) || (!isInWord && isWhole(run)))) {
+        if (isApart && (isShortened(run) || isWhole(run))) {
             const auto start = static_cast<std::size_t>(run.data() - text.data());
             std::size_t behind = start + run.size();
             // The zone may hold the address of a network card.

@@ -191,7 +191,13 @@ TEST(SecretPatternsTest, AddressesOfTheNetworkAreFoundHoweverShort) {
     }
     EXPECT_EQ(marked("to [2001:db8::1]:443"), "to [<secret>]:443");
     EXPECT_EQ(marked("net 2001:db8::1/32"), "net <secret>/32");
-    EXPECT_EQ(marked("peer:fe80::1 eth0:2a02:8108::1"), "peer:<secret> eth0:<secret>");
+    for (const std::string& address :
+         Texts{"fe80::1", "2a02:8108::1", "10.1.2.9", "10.1.2.10:80", "3c:22:fb:9e:01:ab",
+               "3c-22-fb-9e-01-ac", "2001:0db8:85a3:0000:0000:8a2e:0370:7334", "fdab::cafe"}) {
+        for (const std::string name : {"peer", "eth0", "mac", "addr"}) {
+            EXPECT_EQ(marked(name + ':' + address), name + ":<secret>") << address;
+        }
+    }
     for (const std::string& text :
          Texts{"a::b", "std::abs", "dead::beef", "ad::Face::add", "in a::b: 12", "14:07:09",
                "::", "at 14:07:09: x", "setEnabled:forDataclass:", "add:be:face:dead:", "x::1a",
