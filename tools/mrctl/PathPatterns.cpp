@@ -45,7 +45,9 @@ std::string_view withoutCode(std::string_view text) {
     const std::size_t domain = endOfRun(text, open + 2, isLetter);
     const std::size_t code = domain + (text.substr(domain, 1) == " " ? 1 : 0);
     const std::size_t end = endOfRun(text, code, isDigit);
-    const bool isCode = domain > open + 2 && code > domain && end > code && text.substr(end) == ")";
+    const std::string_view name = text.substr(open + 2, domain - open - 2);
+    const bool isDomain = name.ends_with("Domain") || name == "POSIX" || name == "SQLite";
+    const bool isCode = isDomain && code > domain && end > code && text.substr(end) == ")";
     return isCode ? text.substr(0, open) : text;
 }
 
@@ -160,20 +162,17 @@ bool isEverywhere(std::string_view path) {
     return path.starts_with(settings) || path.starts_with(processes);
 }
 
-/// Whether `candidate` is the folder for what a diagnosis makes, or one above it: in a home, but in
-/// the same one on every device.
-bool isDiagnosticFolder(std::string_view candidate) {
+/// Whether `candidate`, with `rest` behind it, is the folder for what a diagnosis makes, or one
+/// above it: in a home, but in the same one on every device. Neither a blank nor a letter goes on
+/// with it, and of one above, no ": " either.
+bool isDiagnosticFolder(std::string_view candidate, std::string_view rest) {
     constexpr std::string_view home = "/var/mobile";
     constexpr std::string_view folder =
         "/var/mobile/Library/Logs/CrashReporter/DiagnosticLogs/Stratafile";
-    return isIn(candidate, home) && isIn(folder, candidate);
-}
-
-/// Whether nothing at `end` goes on with the path that ends there: neither a blank nor a letter.
-bool isEndOfPath(std::string_view text, std::size_t end) {
-    const std::string_view rest = text.substr(end);
-    return rest.empty() || rest == "." || rest.starts_with(": ") || isQuote(rest[0]) ||
-           std::string_view(")]>").contains(rest[0]);
+    const bool isEnd = rest.empty() || rest == "." || isQuote(rest[0]) ||
+                       std::string_view(")]>").contains(rest[0]) ||
+                       (candidate == folder && rest.starts_with(": "));
+    return isEnd && isIn(candidate, home) && isIn(folder, candidate);
 }
 
 /// The end of the path that begins at `begin` where it says nothing of its user: before ": ", a
@@ -191,8 +190,7 @@ std::size_t endOfPublicPath(std::string_view text, std::size_t begin, std::size_
     const std::string_view path =
         text.substr(begin + skipped, std::max(end, begin + skipped) - begin - skipped);
     // In a home, a blank may be one of a name.
-    const bool isPublic =
-        isEverywhere(path) || (isDiagnosticFolder(path) && isEndOfPath(text, end));
+    const bool isPublic = isEverywhere(path) || isDiagnosticFolder(path, text.substr(end));
     return isPublic ? end : begin;
 }
 

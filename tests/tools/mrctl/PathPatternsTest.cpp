@@ -33,7 +33,8 @@ TEST(PathPatternsTest, TheReasonBehindAPathStays) {
         EXPECT_EQ(marked(home("ann/x: y") + reason), "<path>" + reason);
     }
     for (const std::string end : {": line 1", ": line 1, column 2", ": Bob (PlatformErrorDomain 5)",
-                                  ": Permission denied (Bob)", " (PlatformErrorDomain 5)"}) {
+                                  ": Permission denied (Bob)", ": Permission denied (BobMiller 5)",
+                                  " (PlatformErrorDomain 5)"}) {
         EXPECT_EQ(marked(home("ann/x") + end), end.ends_with(')') ? "<path>)" : "<path>") << end;
     }
 }
@@ -60,14 +61,15 @@ TEST(PathPatternsTest, PathsThatAreTheSameOnEveryDeviceStay) {
         EXPECT_EQ(marked(text), text);
     }
     const std::string diagnostics = "/var/mobile/Library/Logs/CrashReporter/DiagnosticLogs";
-    for (const std::string& text :
-         {diagnostics + "/Stratafile: x (y 5)", '"' + diagnostics + '"', "at " + diagnostics + ".",
-          std::string("/var/mobile/Library: x")}) {
+    for (const std::string& text : {diagnostics + "/Stratafile: x (y 5)", '"' + diagnostics + '"',
+                                    "at " + diagnostics + "."}) {
         EXPECT_EQ(marked("in " + text), "in " + text);
         EXPECT_EQ(marked(kMarkedRoot + text.substr(text.find('/'))),
                   "<path>" + text.substr(text.find('/')));
     }
-    for (const std::string rest : {"/a: b", " Bob", "/Stratafile/Bob", "2", ", Bob", ":Bob"}) {
+    EXPECT_EQ(marked("/var/mobile/Library: Bob Lee/Tax end"), "<path>");
+    for (const std::string rest :
+         {"/a: b", " Bob", ": Bob", "/Stratafile/Bob", "2", ", Bob", ":Bob"}) {
         EXPECT_EQ(marked(diagnostics + rest), "<path>") << rest;
     }
     EXPECT_EQ(marked("/usr/../" + home("ann/x").substr(1)), "<path>");
