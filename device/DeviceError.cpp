@@ -18,7 +18,8 @@ Error fileError(const std::filesystem::path& path, const std::string& what, int 
 }
 
 Error withPath(Error error, const std::filesystem::path& path, std::string_view name) {
-    const std::string& start = path.native();
+    // Descriptions have it in this form.
+    const std::string start = oneLine(path.native());
     if (error.description.starts_with(start)) {
         error.description.replace(0, start.size(), name);
     }

@@ -79,7 +79,8 @@ Error notOfKind(const Schema& schema, const std::filesystem::path& path, const E
     if (error.domain == "POSIX" || !Database::tellsOfContent(error)) {
         return error;
     }
-    const std::string start = path.string() + ": ";
+    // Descriptions have it in this form.
+    const std::string start = oneLine(path.string()) + ": ";
     const bool namesPath = error.description.starts_with(start);
     return deviceError(start + "not " + std::string(schema.kind) + ": " +
                        error.description.substr(namesPath ? start.size() : 0));
