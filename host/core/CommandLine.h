@@ -1,5 +1,6 @@
 #pragma once
 
+#include "device/DeviceError.h"
 #include "host/core/ExitStatus.h"
 
 #include <expected>
@@ -30,8 +31,8 @@ template <class Arguments, class Parser, class Error>
     Parser parser(arguments);
     const auto& app = parser.app();
     const auto complain = [&app](const std::string& problem) {
-        std::cerr << app.get_name() << ": " << problem << " (see " << app.get_name()
-                  << " --help)\n";
+        std::cerr << app.get_name() << ": " << device::oneLine(problem) << " (see "
+                  << app.get_name() << " --help)\n";
         return std::unexpected(exitBadInput);
     };
     if (const std::string problem = problemOfWords(count, words); !problem.empty()) {

@@ -66,6 +66,8 @@ TEST(Usage, AnOptionWithoutAValueBehindItsSignTakesNotTheNextWord) {
     }
     EXPECT_EQ(program.run({"init", "--from=", "device"}).messages,
               "settingsctl: --from: is empty (see settingsctl --help)\n");
+    EXPECT_EQ(program.run({"--a\nb=", "list"}).messages,
+              "settingsctl: --a b: is empty (see settingsctl --help)\n");
     // Behind "--" everything is a name.
     EXPECT_EQ(program.run({"--root", program.makePlainDevice("device"), "get", "--", "--root="})
                   .messages.find("is empty"),
