@@ -12,7 +12,8 @@ std::expected<void, Failure> play(const PlayOptions& options, std::ostream& out)
     const auto prepared = host::ScenarioSession::prepare({.file = options.scenario,
                                                           .keep = options.keep,
                                                           .bundle = options.bundle,
-                                                          .locale = options.locale},
+                                                          .locale = options.locale,
+                                                          .keepsLogToItself = true},
                                                          trace);
     if (!prepared) {
         return std::unexpected(Failure{exitBadInput, prepared.error().description});

@@ -70,7 +70,7 @@ std::expected<void, Error> ScenarioSession::start(const Configuration& configura
                                        .locale = configuration.locale,
                                        .trace = &trace,
                                        .timeSource = _time,
-                                       .keepsLogToItself = true,
+                                       .keepsLogToItself = configuration.keepsLogToItself,
                                        .viewMetrics = configuration.viewMetrics});
     if (!session) {
         return std::unexpected(std::move(session.error()));

@@ -39,6 +39,7 @@ public:
         /// As in `PaneSession::Configuration`.
         std::optional<std::filesystem::path> bundle;
         std::optional<std::string> locale;
+        bool keepsLogToItself = false;
         ViewMetrics* viewMetrics = nullptr;
     };
 
