@@ -30,7 +30,8 @@ std::filesystem::path homeDirectory() {
     }
     // Nothing else in these programs asks for users, on any thread.
     const passwd* const user = ::getpwuid(::getuid());
-    return user != nullptr ? user->pw_dir : "/";
+    const std::filesystem::path home = user != nullptr ? user->pw_dir : "";
+    return home.is_absolute() ? home : "/";
 }
 
 bool isThere(const std::filesystem::path& path) {
