@@ -45,8 +45,8 @@ public:
 
     /// Opens the file at `path`; with `create` it is made where it does not exist. Where the file
     /// can only be read, or the disk has no room for the files beside it, reading works and writing
-    /// fails. With `reading` nothing can be written, and neither the file nor the changes that
-    /// stand beside it are touched.
+    /// fails, as long as it is open. With `reading` nothing can be written, and neither the file
+    /// nor the changes that stand beside it are touched.
     [[nodiscard]] static std::expected<std::unique_ptr<Database>, Error>
     open(const std::filesystem::path& path, Access access,
          std::chrono::milliseconds patience = Database::patience);

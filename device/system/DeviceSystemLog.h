@@ -33,7 +33,7 @@ public:
 
     [[nodiscard]] bool isEnabled(LogLevel level) const override;
     /// What is not enabled is dropped. A line that cannot be written is told to standard error; a
-    /// file that cannot be made is told once, and only the errors show from then on.
+    /// file that cannot be made is told once, and what goes nowhere else is lost from then on.
     void write(LogLevel level, const std::string& message) override;
 
     /// What the journal is told of a line: its fields, each "NAME=value".

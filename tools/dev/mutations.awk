@@ -259,8 +259,8 @@ function deducesReturn(opening) {
     return token[opening] == "]"
 }
 
-# Whether the order of two statements is nobody's business: each only sets a property or makes an
-# object, and they are not about one and the same.
+# Whether the order of two statements is nobody's business: each only sets a property, not the same
+# one and of no object that the other names; or one only makes an object that the other does not name.
 function areApart(from, to, second, end,    here, there) {
     if (makes(from)) return !mentions(second, end, token[from])
     if (makes(second)) return !mentions(from, to, token[second])

@@ -25,7 +25,8 @@ QtObject {
 
     readonly property real body: Math.round(17 * scale)
     readonly property real small: Math.round(13 * scale)
-    // Symbols grow with the texts beside them, as far as what can be touched has room for them.
+    // Symbols grow with the texts beside them, as far as what can be touched has room for them; the
+    // lock, which stands before a switch, does not, as the switch does not.
     readonly property real symbol: Math.max(1, Math.min(scale, 1.5))
 
     readonly property real gap: 16
