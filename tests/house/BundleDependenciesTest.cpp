@@ -26,11 +26,8 @@ std::vector<std::string> neededBy(const std::string& path) {
 class BundleDependencies : public testing::TestWithParam<const char*> {};
 
 TEST_P(BundleDependencies, ABundleNeedsThePlatformTheRuntimeAndLibcOnly) {
-    std::string allowed =
+    const std::string allowed =
         R"((libnimbra-platform|libstdc\+\+|libgcc_s|libc|libm|ld-linux.*)\.so\..*)";
-#ifdef NIMBRA_SANITIZED
-    allowed += R"(|lib(asan|ubsan|tsan)\.so\..*)";
-#endif
 
     const std::vector<std::string> needed = neededBy(GetParam());
 
