@@ -60,12 +60,7 @@ DevicePaths::resolve(std::string_view devicePath) const {
 }
 
 Error DevicePaths::asTheDeviceSaysIt(Error error) const {
-    // Descriptions have it in this form.
-    const std::string start = oneLine((_root / "").string());
-    if (!start.empty() && error.description.starts_with(start)) {
-        error.description.erase(0, start.size() - 1);
-    }
-    return error;
+    return _root.empty() ? error : withPath(std::move(error), _root / "", "/");
 }
 
 } // namespace nimbra::device
